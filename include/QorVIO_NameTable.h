@@ -1,0 +1,47 @@
+// The table of a core's named groups.
+//
+// Conventions
+//  1. Names are told apart by length and byte, but A to Z equal a to z. Every other byte, NUL included,
+//     counts as it is.
+//  2. A key looks at the name that its group keeps, so a group outlives its entry; looking a name up makes no
+//     copy of it and leaves no entry behind.
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+#include <memory>
+#include <string_view>
+#include <unordered_map>
+
+#include "QorVIO_SignalGroup.h"
+
+namespace QorRT {
+
+struct QorVIO_NameEqual {
+  static unsigned char folded(char letter) {
+    auto byte = static_cast<unsigned char>(letter);
+    return byte >= 'A' && byte <= 'Z' ? static_cast<unsigned char>(byte - 'A' + 'a') : byte;
+  }
+
+  bool operator()(std::string_view one, std::string_view other) const {
+    if (one.size() != other.size()) return false;
+    for (std::size_t i = 0; i < one.size(); ++i)
+      if (folded(one[i]) != folded(other[i])) return false;
+    return true;
+  }
+};
+
+/// FNV-1a over the folded bytes. Not noexcept on purpose: the table then keeps each hash instead of computing
+/// it again for every name that it passes on the way to another.
+struct QorVIO_NameHash {
+  std::size_t operator()(std::string_view name) const {
+    std::uint64_t hash = 14695981039346656037U;
+    for (char letter : name) hash = (hash ^ QorVIO_NameEqual::folded(letter)) * 1099511628211U;
+    return static_cast<std::size_t>(hash);
+  }
+};
+
+using QorVIO_NameTable = std::unordered_map<std::string_view, std::unique_ptr<QorVIO_SignalGroup>,
+                                            QorVIO_NameHash, QorVIO_NameEqual>;
+
+}  // namespace QorRT

@@ -1,0 +1,17 @@
+// What libQorCore needs of a session beyond the public declarations.
+#pragma once
+
+#include "QorExport.h"
+#include "Qor_Cable.h"
+
+namespace QorRT {
+
+/// The session's cable, for the holder of its target lock and as long as that is held. Throws logic_error
+/// when the session is unknown or closed.
+QOR_API Qor_Cable& sessionCable(unsigned session);
+
+/// Has `hook` called once with the handle when the session is closed, without its target lock held; the same
+/// hook is kept once. Throws logic_error when the session is unknown or closed, and keeps nothing then.
+QOR_API void onSessionClose(unsigned session, void (*hook)(unsigned session) noexcept);
+
+}  // namespace QorRT

@@ -1,0 +1,33 @@
+#include "Chain.h"
+
+#include <utility>
+
+namespace qorsim {
+
+void Chain::add(Tap tap) {
+  taps_.push_back(std::move(tap));
+}
+
+void Chain::scanIr(Bits& stream) {
+  for (auto tap = taps_.rbegin(); tap != taps_.rend(); ++tap) tap->scanIr(stream);
+}
+
+void Chain::scanDr(Bits& stream) {
+  for (auto tap = taps_.rbegin(); tap != taps_.rend(); ++tap) tap->scanDr(stream);
+}
+
+void Chain::idle(unsigned cycles) {
+  if (tcksPerClock_ == 0) return;
+  for (unsigned i = 0; i < cycles; ++i) {
+    if (++tcks_ < tcksPerClock_) continue;
+    tcks_ = 0;
+    for (Tap& tap : taps_) tap.clock();
+  }
+}
+
+void Chain::setTcksPerClock(unsigned tcks) {
+  tcksPerClock_ = tcks;
+  tcks_ = 0;
+}
+
+}  // namespace qorsim

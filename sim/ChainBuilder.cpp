@@ -1,0 +1,103 @@
+#include <utility>
+
+#include "BoardError.h"
+#include "Chain.h"
+#include "CoreCheck.h"
+#include "Sim.h"
+#include "StatusWord.h"
+#include "VioCore.h"
+
+namespace qorsim {
+namespace {
+
+std::unique_ptr<Core> makeCore(const CoreDescription& core) {
+  if (core.isVio()) return std::make_unique<VioCore>(core);
+  return std::make_unique<Core>(statusWord(core));
+}
+
+}  // namespace
+
+ChainBuilder& ChainBuilder::device(unsigned idcode) {
+  devices_.push_back({{idcode, "device" + std::to_string(devices_.size()), 6}, {}});
+  return *this;
+}
+
+ChainBuilder& ChainBuilder::named(const std::string& name) {
+  lastDevice("name").head.name = name;
+  return *this;
+}
+
+ChainBuilder& ChainBuilder::irLength(unsigned bits) {
+  Device& device = lastDevice("ir_length");
+  requireRange(nameOfLast(), "ir_length", bits, Tap::shortestIr, Tap::longestIr);
+  device.head.irLength = bits;
+  return *this;
+}
+
+ChainBuilder& ChainBuilder::core(unsigned userChain, unsigned index, const CoreSpec& core) {
+  Device& device = lastDevice("core");
+  const std::string part =
+      nameOfLast() + ", user chain " + std::to_string(userChain) + ", core " + std::to_string(index);
+  requireRange(part, "user_chain", userChain, 1, Tap::userChainCount);
+  requireRange(part, "index", index, 0, Hub::coreCount - 1);
+  requireFree(part, userChain, index);
+  checkCore(part, core.description());
+  device.cores.push_back({userChain, index, core.description()});
+  return *this;
+}
+
+ChainBuilder& ChainBuilder::tcksPerClock(unsigned tcks) {
+  tcksPerClock_ = tcks;
+  return *this;
+}
+
+std::unique_ptr<SimCable> ChainBuilder::cable() const {
+  if (devices_.empty()) throw BoardError("chain", "device", "is missing: a chain has at least one");
+  std::vector<QorRT::Qor_Device> heads;
+  auto chain = std::make_unique<Chain>(tcksPerClock_);
+  for (const Device& device : devices_) {
+    Tap tap(device.head.idcode, device.head.irLength);
+    for (const PlacedCore& core : device.cores)
+      tap.hub(core.userChain).add(core.index, makeCore(core.description));
+    chain->add(std::move(tap));
+    heads.push_back(device.head);
+  }
+  return std::make_unique<SimCable>(std::move(heads), std::move(chain));
+}
+
+ChainBuilder::Device& ChainBuilder::lastDevice(const char* what) {
+  if (devices_.empty()) throw BoardError("chain", what, "comes before any device");
+  return devices_.back();
+}
+
+std::string ChainBuilder::nameOfLast() const {
+  return "device " + std::to_string(devices_.size() - 1);
+}
+
+void ChainBuilder::requireFree(const std::string& part, unsigned userChain, unsigned index) const {
+  for (const PlacedCore& core : devices_.back().cores)
+    if (core.userChain == userChain && core.index == index)
+      throw BoardError(part, "index", "is taken on this user chain, is " + std::to_string(index));
+}
+
+ChainBuilder chain() {
+  return {};
+}
+
+ChainBuilder demoBoard() {
+  const CoreSpec current =
+      vio().asyncOut(8).syncOut(8).asyncIn(8).syncIn(8).version(10, 0).design(loopback());
+  const CoreSpec older = vio().asyncOut(4).syncOut(4).asyncIn(16).syncIn(16).version(6, 1).design(counter());
+  return chain()
+      .device(0x0A5F1093)
+      .named("fpga")
+      .irLength(6)
+      .core(1, 0, current)
+      .core(1, 1, otherCore(7))
+      .device(0x1234567B)
+      .named("cpld")
+      .irLength(8)
+      .core(1, 0, older);
+}
+
+}  // namespace qorsim

@@ -1,0 +1,64 @@
+#include "Hub.h"
+
+#include <utility>
+
+namespace qorsim {
+namespace {
+
+constexpr unsigned writeCode = 0x2, readCode = 0x3, mergingReadCode = 0x5;
+constexpr unsigned signature = 0xA;
+
+}  // namespace
+
+void Hub::add(unsigned index, std::unique_ptr<Core> core) {
+  cores_[index] = std::move(core);
+}
+
+void Hub::scan(Bits& stream) {
+  Bits out = answer();
+  out.resize(stream.size());
+  const bool resultSeen =
+      (code_ == readCode || code_ == mergingReadCode) && core_ != nullptr && !core_->pending();
+  if (const std::optional<Frame> frame = parseFrame(stream))
+    obey(*frame, resultSeen);
+  else
+    reply_ = Reply::rejected;
+  stream.swap(out);
+}
+
+void Hub::clock() {
+  for (const std::unique_ptr<Core>& core : cores_)
+    if (core) core->clock();
+}
+
+// Head, data, CRC.
+Bits Hub::answer() const {
+  Bits out;
+  out.push_back(reply_ == Reply::rejected);
+  out.push_back(reply_ == Reply::noSuchCode);
+  out.push_back(reply_ == Reply::refused);
+  out.push_back(core_ != nullptr && core_->pending());
+  appendNumber(out, code_, 4);
+  appendNumber(out, index_, 4);
+  appendNumber(out, signature, 4);
+  const Bits data = core_ != nullptr ? core_->result(code_) : Bits();
+  out.insert(out.end(), data.begin(), data.end());
+  appendNumber(out, checksum(out.data(), out.size(), data.size()), 16);
+  return out;
+}
+
+void Hub::obey(const Frame& frame, bool resultSeen) {
+  Core* const core = cores_[frame.core].get();
+  if (frame.code != writeCode && !frame.payload.empty())
+    reply_ = Reply::rejected;
+  else if (core == nullptr)
+    reply_ = Reply::noSuchCode;
+  else
+    reply_ = core->command(frame.code, frame.payload, resultSeen && core == core_);
+  if (reply_ == Reply::rejected || reply_ == Reply::refused) return;
+  index_ = frame.core;
+  code_ = frame.code;
+  core_ = core;
+}
+
+}  // namespace qorsim

@@ -1,0 +1,37 @@
+// What a simulated core is, in the words of its status word.
+#pragma once
+
+#include <memory>
+#include <optional>
+
+#include "SimDesign.h"
+
+namespace qorsim {
+
+struct CgVersion {
+  unsigned major;
+  unsigned minor;
+  unsigned minorAlpha;
+};
+
+struct CoreDescription {
+  static constexpr unsigned vioType = 9;
+
+  unsigned type = vioType;
+  unsigned manufacturer = 0x51;
+  unsigned major = 10;
+  unsigned minor = 0;
+  unsigned revision = 0;
+  std::optional<CgVersion> cg;  // 1.0.0 when there is none
+
+  // Port widths in bits, and the design, which is idle() when there is none: of a VIO core only.
+  unsigned asyncIn = 0;
+  unsigned syncIn = 0;
+  unsigned asyncOut = 0;
+  unsigned syncOut = 0;
+  std::shared_ptr<Design> design;
+
+  bool isVio() const { return type == vioType; }
+};
+
+}  // namespace qorsim

@@ -1,0 +1,21 @@
+// The status word of a core.
+#pragma once
+
+#include "Bits.h"
+#include "SimCoreDescription.h"
+
+namespace qorsim {
+
+/// Where a VIO core keeps its port widths depends on its version: fields of 8 bits before 6.2, of 16 bits
+/// from then on, and of 16 bits behind the cg version from 10.0 on.
+enum class StatusLayout { oldest, middle, current };
+
+StatusLayout statusLayout(const CoreDescription& core);
+
+/// The widest port that the status word of the core can tell.
+unsigned widestPort(const CoreDescription& core);
+
+/// The 128 bits that code 00 delivers.
+Bits statusWord(const CoreDescription& core);
+
+}  // namespace qorsim

@@ -1,0 +1,13 @@
+// Checks whose texts the interface fixes.
+#pragma once
+
+#include <stdexcept>
+
+namespace QorRT {
+
+/// Throws logic_error with the text unless the condition holds.
+inline void require(bool condition, const char* text) {
+  if (!condition) throw std::logic_error(text);
+}
+
+}  // namespace QorRT

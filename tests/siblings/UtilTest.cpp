@@ -1,0 +1,148 @@
+#include <gtest/gtest.h>
+
+#include <cstring>
+#include <memory>
+#include <string>
+
+#include "QorUtil.h"
+#include "ScriptedCable.h"
+
+namespace {
+
+using QorRT::Qor_ByteBuffer;
+using QorRT::Qor_NumberUtil;
+
+Qor_ByteBuffer bufferOf(const std::vector<unsigned char>& bytes) {
+  Qor_ByteBuffer buffer(static_cast<unsigned>(bytes.size()), 10, 10);
+  std::copy(bytes.begin(), bytes.end(), buffer.uPtr());
+  return buffer;
+}
+
+Qor_ByteBuffer bufferOf(const char* text) {
+  return bufferOf(std::vector<unsigned char>(text, text + std::strlen(text) + 1));
+}
+
+Bits reversed(const Bits& bits) {
+  return Bits(bits.rbegin(), bits.rend());
+}
+
+TEST(NumberUtil, ConvertsDigitStringsOfEveryLength) {
+  for (unsigned length = 0; length < 140; ++length) {
+    const Bits digits = noise(length, 5);
+    std::string out = "before";
+    EXPECT_EQ(Qor_NumberUtil::binStr2HexStr(digits, out), hexOf(reversed(digits)));
+    for (const unsigned count : {0U, 1U, 3U, 8U, length, length + 1, length + 9}) {
+      std::string low = Bits(count, '0') + digits;
+      low.erase(0, low.size() - count);
+      std::string back;
+      EXPECT_EQ(Qor_NumberUtil::hexStr2BinStr(out.c_str(), count, back), low) << out;
+    }
+  }
+}
+
+TEST(NumberUtil, ConvertsReverseDigitStringsOfEveryLength) {
+  for (unsigned length = 0; length < 140; ++length) {
+    const Bits bits = noise(length, 9);
+    std::vector<unsigned char> bytes = bytesOf(bits);
+    std::string out = "before";
+    EXPECT_EQ(Qor_NumberUtil::bin2ReverseBinStr(bytes.data(), length, out), bits);
+    Bits others = bits;
+    std::replace(others.begin(), others.end(), '0', length % 2 != 0 ? '\xB1' : '3');
+    for (const unsigned before : {0x00U, 0xFFU}) {
+      std::vector<unsigned char> set(bytes.size() + 1, static_cast<unsigned char>(before));
+      Qor_NumberUtil::reverseBinStr2Bin(others, set.data());
+      EXPECT_EQ(set, bytesOf(bits + bitsOf(before * 0x101, set.size() * 8 - length)));
+    }
+  }
+  std::string out = "before";
+  EXPECT_EQ(Qor_NumberUtil::bin2ReverseBinStr(nullptr, 0, out), "");
+}
+
+TEST(NumberUtil, WritesNumbers) {
+  std::string out;
+  EXPECT_EQ(Qor_NumberUtil::uInt2DecStr(4294967295, out), "4294967295");
+  EXPECT_EQ(Qor_NumberUtil::uInt2HexStr(10, 4, out), "A");
+  EXPECT_EQ(Qor_NumberUtil::uInt2HexStr(0, 8, out), "00");
+  EXPECT_EQ(Qor_NumberUtil::uInt2HexStr(0x1ABCDEF, 32, out), "01ABCDEF");
+}
+
+TEST(NumberUtil, RefusesWhatItCannotConvertAndLeavesNothingHalfDone) {
+  std::string out = "before";
+  const auto hexOfNumber = [&](unsigned value, unsigned width) {
+    return thrownBy([&] { Qor_NumberUtil::uInt2HexStr(value, width, out); });
+  };
+  EXPECT_EQ(hexOfNumber(256, 8), "logic: 256 is wider than 8 bits");
+  EXPECT_EQ(hexOfNumber(0, 6), "logic: a width of 6 bits is not 4 to 32 in steps of 4");
+  EXPECT_EQ(hexOfNumber(0, 36), "logic: a width of 36 bits is not 4 to 32 in steps of 4");
+  EXPECT_EQ(out, "before");
+  for (std::size_t at = 0; at < 19; ++at) {
+    for (const char wrong : {'2', ' ', '/', '\0', '\xB0'}) {
+      Bits digits = noise(19);
+      digits[at] = wrong;
+      EXPECT_EQ(thrownBy([&] { Qor_NumberUtil::binStr2HexStr(digits, out); }),
+                "logic: character " + std::to_string(at) + " of the digit string is not a binary digit");
+    }
+    for (const char wrong : {'G', 'g', '/', ':', '@', '`', ' ', '\xC1'}) {
+      std::string hex(19, 'A');
+      hex[at] = wrong;
+      EXPECT_EQ(thrownBy([&] { Qor_NumberUtil::hexStr2BinStr(hex.c_str(), 30, out); }),
+                "logic: the text has a character that is not a hexadecimal digit");
+      const Qor_ByteBuffer text = bufferOf(hex.c_str());
+      EXPECT_EQ(thrownBy([&] { delete text.hex2Bin(0, 18); }),
+                "logic: the text has a character that is not a hexadecimal digit");
+    }
+  }
+  EXPECT_EQ(out, "");
+}
+
+TEST(ByteBuffer, TakesBitsOutAnywhere) {
+  const Bits bits = noise(96);
+  const Qor_ByteBuffer buffer = bufferOf(bytesOf(bits));
+  for (unsigned first = 0; first <= 96; ++first) {
+    for (unsigned count = 0; first + count <= 96; ++count) {
+      const std::unique_ptr<Qor_ByteBuffer> text(buffer.bin2HexString(first, count));
+      EXPECT_EQ(std::string(text->ptr()), hexOf(bits.substr(first, count)));
+      EXPECT_EQ(text->getSize(), (count + 3) / 4 + 1);
+      if (count < 1 || count > 32) continue;
+      EXPECT_EQ(bitsOf(buffer.getBits(first, count), count), bits.substr(first, count));
+    }
+  }
+}
+
+TEST(ByteBuffer, TurnsIntoHexadecimalTextAndBack) {
+  Qor_ByteBuffer buffer = bufferOf({0x12, 0xCB, 0xA0}), out = bufferOf("before");
+  buffer.bin2HexString(1, out);
+  EXPECT_STREQ(out.ptr(), "A0CB");
+  buffer.bin2HexString(3, out);
+  EXPECT_STREQ(out.ptr(), "");
+  buffer.bin2HexString(0, buffer);
+  EXPECT_STREQ(buffer.ptr(), "A0CB12");
+  const std::unique_ptr<Qor_ByteBuffer> odd(bufferOf("fA0cB12").hex2Bin(0, 6));
+  EXPECT_EQ(std::vector<unsigned char>(odd->uPtr(), odd->uPtr() + odd->getSize()),
+            std::vector<unsigned char>({0x12, 0xCB, 0xA0, 0x0F}));
+  const std::unique_ptr<Qor_ByteBuffer> middle(bufferOf("A0CB12").hex2Bin(1, 3));
+  EXPECT_EQ(std::vector<unsigned char>(middle->uPtr(), middle->uPtr() + middle->getSize()),
+            std::vector<unsigned char>({0xCB, 0x00}));
+}
+
+TEST(ByteBuffer, RefusesWhatDoesNotLieInIt) {
+  const Qor_ByteBuffer two = bufferOf({0x31, 0x31}), none;
+  Qor_ByteBuffer out = bufferOf("before");
+  EXPECT_EQ(thrownBy([&] { two.getBits(9, 8); }),
+            "logic: 8 bits from bit 9 on do not lie in a buffer of 2 bytes");
+  EXPECT_EQ(thrownBy([&] { two.getBits(4294967295, 32); }),
+            "logic: 32 bits from bit 4294967295 on do not lie in a buffer of 2 bytes");
+  EXPECT_EQ(thrownBy([&] { two.getBits(0, 0); }), "logic: a field of 0 bits is not 1 to 32 bits long");
+  EXPECT_EQ(thrownBy([&] { two.getBits(0, 33); }), "logic: a field of 33 bits is not 1 to 32 bits long");
+  EXPECT_EQ(thrownBy([&] { two.bin2HexString(3, out); }),
+            "logic: byte 3 does not lie in a buffer of 2 bytes");
+  EXPECT_STREQ(out.ptr(), "before");
+  EXPECT_EQ(thrownBy([&] { delete none.bin2HexString(0U, 1U); }),
+            "logic: 1 bits from bit 0 on do not lie in a buffer of 0 bytes");
+  EXPECT_EQ(thrownBy([&] { delete two.hex2Bin(1, 0); }),
+            "logic: digits 1 to 0 do not lie in a text of 2 bytes");
+  EXPECT_EQ(thrownBy([&] { delete two.hex2Bin(0, 2); }),
+            "logic: digits 0 to 2 do not lie in a text of 2 bytes");
+}
+
+}  // namespace
