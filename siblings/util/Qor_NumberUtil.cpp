@@ -17,8 +17,10 @@ std::uint64_t load8(const char* text) {
 
 /// A 1 in each byte that equals '1', a 0 in every other.
 std::uint64_t onesAmong(std::uint64_t text) {
+  const std::uint64_t bits = text ^ eightZeros;
+  if ((bits & ~lowBitOfEach) == 0) return bits;
   constexpr std::uint64_t low7 = 0x7F7F7F7F7F7F7F7F;
-  const std::uint64_t difference = text ^ (eightZeros | lowBitOfEach);
+  const std::uint64_t difference = bits ^ lowBitOfEach;
   return ~((((difference & low7) + low7) | difference) >> 7) & lowBitOfEach;
 }
 
@@ -54,10 +56,9 @@ std::string& Qor_NumberUtil::uInt2HexStr(unsigned value, unsigned bitWidth, std:
   if (std::uint64_t{value} >> bitWidth != 0) {
     throw std::logic_error(std::to_string(value) + " is wider than " + std::to_string(bitWidth) + " bits");
   }
-  std::string text(bitWidth / 4, '0');
-  for (auto digit = text.rbegin(); digit != text.rend(); ++digit, value >>= 4)
-    *digit = hexPairs[value & 15].low;
-  return out = std::move(text);
+  out.assign(bitWidth / 4, '0');
+  for (auto digit = out.rbegin(); value != 0; ++digit, value >>= 4) *digit = hexPairs[value & 15].low;
+  return out;
 }
 
 std::string& Qor_NumberUtil::binStr2HexStr(const std::string& digits, std::string& out) {

@@ -6,30 +6,14 @@
 #include "QorCore.h"
 #include "QorJtag.h"
 #include "QorUtil.h"
+#include "port/InputRecords.h"
 
 namespace QorRT {
 
 namespace {
 
-// What stands on the wire for one bit of an input port.
-constexpr std::size_t asyncRecordDigits = 4;  // value, activity up, activity down, one unused
-constexpr std::size_t syncRecordDigits =
-    6;  // the same three, sync activity up, sync activity down, one unused
-
 constexpr QorVIO_Command::PulseTrain lowThroughout = {'0', '0', '0', '0', '0', '0', '0', '0',
                                                       '0', '0', '0', '0', '0', '0', '0', '0'};
-
-/// Digit `offset` of every record, into the characters of one port string; with `keepOnes` those that are '1'
-/// stay so.
-template <std::size_t recordDigits>
-void takeColumn(const char* digits, std::size_t offset, std::string& port, bool keepOnes) {
-  const char* digit = digits + offset;
-  const int kept = keepOnes ? '1' : '0';
-  for (char& c : port) {
-    c = static_cast<char>(*digit | (c & kept));
-    digit += recordDigits;
-  }
-}
 
 }  // namespace
 
@@ -114,15 +98,11 @@ unsigned QorVIO_Command::recordDigitCount() const {
 }
 
 void QorVIO_Command::decodeRecords(const char* digits) {
-  takeColumn<asyncRecordDigits>(digits, 0, asyncInValues, false);
-  takeColumn<asyncRecordDigits>(digits, 1, asyncInActivityUp, keepsActivity);
-  takeColumn<asyncRecordDigits>(digits, 2, asyncInActivityDown, keepsActivity);
-  digits += asyncRecordDigits * asyncInValues.size();
-  takeColumn<syncRecordDigits>(digits, 0, syncInValues, false);
-  takeColumn<syncRecordDigits>(digits, 1, syncInActivityUp, keepsActivity);
-  takeColumn<syncRecordDigits>(digits, 2, syncInActivityDown, keepsActivity);
-  takeColumn<syncRecordDigits>(digits, 3, syncInSyncActivityUp, keepsActivity);
-  takeColumn<syncRecordDigits>(digits, 4, syncInSyncActivityDown, keepsActivity);
+  splitAsyncRecords(digits, asyncInValues.size(),
+                    {asyncInValues.data(), asyncInActivityUp.data(), asyncInActivityDown.data()});
+  splitSyncRecords(digits + asyncRecordDigits * asyncInValues.size(), syncInValues.size(),
+                   {syncInValues.data(), syncInActivityUp.data(), syncInActivityDown.data(),
+                    syncInSyncActivityUp.data(), syncInSyncActivityDown.data()});
 }
 
 }  // namespace QorRT
