@@ -8,6 +8,7 @@
 #include "QorJtag.h"
 
 unsigned bench::portWidth = 0;
+std::size_t bench::exchanges = 0;
 
 namespace {
 
@@ -58,6 +59,7 @@ void Qor_CoreComm::getCoreStatus(unsigned, QOR_CORE_REF, QOR_CORE_INFO* info, Qo
 
 void Qor_CoreComm::commandSequence(unsigned, const std::string&, unsigned char* result, unsigned bitCount,
                                    QOR_PROGRESS_CALLBACK) {
+  ++bench::exchanges;
   if (result != nullptr) std::fill_n(result, bitCount / 8, static_cast<unsigned char>(0x5A));
 }
 
