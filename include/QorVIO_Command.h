@@ -1,12 +1,14 @@
-// The host's image of a core's four ports, and the command texts that move it to and from the core.
-//
-// Conventions
-//  1. The image is characters, '0' or '1': character i of a port string belongs to port bit i. Once
-//     initialised, no string ever changes its length.
-//  2. A write sends the whole output image; its masks say which bits the core takes. A read replaces the
-//     whole input image, or leaves it as it was when it fails.
-//  3. Positions given to the accessors are below the port's width; they are not checked.
-//  4. No lock of its own: the holder of the session's target lock uses it.
+/// @file
+/// The host's image of a core's four ports, and the command texts that move it to and from the core.
+///
+/// Conventions
+///
+///  1. The image is characters, '0' or '1': character i of a port string belongs to port bit i. Once
+///     initialised, no string ever changes its length.
+///  2. A write sends the whole output image; its masks say which bits the core takes. A read replaces the
+///     whole input image, or leaves it as it was when it fails.
+///  3. Positions given to the accessors are below the port's width; they are not checked.
+///  4. No lock of its own: the holder of the session's target lock uses it.
 #pragma once
 
 #include <array>
@@ -21,8 +23,10 @@
 
 namespace QorRT {
 
+/// The port image of one core. A new one has no ports.
 class QORVIO_API QorVIO_Command {
  public:
+  /// Steps of a pulse train.
   static constexpr unsigned int stepCount = 16;
 
   /// The values of one synchronous output at steps 0 to 15. The string is held in place, because a port has
@@ -30,10 +34,13 @@ class QORVIO_API QorVIO_Command {
   using PulseTrain = std::array<char, stepCount>;
 
   QorVIO_Command();
-  QorVIO_Command(const QorVIO_Command& other);
   /// Copies the whole image, or throws with the target as it was.
+  /// @{
+  QorVIO_Command(const QorVIO_Command& other);
   QorVIO_Command& operator=(const QorVIO_Command& other);
+  /// @}
   ~QorVIO_Command();
+  /// Exchanges the images; throws nothing.
   void swap(QorVIO_Command& other) noexcept;
 
   /// Sizes the image by the record's widths, all '0'. Called once, on a new object.
@@ -55,17 +62,21 @@ class QORVIO_API QorVIO_Command {
   void readInputs(unsigned int session, const QOR_CORE_REF& coreRef);
 
   /// Says whether the next read adds its activity flags to those in the image, because they have not reached
-  /// the caller, instead of replacing them. False at first.
+  /// the caller, instead of replacing them. False at first, and after each read.
   void setKeepsActivity(bool keeps) { keepsActivity = keeps; }
 
   /// Marks no output for the next write.
   void clearMasks();
 
   /// Whole strings are of the port's width, '0' and '1' only.
+  /// @{
   void setAsyncOutValues(std::string values) { asyncOutValues = std::move(values); }
   void setAsyncOutMask(std::string mask) { asyncOutMask = std::move(mask); }
   void setSyncOutMask(std::string mask) { syncOutMask = std::move(mask); }
+  /// @}
 
+  /// One bit, '0' or '1', or the 16 steps of one synchronous output.
+  /// @{
   void setAsyncOutValueBit(unsigned int position, char c) { asyncOutValues[position] = c; }
   void setAsyncOutMaskBit(unsigned int position, char c) { asyncOutMask[position] = c; }
   void setSyncOutMaskBit(unsigned int position, char c) { syncOutMask[position] = c; }
@@ -73,7 +84,10 @@ class QORVIO_API QorVIO_Command {
   void setSyncOutPulseTrainBit(unsigned int position, unsigned int step, char c) {
     syncOutPulseTrains[position][step] = c;
   }
+  /// @}
 
+  /// What the last read brought of one input bit (out, '0' or '1' each).
+  /// @{
   void getAsyncInBits(unsigned int position, char* value, char* activityUp, char* activityDown) const {
     *value = asyncInValues[position];
     *activityUp = asyncInActivityUp[position];
@@ -87,7 +101,10 @@ class QORVIO_API QorVIO_Command {
     *syncActivityUp = syncInSyncActivityUp[position];
     *syncActivityDown = syncInSyncActivityDown[position];
   }
+  /// @}
 
+  /// What the last read brought, a character a port bit.
+  /// @{
   const std::string& getAsyncInValues() const { return asyncInValues; }
   const std::string& getAsyncInActivityUp() const { return asyncInActivityUp; }
   const std::string& getAsyncInActivityDown() const { return asyncInActivityDown; }
@@ -96,6 +113,7 @@ class QORVIO_API QorVIO_Command {
   const std::string& getSyncInActivityDown() const { return syncInActivityDown; }
   const std::string& getSyncInSyncActivityUp() const { return syncInSyncActivityUp; }
   const std::string& getSyncInSyncActivityDown() const { return syncInSyncActivityDown; }
+  /// @}
 
  private:
   const std::string& outputData();

@@ -1,6 +1,7 @@
 #include "QorVIO_Command.h"
 
 #include <algorithm>
+#include <initializer_list>
 #include <utility>
 
 #include "QorCore.h"
@@ -14,6 +15,16 @@ namespace {
 
 constexpr QorVIO_Command::PulseTrain lowThroughout = {'0', '0', '0', '0', '0', '0', '0', '0',
                                                       '0', '0', '0', '0', '0', '0', '0', '0'};
+
+/// Digit k of every record becomes '1' where port string k, counted from 1, has a '1'.
+template <std::size_t recordDigits>
+void addOnes(std::initializer_list<const std::string*> ports, char* digits) {
+  for (const std::string* port : ports) {
+    ++digits;
+    for (std::size_t i = 0; i < port->size(); ++i)
+      if ((*port)[i] == '1') digits[recordDigits * i] = '1';
+  }
+}
 
 }  // namespace
 
@@ -89,7 +100,15 @@ void QorVIO_Command::readInputs(unsigned session, const QOR_CORE_REF& coreRef) {
 
   result.bin2HexString(0, scratch.resultHex);
   Qor_NumberUtil::hexStr2BinStr(scratch.resultHex.ptr(), recordDigitCount(), scratch.inputDigits);
-  decodeRecords(scratch.inputDigits.data());
+  char* const digits = scratch.inputDigits.data();
+  if (keepsActivity) {
+    addOnes<asyncRecordDigits>({&asyncInActivityUp, &asyncInActivityDown}, digits);
+    addOnes<syncRecordDigits>(
+        {&syncInActivityUp, &syncInActivityDown, &syncInSyncActivityUp, &syncInSyncActivityDown},
+        digits + asyncRecordDigits * asyncInValues.size());
+  }
+  keepsActivity = false;
+  decodeRecords(digits);
 }
 
 unsigned QorVIO_Command::recordDigitCount() const {

@@ -2,6 +2,7 @@
 #include <stdexcept>
 
 #include "Board.h"
+#include "FaultyCable.h"
 
 namespace {
 
@@ -100,56 +101,24 @@ TEST(PulseTrains, OnASlowDesignClockPlayOnce) {
   EXPECT_EQ(std::count(seen.begin(), seen.end(), '1'), 1) << seen;
 }
 
-/// A link that answers with constant bits once it is cut.
-class CutCable : public QorRT::Qor_Cable {
- public:
-  CutCable(std::unique_ptr<QorRT::Qor_Cable> whole, const bool& isCut, const unsigned char& level)
-      : whole_(std::move(whole)), isCut_(isCut), level_(level) {}
-  const std::vector<QorRT::Qor_Device>& devices() const override { return whole_->devices(); }
-
- private:
-  void run(std::vector<QorRT::Qor_Scan>& scans) override {
-    for (QorRT::Qor_Scan& scan : scans) {
-      if (isCut_) {
-        scan.in.assign((scan.bitCount + 7) / 8, level_);
-      } else if (scan.kind == QorRT::Qor_Scan::Kind::ir) {
-        whole_->scanIr(scan.device, scan.userChain);
-      } else if (scan.kind == QorRT::Qor_Scan::Kind::idle) {
-        whole_->idle(scan.cycles);
-      } else {
-        auto number = whole_->scanDr(scan.device, scan.out, scan.bitCount, scan.capture);
-        if (scan.capture) scan.in = whole_->captured(number);
-      }
-    }
-    whole_->flush();
-  }
-
-  std::unique_ptr<QorRT::Qor_Cable> whole_;
-  const bool& isCut_;
-  const unsigned char& level_;
-};
-
 TEST(Links, ThatAreCutFailEveryTransferAndGoOnAfterwards) {
-  bool isCut = false;
-  unsigned char level = 0;
-  auto whole = chain().device(0x11).core(1, 0, vio().asyncOut(4).asyncIn(4).design(loopback())).cable();
-  Board board(std::make_unique<CutCable>(std::move(whole), isCut, level));
+  auto link = std::make_unique<qorsim::FaultyCable>(
+      chain().device(0x11).core(1, 0, vio().asyncOut(4).asyncIn(4).design(loopback())).cable());
+  qorsim::FaultyCable& cut = *link;
+  Board board(std::move(link));
   VioCore core(board, first);
   core.write({{"async_out_data", "6"}});
   core.read();
-  const std::pair<unsigned char, const char*> levels[] = {{0x00, "all zeros"}, {0xFF, "all ones"}};
-  for (auto [bits, what] : levels) {
-    isCut = true;
-    level = bits;
+  for (bool level : {false, true}) {
+    cut.next(qorsim::silence(level)).next(qorsim::silence(level));
     TextMap map{{"async_out_data", "9"}};
     TextMap* pointer = &map;
-    const std::string message =
-        std::string("100 device 0, user chain 1, core 0: no debug hub answers, TDO is ") + what;
     EXPECT_EQ(QorVIO_writeValues(board.session, first, &pointer), failed);
     EXPECT_EQ(QorVIO_readValues(board.session, first, &pointer), failed);
-    EXPECT_THAT(board.takeMessages(), ElementsAre(message, message));
+    const std::string what = level ? "all ones" : "all zeros";
+    EXPECT_THAT(board.takeMessages(),
+                testing::Each("100 device 0, user chain 1, core 0: no debug hub answers, TDO is " + what));
     EXPECT_EQ(map, (TextMap{{"async_out_data", "9"}}));
-    isCut = false;
     TextMap values = core.read();
     EXPECT_EQ(values["async_in_data"], "6");
     EXPECT_EQ(values["async_in_data.activity_up"], "6");  // told again rather than lost

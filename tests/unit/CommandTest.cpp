@@ -41,7 +41,7 @@ TEST_F(VioTest, CommandTextsHoldWhatEachWidthAsksFor) {
 
 TEST_F(VioTest, AWriteIsOneTextAndOneFlush) {
   initCore(1, 2, 2, 1);
-  EXPECT_EQ(define("first", asyncOut, {0}), 0U);
+  EXPECT_EQ(QorVIO_defineSignal(session, ref, "first", asyncOut, 0), 0U);
   siblings.take();
   EXPECT_EQ(write({{"first", "1"}}), 0U);
   EXPECT_THAT(siblings.take(),
@@ -56,11 +56,12 @@ TEST_F(VioTest, AWriteIsOneTextAndOneFlush) {
 TEST_F(VioTest, AReadIsOneTextAndItsRecordsFillTheImage) {
   initCore(1, 2, 2, 1);
   siblings.readDigits = "1100101100010010";
-  TextMap map = read();
+  TextMap map = read({{"note", "mine"}, {"sync_in_data", "old"}});
   EXPECT_THAT(siblings.take(),
               ElementsAre("lock 7 60000", "sequence 00 1 0 03 1 00000020 0\n00 1 0 04 1 00000004 0 -> 40",
                           "unlock 7"));
-  EXPECT_EQ(map, (TextMap{{"async_in_data", "1"},
+  EXPECT_EQ(map, (TextMap{{"note", "mine"},
+                          {"async_in_data", "1"},
                           {"async_in_data.value", "1"},
                           {"async_in_data.activity_up", "1"},
                           {"async_in_data.activity_down", "0"},

@@ -11,7 +11,7 @@ const char* const lookupFailed =
 /// A core of another library.
 class OtherCore : public QorRT::Qor_Core {
  public:
-  OtherCore() : Qor_Core(session, ref, {0, 7, 0, 0, 0}, nullptr, 0) {}
+  explicit OtherCore(unsigned type) : Qor_Core(session, ref, {0, type, 0, 0, 0}, nullptr, 0) {}
   bool initFromStatusWord(unsigned) override { return true; }
 };
 
@@ -55,7 +55,10 @@ TEST_F(VioTest, FailedInitLeavesNothingRegistered) {
 }
 
 TEST_F(VioTest, ACoreOfAnotherLibraryIsReplacedByInitOnly) {
-  siblings.cores["0.1.0"] = std::make_unique<OtherCore>();
+  siblings.cores["0.1.0"] = std::make_unique<OtherCore>(9);  // of the type, but not of the class
+  EXPECT_EQ(write({}), failed);
+  EXPECT_THAT(siblings.take(), locked(lookupFailed));
+  siblings.cores["0.1.0"] = std::make_unique<OtherCore>(7);
   EXPECT_EQ(QorVIO_terminateCore(session, ref), 0U);
   EXPECT_TRUE(siblings.take().empty());
   EXPECT_EQ(write({}), failed);

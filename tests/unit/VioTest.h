@@ -44,8 +44,7 @@ class VioTest : public testing::Test {
     return QorVIO_writeValues(session, ref, &pointer);
   }
 
-  TextMap read() {
-    TextMap map;
+  TextMap read(TextMap map = {}) {
     TextMap* pointer = &map;
     EXPECT_EQ(QorVIO_readValues(session, ref, &pointer), 0U);
     return map;
