@@ -1,23 +1,25 @@
-// QorVIO: virtual input/output cores in an FPGA, reached over JTAG.
-//
-// Conventions
-//  1. Every function takes the session first and the core's address second, and returns 0, or 0x80000000
-//     after it has sent the session a message that says what is wrong: type 0x100 for an error, 0x8000 for
-//     the notice of an abort. Nothing is ever thrown across this interface. QorVIO_isVIOCore may return
-//     another status.
-//  2. Every function but QorVIO_terminateCore holds the session's target lock meanwhile, and fails when that
-//     is not free within 60 seconds; it is not recursive, so a message handler calls none of them. So threads
-//     may share a session and a core. Removing a core (QorVIO_terminateCore, QorVIO_initCore on its address,
-//     closing the session) must not overlap another call on that core.
-//  3. A port is a row of bits, numbered from 0. In a byte array bit i is bit (i mod 8) of byte i / 8, and a
-//     port of width W takes ceil(W / 8) bytes.
-//  4. Names are told apart without regard to the case of A to Z. Inputs and outputs are two name spaces. The
-//     names async_out_data, sync_out_data, async_in_data and sync_in_data stand for whole ports from the
-//     start.
-//  5. Port type codes: 0 synchronous output, 1 synchronous input, 2 asynchronous output, 3 asynchronous
-//     input.
-//  6. A map is passed as the address of the caller's variable that points to it.
-//  7. A failed call to the target leaves the caller's arrays and maps as they were.
+/// @file
+/// QorVIO: virtual input/output cores in an FPGA, reached over JTAG.
+///
+/// Conventions
+///
+///  1. Every function takes the session first and the core's address second, and returns 0, or 0x80000000
+///     after it has sent the session a message that says what is wrong: type 0x100 for an error, 0x8000 for
+///     the notice of an abort. Nothing is ever thrown across this interface. QorVIO_isVIOCore may return
+///     another status.
+///  2. Every function but QorVIO_terminateCore holds the session's target lock meanwhile, and fails when that
+///     is not free within 60 seconds; it is not recursive, so a message handler calls none of them. So
+///     threads may share a session and a core. Removing a core (QorVIO_terminateCore, QorVIO_initCore on its
+///     address, closing the session) must not overlap another call on that core.
+///  3. A port is a row of bits, numbered from 0. In a byte array bit i is bit (i mod 8) of byte i / 8, and a
+///     port of width W takes ceil(W / 8) bytes.
+///  4. Names are told apart without regard to the case of A to Z. Inputs and outputs are two name spaces. The
+///     names async_out_data, sync_out_data, async_in_data and sync_in_data stand for whole ports from the
+///     start.
+///  5. Port type codes: 0 synchronous output, 1 synchronous input, 2 asynchronous output, 3 asynchronous
+///     input.
+///  6. A map is passed as the address of the caller's variable that points to it.
+///  7. A failed call to the target leaves the caller's arrays and maps as they were.
 #pragma once
 
 #include <string>

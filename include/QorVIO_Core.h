@@ -1,12 +1,15 @@
-// One VIO core at one address of a session: its port widths, its named groups, and transfers by name or whole
-// port.
-//
-// Conventions
-//  1. Every failure is a standard exception, most of them logic_error; the exported functions turn it into a
-//     message.
-//  2. No lock of its own: the holder of the session's target lock uses it.
-//  3. Port type codes, names, bits and bytes are as in QorVIO.h; values of groups as in QorVIO_SignalGroup.h.
-//  4. Checks come first: a name, size or array that fails one means that nothing was staged or sent.
+/// @file
+/// One VIO core at one address of a session: its port widths, its named groups, and transfers by name or
+/// whole port.
+///
+/// Conventions
+///
+///  1. Every failure is a standard exception, most of them logic_error; the exported functions turn it into a
+///     message.
+///  2. No lock of its own: the holder of the session's target lock uses it.
+///  3. Port type codes, names, bits and bytes are as in QorVIO.h; values of groups as in
+///     QorVIO_SignalGroup.h.
+///  4. Checks come first: a name, size or array that fails one means that nothing was staged or sent.
 #pragma once
 
 #include <array>
@@ -23,9 +26,12 @@
 
 namespace QorRT {
 
+/// A VIO core that has been set up: what QorVIO_initCore puts into the core list.
 class QORVIO_API QorVIO_Core : public Qor_SignalCore {
  public:
-  // Where the status word keeps the port widths, in bits: before version 6.2, before 10.0, and since.
+  /// Where the status word keeps the port widths and versions, in bits: before version 6.2, before 10.0, and
+  /// since.
+  /// @{
   static const unsigned int BEFORE_062_ASYNC_INPUT_COUNT_BIT_OFFSET = 40;
   static const unsigned int BEFORE_062_SYNC_INPUT_COUNT_BIT_OFFSET = 48;
   static const unsigned int BEFORE_062_ASYNC_OUTPUT_COUNT_BIT_OFFSET = 56;
@@ -49,6 +55,7 @@ class QORVIO_API QorVIO_Core : public Qor_SignalCore {
   static const unsigned int ASYNC_OUTPUT_COUNT_BIT_OFFSET = 92;
   static const unsigned int SYNC_OUTPUT_COUNT_BIT_OFFSET = 108;
   static const unsigned int PORT_BIT_LEN = 16;
+  /// @}
 
   /// `statusWord` (in) holds `bitCount` bits and is copied. The core has no ports before initFromStatusWord.
   QorVIO_Core(unsigned int session, QOR_CORE_REF coreRef, QOR_CORE_INFO coreInfo,
@@ -64,9 +71,11 @@ class QORVIO_API QorVIO_Core : public Qor_SignalCore {
   bool initFromStatusWord(unsigned int session) override;
 
   /// The generic signals of a core are not used here: adding and removing do nothing, getting gives null.
+  /// @{
   void addSignal(Qor_SignalBase* signal) override;
   Qor_SignalBase* getSignal(const std::string& name, unsigned int first, unsigned int last) override;
   void removeSignal(Qor_SignalBase* signal) override;
+  /// @}
 
   /// Decodes a status word (in) by the core's version into `*vioCoreInfo` (out). Session, address and
   /// `bitCount` take no part. Checks nothing.
@@ -94,7 +103,7 @@ class QORVIO_API QorVIO_Core : public Qor_SignalCore {
                    hash_map<std::string, std::string>* outputHashMap);
 
   /// Reads all inputs in one exchange into the map (out); see QorVIO_readValues. Each entry is set wholly or
-  /// not at all.
+  /// not at all. When not all are set, the next read tells their activity again.
   void readValues(unsigned int session, QOR_CORE_REF coreRef,
                   hash_map<std::string, std::string>* inputHashMap);
 
@@ -130,6 +139,7 @@ class QORVIO_API QorVIO_Core : public Qor_SignalCore {
                    unsigned int syncInDataBitCount);
 
  protected:
+  /// The four port widths, by signal type.
   void setCorePhysicalSignalCounts() override;
 
  private:

@@ -1,10 +1,12 @@
-// The table of a core's named groups.
-//
-// Conventions
-//  1. Names are told apart by length and byte, but A to Z equal a to z. Every other byte, NUL included,
-//     counts as it is.
-//  2. A key looks at the name that its group keeps, so a group outlives its entry; looking a name up makes no
-//     copy of it and leaves no entry behind.
+/// @file
+/// The table of a core's named groups.
+///
+/// Conventions
+///
+///  1. Names are told apart by length and byte, but A to Z equal a to z. Every other byte, NUL included,
+///     counts as it is.
+///  2. A key looks at the name that its group keeps, so a group outlives its entry; looking a name up makes
+///     no copy of it and leaves no entry behind.
 #pragma once
 
 #include <cstddef>
@@ -17,12 +19,15 @@
 
 namespace QorRT {
 
+/// Tells names apart as the conventions say.
 struct QorVIO_NameEqual {
+  /// The byte, A to Z as a to z.
   static unsigned char folded(char letter) {
     auto byte = static_cast<unsigned char>(letter);
     return byte >= 'A' && byte <= 'Z' ? static_cast<unsigned char>(byte - 'A' + 'a') : byte;
   }
 
+  /// True when the names are the same.
   bool operator()(std::string_view one, std::string_view other) const {
     if (one.size() != other.size()) return false;
     for (std::size_t i = 0; i < one.size(); ++i)
@@ -34,6 +39,7 @@ struct QorVIO_NameEqual {
 /// FNV-1a over the folded bytes. Not noexcept on purpose: the table then keeps each hash instead of computing
 /// it again for every name that it passes on the way to another.
 struct QorVIO_NameHash {
+  /// The same for names that are the same.
   std::size_t operator()(std::string_view name) const {
     std::uint64_t hash = 14695981039346656037U;
     for (char letter : name) hash = (hash ^ QorVIO_NameEqual::folded(letter)) * 1099511628211U;
@@ -41,6 +47,7 @@ struct QorVIO_NameHash {
   }
 };
 
+/// The groups by name, each owned by its entry.
 using QorVIO_NameTable = std::unordered_map<std::string_view, std::unique_ptr<QorVIO_SignalGroup>,
                                             QorVIO_NameHash, QorVIO_NameEqual>;
 

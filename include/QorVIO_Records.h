@@ -1,4 +1,5 @@
-// The records and the map that cross the exported interface.
+/// @file
+/// The records and the map that cross the exported interface.
 #pragma once
 
 #include <string>
@@ -16,16 +17,16 @@ using hash_map = std::unordered_map<Key, Value>;
 
 /// What a VIO core says of itself. Widths are in bits; 0 means that the core has no such port.
 struct QORVIO_CORE_INFO {
-  unsigned manufacturer_id;
-  unsigned core_type;  // 9
-  unsigned core_major_version;
-  unsigned core_minor_version;
-  unsigned core_revision;
-  unsigned cg_major_version;  // the cg fields are 0 for cores before version 10.0
-  unsigned cg_minor_version;
-  unsigned cg_minor_version_alpha;
-  unsigned async_input_count;
-  unsigned sync_input_count;
-  unsigned async_output_count;
-  unsigned sync_output_count;
+  unsigned manufacturer_id;         ///< as in QOR_CORE_INFO
+  unsigned core_type;               ///< 9
+  unsigned core_major_version;      ///< as in QOR_CORE_INFO
+  unsigned core_minor_version;      ///< as in QOR_CORE_INFO
+  unsigned core_revision;           ///< as in QOR_CORE_INFO
+  unsigned cg_major_version;        ///< the cg fields are 0 for cores before version 10.0
+  unsigned cg_minor_version;        ///< as the major one
+  unsigned cg_minor_version_alpha;  ///< as the major one
+  unsigned async_input_count;       ///< bits
+  unsigned sync_input_count;        ///< bits
+  unsigned async_output_count;      ///< bits
+  unsigned sync_output_count;       ///< bits
 };

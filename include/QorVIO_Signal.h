@@ -1,4 +1,5 @@
-// A one-bit signal for clients that keep signals of their own.
+/// @file
+/// A one-bit signal for clients that keep signals of their own.
 #pragma once
 
 #include <string>
@@ -14,8 +15,11 @@ class QORVIO_API QorVIO_Signal : public Qor_Signal {
  public:
   /// The arguments are those of Qor_Signal.
   QorVIO_Signal(unsigned int type, unsigned int unit, unsigned int position, const std::string& name);
+  /// Copies the properties too. Assigning is wholly done, or throws bad_alloc with the target as it was.
+  /// @{
   QorVIO_Signal(const QorVIO_Signal& other);
   QorVIO_Signal& operator=(const QorVIO_Signal& other);
+  /// @}
   ~QorVIO_Signal();
 
  private:

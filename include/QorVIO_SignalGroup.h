@@ -1,15 +1,17 @@
-// A named, ordered list of bits of one port: a bus, or a single signal.
-//
-// Conventions
-//  1. Entry i of the positions is the port bit that carries bit i of the value; the width n is the number of
-//     entries.
-//  2. A value takes B = (n + 7) / 8 bytes; its bit i is bit (i mod 8) of byte i / 8. Bits above n - 1 are
-//     ignored in values written and not set in values read. A sequence of values is consecutive blocks of B
-//     bytes.
-//  3. A group works on its core's port image. Nothing here talks to the core: a write or read of the image
-//     does.
-//  4. Failures are logic_error, or bad_alloc where something is copied, and leave image and buffers as they
-//     were.
+/// @file
+/// A named, ordered list of bits of one port: a bus, or a single signal.
+///
+/// Conventions
+///
+///  1. Entry i of the positions is the port bit that carries bit i of the value; the width n is the number of
+///     entries.
+///  2. A value takes B = (n + 7) / 8 bytes; its bit i is bit (i mod 8) of byte i / 8. Bits above n - 1 are
+///     ignored in values written and not set in values read. A sequence of values is consecutive blocks of B
+///     bytes.
+///  3. A group works on its core's port image. Nothing here talks to the core: a write or read of the image
+///     does.
+///  4. Failures are logic_error, or bad_alloc where something is copied, and leave image and buffers as they
+///     were.
 #pragma once
 
 #include <string>
@@ -23,6 +25,7 @@ namespace QorRT {
 class QorVIO_Command;
 
 /// Final, because it has no virtual destructor: whoever deletes one deletes all of it.
+/// One named group of a core; see the conventions above.
 class QORVIO_API QorVIO_SignalGroup final : public Qor_SignalGroup {
  public:
   /// `command` is the port image of the core; it is not owned and outlives the group. `type` is one of the
@@ -32,8 +35,10 @@ class QORVIO_API QorVIO_SignalGroup final : public Qor_SignalGroup {
                      const std::string& name, const std::string& keyName);
   /// A copy works on the same port image as its source. Assigning is wholly done, or throws bad_alloc with
   /// the target as it was; a group that is filed in a table is never assigned to.
+  /// @{
   QorVIO_SignalGroup(const QorVIO_SignalGroup& other);
   QorVIO_SignalGroup& operator=(const QorVIO_SignalGroup& other);
+  /// @}
   ~QorVIO_SignalGroup();
 
   /// The width in bits.

@@ -1,18 +1,20 @@
-// Simulated boards, for tests and demonstrations without hardware. A board is built by a sentence:
-//
-//   auto cable = qorsim::chain()
-//                    .device(0x0A5F1093).named("fpga").irLength(6)
-//                    .core(1, 0, qorsim::vio().asyncOut(8).asyncIn(8).design(qorsim::loopback()))
-//                    .core(1, 1, qorsim::otherCore(7))
-//                    .device(0x1234567B)
-//                    .cable();
-//
-// Conventions
-//  1. Device 0, the first one named, is nearest to TDO.
-//  2. What the hardware could not be is refused with an invalid_argument whose text names the device, the
-//  core and the value; the board stays as it was then.
-//  3. Copies of a board or a core share its design objects: give each core that is to live on its own a
-//  design of its own.
+/// @file
+/// Simulated boards, for tests and demonstrations without hardware. A board is built by a sentence:
+///
+///     auto cable = qorsim::chain()
+///                      .device(0x0A5F1093).named("fpga").irLength(6)
+///                      .core(1, 0, qorsim::vio().asyncOut(8).asyncIn(8).design(qorsim::loopback()))
+///                      .core(1, 1, qorsim::otherCore(7))
+///                      .device(0x1234567B)
+///                      .cable();
+///
+/// Conventions
+///
+///  1. Device 0, the first one named, is nearest to TDO.
+///  2. What the hardware could not be is refused with an invalid_argument whose text names the device, the
+///     core and the value; the board stays as it was then.
+///  3. Copies of a board or a core share its design objects: give each core that is to live on its own a
+///     design of its own.
 #pragma once
 
 #include <memory>
@@ -30,18 +32,25 @@ namespace qorsim {
 /// on a board.
 class QOR_API CoreSpec {
  public:
+  /// A core of that type; vio() and otherCore() read better.
   explicit CoreSpec(unsigned type);
 
+  /// The width of a port, 0 when it is not set.
+  /// @{
   CoreSpec& asyncIn(unsigned width);
   CoreSpec& syncIn(unsigned width);
   CoreSpec& asyncOut(unsigned width);
   CoreSpec& syncOut(unsigned width);
+  /// @}
 
   /// The core version, 10.0 when it is not set. Versions before 10.0 have an older status word; before 6.2
   /// that tells no port wider than 255 bits.
   CoreSpec& version(unsigned major, unsigned minor);
+  /// 0, and hexadecimal 51, when they are not set.
+  /// @{
   CoreSpec& revision(unsigned number);
   CoreSpec& manufacturer(unsigned id);
+  /// @}
 
   /// Of versions from 10.0 on only; 1.0.0 when it is not set.
   CoreSpec& cgVersion(unsigned major, unsigned minor, unsigned minorAlpha);
@@ -49,6 +58,7 @@ class QOR_API CoreSpec {
   /// What stands behind the ports; nothing, as idle(), when it is not set.
   CoreSpec& design(std::shared_ptr<Design> design);
 
+  /// What has been said so far.
   const CoreDescription& description() const { return description_; }
 
  private:
@@ -67,6 +77,7 @@ class QOR_API ChainBuilder {
  public:
   /// The next device, with an IR of 6 bits; `idcode` 0 when it has none.
   ChainBuilder& device(unsigned idcode = 0);
+  /// The name of the device, for people.
   ChainBuilder& named(const std::string& name);
 
   /// 4 to 32 bits.

@@ -1,4 +1,5 @@
-// The cable to a simulated board, in process.
+/// @file
+/// The cable to a simulated board, in process.
 #pragma once
 
 #include <cstddef>
@@ -28,8 +29,10 @@ class QOR_API SimCable : public QorRT::Qor_Cable {
   void setTcksPerClock(unsigned tcks);
 
   /// How many queues have run so far, and how many IR and DR scans were in them.
+  /// @{
   std::size_t exchanges() const { return exchanges_; }
   std::size_t scans() const { return scans_; }
+  /// @}
 
  private:
   void run(std::vector<QorRT::Qor_Scan>& scans) override;

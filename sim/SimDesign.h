@@ -1,4 +1,5 @@
-// The design behind a simulated VIO core: what drives its inputs and uses its outputs.
+/// @file
+/// The design behind a simulated VIO core: what drives its inputs and uses its outputs.
 #pragma once
 
 #include <cstddef>
@@ -15,11 +16,15 @@ namespace qorsim {
 template <class Element>
 class PortBits {
  public:
+  /// `size` elements from `first` on, which stay the caller's.
   PortBits(Element* first, std::size_t size) : first_(first), size_(size) {}
 
+  /// The port's width, and its bits in order.
+  /// @{
   std::size_t size() const { return size_; }
   Element* begin() const { return first_; }
   Element* end() const { return first_ + size_; }
+  /// @}
 
   /// Throws out_of_range for a bit that the port does not have.
   Element& operator[](std::size_t bit) const {
@@ -37,18 +42,26 @@ class PortBits {
 /// The ports of a core, named as the host names them: outputs go to the design, inputs come from it. An input
 /// keeps its value until the design changes it.
 struct Ports {
+  /// One port each.
+  /// @{
   PortBits<const unsigned char> asyncOut;
   PortBits<const unsigned char> syncOut;
   PortBits<unsigned char> asyncIn;
   PortBits<unsigned char> syncIn;
+  /// @}
 
+  /// 1 where the input has pulsed; see glitchAsyncIn().
+  /// @{
   PortBits<unsigned char> asyncInGlitches;
   PortBits<unsigned char> syncInGlitches;
+  /// @}
 
   /// A pulse on an input that is over before the design clock samples it. Throws out_of_range for a bit that
   /// the port does not have.
+  /// @{
   void glitchAsyncIn(std::size_t bit) { asyncInGlitches[bit] = 1; }
   void glitchSyncIn(std::size_t bit) { syncInGlitches[bit] = 1; }
+  /// @}
 };
 
 /// What stands behind a core. What it throws comes out of the flush() that ran the clock.

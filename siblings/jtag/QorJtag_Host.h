@@ -1,9 +1,11 @@
-// The host side of libQorJtag: open a session on a cable, listen to its messages, close it.
-//
-// Conventions
-//  1. A session is an unsigned handle, never 0 and never used again after the session was closed.
-//  2. Every function may be called by any thread. Failures are standard exceptions whose text names what is
-//     wrong.
+/// @file
+/// The host side of libQorJtag: open a session on a cable, listen to its messages, close it.
+///
+/// Conventions
+///
+///  1. A session is an unsigned handle, never 0 and never used again after the session was closed.
+///  2. Every function may be called by any thread. Failures are standard exceptions whose text names what is
+///     wrong.
 #pragma once
 
 #include <functional>

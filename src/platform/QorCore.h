@@ -1,11 +1,13 @@
-// libQorCore: the cores of each session, base classes for cores and signals, and the way to a core on the
-// chip.
-//
-// Conventions
-//  1. Every buffer is a little-endian bit array: bit i is bit (i mod 8) of byte i / 8.
-//  2. The core list may be used by any thread. The functions of Qor_CoreComm are called by the holder of the
-//     session's target lock.
-//  3. Failures are standard exceptions whose text says what was seen and where.
+/// @file
+/// libQorCore: the cores of each session, base classes for cores and signals, and the way to a core on the
+/// chip.
+///
+/// Conventions
+///
+///  1. Every buffer is a little-endian bit array: bit i is bit (i mod 8) of byte i / 8.
+///  2. The core list may be used by any thread. The functions of Qor_CoreComm are called by the holder of the
+///     session's target lock.
+///  3. Failures are standard exceptions whose text says what was seen and where.
 #pragma once
 
 #include <map>
@@ -16,8 +18,12 @@
 #include "QorExport.h"
 #include "QorUtil.h"
 
+/// What a command sequence tells of itself.
 enum QOR_PROGRESS_STATUS { QOR_PROGRESS_RUNNING, QOR_PROGRESS_DONE };
+/// What a callback wants of the sequence.
 enum QOR_PROGRESS_RETURN { QOR_PROGRESS_CONTINUE, QOR_PROGRESS_ABORT };
+/// Called before each pair of lines of a command text and at its end; the numbers are the session, how many
+/// pairs are done, and of how many. Asking to abort ends the sequence with a logic_error.
 using QOR_PROGRESS_CALLBACK = QOR_PROGRESS_RETURN (*)(unsigned, unsigned, unsigned, QOR_PROGRESS_STATUS);
 
 /// Fills `*coreInfo` from the head of the core's status word. Returns 0, or nonzero with the record all zero
@@ -36,19 +42,25 @@ class QOR_API Qor_Core {
 
   /// Sets the core up from its status word; false when the word does not suit the core.
   virtual bool initFromStatusWord(unsigned session) = 0;
+  /// False, unless a kind of core says otherwise.
   virtual bool isQorVbrnSlave();
 
+  /// What the constructor was given.
+  /// @{
   unsigned getCoreType() const { return coreInfo_.core_type; }
   QOR_CORE_REF getCoreRef() const { return coreRef_; }
   QOR_CORE_INFO getCoreInfo() const { return coreInfo_; }
+  /// @}
 
  protected:
   /// `statusWord` holds `bitCount` bits, rounded up to whole bytes.
   Qor_Core(unsigned session, QOR_CORE_REF coreRef, QOR_CORE_INFO coreInfo, const unsigned char* statusWord,
            unsigned bitCount);
   Qor_Core(const Qor_Core&) = delete;
+  /// Assigns wholly, or throws bad_alloc with the target as it was.
   Qor_Core& operator=(const Qor_Core& other);
 
+  /// The status word that the constructor copied.
   Qor_ByteBuffer& getStatusWord() { return statusWord_; }
 
  private:
@@ -65,19 +77,26 @@ class QOR_API Qor_SignalCore : public Qor_Core {
  public:
   ~Qor_SignalCore() override;
 
+  /// The generic signals of the core, for those kinds of core that keep such.
+  /// @{
   virtual void addSignal(Qor_SignalBase* signal) = 0;
   virtual Qor_SignalBase* getSignal(const std::string& name, unsigned first, unsigned last) = 0;
   virtual void removeSignal(Qor_SignalBase* signal) = 0;
+  /// @}
 
   /// The count last set for the type, 0 before that.
   unsigned getCorePhysicalSignalCount(unsigned type) const;
 
  protected:
+  /// The arguments are those of Qor_Core.
   Qor_SignalCore(unsigned session, QOR_CORE_REF coreRef, QOR_CORE_INFO coreInfo,
                  const unsigned char* statusWord, unsigned bitCount);
+  /// Assigns wholly, or throws bad_alloc with the target as it was.
   Qor_SignalCore& operator=(const Qor_SignalCore& other);
 
+  /// Sets the count of every type that the core has.
   virtual void setCorePhysicalSignalCounts() = 0;
+  /// `count` signals of the type from now on.
   void setCorePhysicalSignalCount(unsigned type, unsigned count);
 
  private:
@@ -87,25 +106,36 @@ class QOR_API Qor_SignalCore : public Qor_Core {
 /// A named signal with properties. Destroyed through its own type only: there is no virtual destructor.
 class QOR_API Qor_SignalBase {
  public:
+  /// The signal types of VIO cores.
+  /// @{
   static constexpr unsigned SIGNAL_TYPE_VIO_ASYNC_INPUT = 1;
   static constexpr unsigned SIGNAL_TYPE_VIO_SYNC_INPUT = 2;
   static constexpr unsigned SIGNAL_TYPE_VIO_ASYNC_OUTPUT = 3;
   static constexpr unsigned SIGNAL_TYPE_VIO_SYNC_OUTPUT = 4;
+  /// @}
   /// A flag beside the type of a group.
   static constexpr unsigned SIGNAL_TYPE_GROUP = 0x100;
 
+  /// One of the constants above, with SIGNAL_TYPE_GROUP beside it for a group.
   unsigned getType() const { return type_; }
+  /// The name that the constructor was given.
   const std::string& getName() const { return name_; }
 
   /// The property's value, empty when it was never set.
   virtual std::string getProperty(const std::string& name) const;
+  /// Sets the property, in the place of an earlier value.
+  /// @{
   virtual void setProperty(const char* name, const char* value);
   virtual void setProperty(std::string& name, std::string& value);
+  /// @}
 
  protected:
+  /// Copies what it is given. Assigning is wholly done, or throws bad_alloc with the target as it was.
+  /// @{
   Qor_SignalBase(unsigned type, const std::string& name);
   Qor_SignalBase(const Qor_SignalBase&);
   Qor_SignalBase& operator=(const Qor_SignalBase&);
+  /// @}
   ~Qor_SignalBase();
 
  private:
@@ -118,10 +148,14 @@ class QOR_API Qor_SignalBase {
 /// core that has several.
 class QOR_API Qor_Signal : public Qor_SignalBase {
  public:
+  /// Copies what it is given; `type` is one of the constants of Qor_SignalBase.
   Qor_Signal(unsigned type, unsigned unit, unsigned position, const std::string& name);
 
+  /// What the constructor was given.
+  /// @{
   unsigned getUnit() const { return unit_; }
   unsigned getPosition() const { return position_; }
+  /// @}
 
  private:
   unsigned unit_;
@@ -134,10 +168,12 @@ class QOR_API Qor_SignalGroup : public Qor_SignalBase {
   /// Copies `positions`, order kept.
   Qor_SignalGroup(unsigned type, unsigned unit, std::vector<unsigned>& positions, const std::string& name);
 
+  /// A copy has the same type, name, properties and positions.
   Qor_SignalGroup(const Qor_SignalGroup&) = default;
   /// Assigns wholly, or throws bad_alloc with the target as it was.
   Qor_SignalGroup& operator=(const Qor_SignalGroup& other);
 
+  /// The positions, in the order of the constructor.
   const std::vector<unsigned>& getPositionVector() const { return positions_; }
 
  private:

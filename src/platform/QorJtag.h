@@ -1,9 +1,11 @@
-// libQorJtag: what a core library needs of a JTAG session.
-//
-// Conventions
-//  1. A session is an unsigned handle, never 0 and never used again after the session was closed.
-//  2. Every function may be called by any thread.
-//  3. Message types: 0x100 an error, 0x8000 the notice of an abort.
+/// @file
+/// libQorJtag: what a core library needs of a JTAG session.
+///
+/// Conventions
+///
+///  1. A session is an unsigned handle, never 0 and never used again after the session was closed.
+///  2. Every function may be called by any thread.
+///  3. Message types: 0x100 an error, 0x8000 the notice of an abort.
 #pragma once
 
 #include <memory>

@@ -1,14 +1,16 @@
-// libQorUtil: byte buffers, and conversions between numbers, bytes and texts.
-//
-// Conventions
-//  1. A buffer is a little-endian bit array: bit i is bit (i mod 8) of byte i / 8.
-//  2. A hexadecimal text is such an array read as one number: most significant digit first, upper case,
-//     leading zeros kept. Reading accepts both cases.
-//  3. A digit string ('0'/'1') of length D is a binary number: digit k is bit D-1-k.
-//  4. A reverse digit string is the opposite: character i is bit i.
-//  5. Nothing here keeps state; any thread may call anything. Failures are logic_error, and leave buffers as
-//     they were and no half-made text: an output string is empty then, or as it was. Using an output again
-//     that is large enough allocates nothing.
+/// @file
+/// libQorUtil: byte buffers, and conversions between numbers, bytes and texts.
+///
+/// Conventions
+///
+///  1. A buffer is a little-endian bit array: bit i is bit (i mod 8) of byte i / 8.
+///  2. A hexadecimal text is such an array read as one number: most significant digit first, upper case,
+///     leading zeros kept. Reading accepts both cases.
+///  3. A digit string ('0'/'1') of length D is a binary number: digit k is bit D-1-k.
+///  4. A reverse digit string is the opposite: character i is bit i.
+///  5. Nothing here keeps state; any thread may call anything. Failures are logic_error, and leave buffers as
+///     they were and no half-made text: an output string is empty then, or as it was. Using an output again
+///     that is large enough allocates nothing.
 #pragma once
 
 #include <string>
@@ -32,16 +34,22 @@ class QOR_API Qor_ByteBuffer {
   unsigned getSize() const { return static_cast<unsigned>(bytes_.size()); }
 
   /// The bytes; null only for a buffer without any. Valid until the buffer is assigned to or destroyed.
+  /// @{
   unsigned char* uPtr() { return bytes_.data(); }
   const unsigned char* uPtr() const { return bytes_.data(); }
+  /// @}
 
   /// The same bytes as characters.
+  /// @{
   char* ptr() { return reinterpret_cast<char*>(bytes_.data()); }
   const char* ptr() const { return reinterpret_cast<const char*>(bytes_.data()); }
+  /// @}
 
   /// Byte `index`, which must be below getSize().
+  /// @{
   unsigned char& operator[](unsigned index) { return bytes_[index]; }
   unsigned char operator[](unsigned index) const { return bytes_[index]; }
+  /// @}
 
   /// The unsigned value of the `length` bits (1 to 32) from bit `offset` on. Throws when they do not all lie
   /// in the buffer.

@@ -1,10 +1,12 @@
-// A device's scans as scans of its whole chain, for cables that drive the chain bit by bit.
-//
-// Conventions
-//  1. Bits are little-endian arrays: bit i is bit (i mod 8) of byte i / 8. Bit 0 is the first on the wire;
-//     bits of the last byte beyond the count are 0.
-//  2. Device 0 is the one nearest to TDO: what is shifted in first ends up in it, and comes from it.
-//  3. The addressed device is always one of the chain.
+/// @file
+/// A device's scans as scans of its whole chain, for cables that drive the chain bit by bit.
+///
+/// Conventions
+///
+///  1. Bits are little-endian arrays: bit i is bit (i mod 8) of byte i / 8. Bit 0 is the first on the wire;
+///     bits of the last byte beyond the count are 0.
+///  2. Device 0 is the one nearest to TDO: what is shifted in first ends up in it, and comes from it.
+///  3. The addressed device is always one of the chain.
 #pragma once
 
 #include <cstddef>
@@ -18,8 +20,8 @@ namespace QorRT {
 
 /// What a scan of the whole chain shifts into TDI.
 struct ChainScan {
-  std::vector<unsigned char> bits;
-  std::size_t bitCount;
+  std::vector<unsigned char> bits;  ///< bit 0 is the first on the wire
+  std::size_t bitCount;             ///< of the whole chain
 };
 
 /// The IR scan that gives one device an opcode (the low bits of `opcode`, as many as its IR has; an IR longer

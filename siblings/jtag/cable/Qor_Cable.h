@@ -1,12 +1,14 @@
-// The cable interface: one board's scan chain, as the host reaches it. The scans of a cable are queued and
-// run together, so that a whole sequence is one exchange with the adapter.
-//
-// Conventions
-//  1. Bits are little-endian arrays: bit i is bit (i mod 8) of byte i / 8. Bit 0 is the first on the wire.
-//  2. Device 0 is the one nearest to TDO.
-//  3. A cable is used by one thread at a time: the holder of its session's target lock.
-//  4. Lengths count the bits of the addressed device alone; a cable adds and takes away what the bypassed
-//     devices need.
+/// @file
+/// The cable interface: one board's scan chain, as the host reaches it. The scans of a cable are queued and
+/// run together, so that a whole sequence is one exchange with the adapter.
+///
+/// Conventions
+///
+///  1. Bits are little-endian arrays: bit i is bit (i mod 8) of byte i / 8. Bit 0 is the first on the wire.
+///  2. Device 0 is the one nearest to TDO.
+///  3. A cable is used by one thread at a time: the holder of its session's target lock.
+///  4. Lengths count the bits of the addressed device alone; a cable adds and takes away what the bypassed
+///     devices need.
 #pragma once
 
 #include <cstddef>
@@ -19,29 +21,30 @@ namespace QorRT {
 
 /// One device on the chain.
 struct Qor_Device {
-  unsigned idcode = 0;  // 0 when the device has none
-  std::string name;
-  unsigned irLength = 0;  // bits
+  unsigned idcode = 0;    ///< 0 when the device has none
+  std::string name;       ///< for people; may be empty
+  unsigned irLength = 0;  ///< bits
 };
 
 /// One queued step. Every scan ends in Run-Test/Idle.
 struct Qor_Scan {
+  /// An IR scan, a DR scan, or TCKs in Run-Test/Idle.
   enum class Kind { ir, dr, idle };
 
-  Kind kind;
-  unsigned device = 0;     // ir, dr
-  unsigned userChain = 0;  // ir: the device selects USERn, all others BYPASS
-  unsigned cycles = 0;     // idle: TCKs in Run-Test/Idle
-  std::vector<unsigned char>
-      out{};                 // dr: the last bits before Update-DR; ones fill whatever stands before them
-  std::size_t bitCount = 0;  // dr
-  bool capture = false;      // dr
-  std::vector<unsigned char> in{};  // dr with capture: the device's first bitCount bits since Capture-DR
+  Kind kind;                         ///< says which of the other members count
+  unsigned device = 0;               ///< ir, dr
+  unsigned userChain = 0;            ///< ir: the device selects USERn, all others BYPASS
+  unsigned cycles = 0;               ///< idle: TCKs in Run-Test/Idle
+  std::vector<unsigned char> out{};  ///< dr: the last bits before Update-DR; ones fill whatever stands before
+  std::size_t bitCount = 0;          ///< dr
+  bool capture = false;              ///< dr
+  std::vector<unsigned char> in{};   ///< dr with capture: the device's first bitCount bits since Capture-DR
 };
 
 /// The queue in front of a scan chain. A kind of cable says what stands on the chain and how to run a queue.
 class QOR_API Qor_Cable {
  public:
+  /// User chains are numbered from 1 to this.
   static constexpr unsigned userChainCount = 4;
 
   Qor_Cable() = default;
