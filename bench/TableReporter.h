@@ -17,7 +17,7 @@ class TableReporter : public benchmark::ConsoleReporter {
 
  private:
   struct Result {
-    double microseconds;
+    double microseconds = 0;
     benchmark::UserCounters counters;
   };
 

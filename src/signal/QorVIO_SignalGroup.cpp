@@ -10,6 +10,7 @@ QorVIO_SignalGroup::QorVIO_SignalGroup(QorVIO_Command* ownCommand, unsigned type
 QorVIO_SignalGroup::QorVIO_SignalGroup(const QorVIO_SignalGroup& other) = default;
 
 QorVIO_SignalGroup& QorVIO_SignalGroup::operator=(const QorVIO_SignalGroup& other) {
+  if (this == &other) return *this;
   std::string otherKeyName = other.keyName;
   Qor_SignalGroup::operator=(other);
   keyName.swap(otherKeyName);

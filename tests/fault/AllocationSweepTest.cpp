@@ -69,13 +69,14 @@ struct Rig {
   Texts names() {
     Texts sizesByName;
     for (const std::string& name :
-         {held, pulsed, seen, seen + " too", added, std::string("n98"), std::string("async_in_data")})
+         {held, pulsed, seen, seen + " too", added, std::string("n98"), std::string("async_in_data")}) {
       for (unsigned isOutput : {0U, 1U}) {
         const char* array[] = {name.c_str()};
         unsigned size = 0;
         if (QorVIO_getSignalSizes(session(), first, array, &size, 1, isOutput) == 0)
           sizesByName[name + (isOutput != 0 ? " (out)" : " (in)")] = std::to_string(size);
       }
+    }
     messages.clear();
     return sizesByName;
   }

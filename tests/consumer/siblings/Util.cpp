@@ -60,11 +60,11 @@ std::string& Qor_NumberUtil::uInt2HexStr(unsigned value, unsigned bitWidth, std:
 
 std::string& Qor_NumberUtil::binStr2HexStr(const std::string& digits, std::string& out) {
   out.assign((digits.size() + 3) / 4, '0');
-  for (std::size_t i = 0; i < digits.size(); ++i)
-    if (digits[digits.size() - 1 - i] == '1') {
-      char& digit = out[out.size() - 1 - i / 4];
-      digit = hexDigits[digitValue(digit) | 1U << i % 4];
-    }
+  for (std::size_t i = 0; i < digits.size(); ++i) {
+    if (digits[digits.size() - 1 - i] != '1') continue;
+    char& digit = out[out.size() - 1 - i / 4];
+    digit = hexDigits[digitValue(digit) | 1U << i % 4];
+  }
   return out;
 }
 
