@@ -77,9 +77,6 @@ class VioCore {
     check(QorVIO_readValues(session, ref, &map));
     return values;
   }
-  QorRT::QorVIO_Core& object() {
-    return dynamic_cast<QorRT::QorVIO_Core&>(*QorRT::Qor_CoreList::getCore(session, ref));
-  }
 
  private:
   void check(unsigned code) { EXPECT_EQ(code, 0U) << testing::PrintToString(board_.takeMessages()); }
