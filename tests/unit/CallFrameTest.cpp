@@ -6,108 +6,83 @@
 
 namespace {
 
-TextMap* const noMap = nullptr;
-
 struct Case {
-  const char* name;
   std::function<unsigned()> call;
-  const char* message;  // of the failed argument check
+  const char* function;
+  std::string failedCheck;
 };
 
-void PrintTo(const Case& c, std::ostream* out) {
-  *out << c.name << ": " << c.message;
-}
-
-const unsigned oneBit[] = {0};
-const char* const noName = nullptr;
-const char* names[] = {"a", noName};
 unsigned sizes[] = {99, 99};
-const unsigned char bytes[64] = {};
 
 std::vector<Case> failingChecks() {
-  auto noMapVariable = [](auto function) { return [=] { return function(session, ref, nullptr); }; };
-  auto nullMap = [](auto function) {
-    return [=] {
-      TextMap* map = noMap;
-      return function(session, ref, &map);
-    };
+  static const unsigned bit[] = {0};
+  static const char* names[] = {"a", nullptr};
+  static const unsigned char bytes[64] = {};
+  static TextMap* noMap = nullptr;
+  const char* const none = nullptr;
+  auto bus = [](const char* name, const unsigned* bits) {
+    return [=] { return QorVIO_defineBus(session, ref, name, 9, bits, 0); };
   };
-  auto setPorts = [](const unsigned char* av, const unsigned char* am, unsigned a, const unsigned char* ss,
-                     const unsigned char* sm, unsigned s) {
+  auto getSizes = [](const char** of, unsigned* to, unsigned count) {
+    return [=] { return QorVIO_getSignalSizes(session, ref, of, to, count, 0); };
+  };
+  auto set = [](const unsigned char* av, const unsigned char* am, unsigned a, const unsigned char* ss,
+                const unsigned char* sm, unsigned s) {
     return [=] { return QorVIO_setPortBits(session, ref, av, am, a, ss, sm, s); };
   };
-  auto getPorts = [](unsigned a, unsigned s) {
+  auto get = [](unsigned a, unsigned s) {
     return [=] {
-      return QorVIO_getPortBits(session, ref, nullptr, nullptr, nullptr, a, nullptr, nullptr, nullptr,
-                                nullptr, nullptr, s);
+      unsigned char* no = nullptr;
+      return QorVIO_getPortBits(session, ref, no, no, no, a, no, no, no, no, no, s);
     };
   };
+  auto fits = [](const std::string& count, const std::string& type) {
+    return "(" + count + " == core->getCorePhysicalSignalCount(Qor_SignalBase::SIGNAL_TYPE_VIO_" + type +
+           ")) || (" + count + " == 0)";
+  };
   return {
-      {"signal", [] { return QorVIO_defineSignal(session, ref, noName, 9, 9); },
-       "QorVIO_defineSignal() arg. failed:name!=0"},
-      {"bus", [] { return QorVIO_defineBus(session, ref, noName, 9, nullptr, 0); },
-       "QorVIO_defineBus() arg. failed:name!=0"},
-      {"bus", [] { return QorVIO_defineBus(session, ref, "b", 0, nullptr, 0); },
-       "QorVIO_defineBus() arg. failed:bitIndexArray!=0"},
-      {"bus", [] { return QorVIO_defineBus(session, ref, "b", 0, oneBit, 0); },
-       "QorVIO_defineBus() arg. failed:arrayLen!=0"},
-      {"undefine", [] { return QorVIO_undefineName(session, ref, noName, 0); },
-       "QorVIO_undefineName() arg. failed:name!=0"},
-      {"sizes", [] { return QorVIO_getSignalSizes(session, ref, nullptr, nullptr, 0, 0); },
-       "QorVIO_getSignalSizes() arg. failed:nameArray!=0"},
-      {"sizes", [] { return QorVIO_getSignalSizes(session, ref, names, nullptr, 0, 0); },
-       "QorVIO_getSignalSizes() arg. failed:sizeArray!=0"},
-      {"sizes", [] { return QorVIO_getSignalSizes(session, ref, names, sizes, 0, 0); },
-       "QorVIO_getSignalSizes() arg. failed:arrayLen!=0"},
-      {"sizes", [] { return QorVIO_getSignalSizes(session, ref, names, sizes, 2, 0); },
-       "QorVIO_getSignalSizes() arg. failed:nameArray[i]!=0"},
-      {"write", noMapVariable(QorVIO_writeValues), "QorVIO_writeValues() arg. failed:outputHashMap!=0"},
-      {"write", nullMap(QorVIO_writeValues), "QorVIO_writeValues() arg. failed:*outputHashMap!=0"},
-      {"read", noMapVariable(QorVIO_readValues), "QorVIO_readValues() arg. failed:inputHashMap!=0"},
-      {"read", nullMap(QorVIO_readValues), "QorVIO_readValues() arg. failed:*inputHashMap!=0"},
-      {"set", setPorts(nullptr, nullptr, 7, nullptr, nullptr, 7),
-       "QorVIO_setPortBits() arg. failed:(asyncOutDataBitCount == core->getCorePhysicalSignalCount("
-       "Qor_SignalBase::SIGNAL_TYPE_VIO_ASYNC_OUTPUT)) || (asyncOutDataBitCount == 0)"},
-      {"set", setPorts(nullptr, nullptr, 8, nullptr, nullptr, 7),
-       "QorVIO_setPortBits() arg. failed:(syncOutDataBitCount == core->getCorePhysicalSignalCount("
-       "Qor_SignalBase::SIGNAL_TYPE_VIO_SYNC_OUTPUT)) || (syncOutDataBitCount == 0)"},
-      {"set", setPorts(nullptr, bytes, 8, bytes, bytes, 10),
-       "QorVIO_setPortBits() arg. failed:asyncOutValueBits!=0"},
-      {"set", setPorts(bytes, nullptr, 8, bytes, bytes, 10),
-       "QorVIO_setPortBits() arg. failed:asyncOutMaskBits!=0"},
-      {"set", setPorts(bytes, bytes, 8, nullptr, bytes, 10),
-       "QorVIO_setPortBits() arg. failed:syncOutStepBits!=0"},
-      {"set", setPorts(bytes, bytes, 8, bytes, nullptr, 10),
-       "QorVIO_setPortBits() arg. failed:syncOutMaskBits!=0"},
-      {"get", getPorts(5, 5),
-       "QorVIO_getPortBits() arg. failed:(asyncInDataBitCount == core->getCorePhysicalSignalCount("
-       "Qor_SignalBase::SIGNAL_TYPE_VIO_ASYNC_INPUT)) || (asyncInDataBitCount == 0)"},
-      {"get", getPorts(4, 5),
-       "QorVIO_getPortBits() arg. failed:(syncInDataBitCount == core->getCorePhysicalSignalCount("
-       "Qor_SignalBase::SIGNAL_TYPE_VIO_SYNC_INPUT)) || (syncInDataBitCount == 0)"},
+      {[none] { return QorVIO_defineSignal(session, ref, none, 9, 9); }, "defineSignal", "name!=0"},
+      {bus(none, nullptr), "defineBus", "name!=0"},
+      {bus("b", nullptr), "defineBus", "bitIndexArray!=0"},
+      {bus("b", bit), "defineBus", "arrayLen!=0"},
+      {[none] { return QorVIO_undefineName(session, ref, none, 0); }, "undefineName", "name!=0"},
+      {getSizes(nullptr, nullptr, 0), "getSignalSizes", "nameArray!=0"},
+      {getSizes(names, nullptr, 0), "getSignalSizes", "sizeArray!=0"},
+      {getSizes(names, sizes, 0), "getSignalSizes", "arrayLen!=0"},
+      {getSizes(names, sizes, 2), "getSignalSizes", "nameArray[i]!=0"},
+      {[] { return QorVIO_writeValues(session, ref, nullptr); }, "writeValues", "outputHashMap!=0"},
+      {[] { return QorVIO_writeValues(session, ref, &noMap); }, "writeValues", "*outputHashMap!=0"},
+      {[] { return QorVIO_readValues(session, ref, nullptr); }, "readValues", "inputHashMap!=0"},
+      {[] { return QorVIO_readValues(session, ref, &noMap); }, "readValues", "*inputHashMap!=0"},
+      {set(nullptr, nullptr, 7, nullptr, nullptr, 7), "setPortBits",
+       fits("asyncOutDataBitCount", "ASYNC_OUTPUT")},
+      {set(nullptr, nullptr, 8, nullptr, nullptr, 7), "setPortBits",
+       fits("syncOutDataBitCount", "SYNC_OUTPUT")},
+      {set(nullptr, bytes, 8, bytes, bytes, 10), "setPortBits", "asyncOutValueBits!=0"},
+      {set(bytes, nullptr, 8, bytes, bytes, 10), "setPortBits", "asyncOutMaskBits!=0"},
+      {set(bytes, bytes, 8, nullptr, bytes, 10), "setPortBits", "syncOutStepBits!=0"},
+      {set(bytes, bytes, 8, bytes, nullptr, 10), "setPortBits", "syncOutMaskBits!=0"},
+      {get(5, 5), "getPortBits", fits("asyncInDataBitCount", "ASYNC_INPUT")},
+      {get(4, 5), "getPortBits", fits("syncInDataBitCount", "SYNC_INPUT")},
   };
 }
 
-class ArgumentCheck : public VioTest, public testing::WithParamInterface<Case> {};
-
-TEST_P(ArgumentCheck, FailsUnderTheLockAndSendsNothing) {
+TEST_F(VioTest, ArgumentChecksComeAfterTheLookupUnderTheLockAndSendNothing) {
+  for (const Case& c : failingChecks()) {
+    EXPECT_EQ(c.call(), failed);
+    EXPECT_THAT(siblings.take(), locked(lookupFailed));
+  }
   initCore(4, 3, 8, 10);
-  EXPECT_EQ(GetParam().call(), failed);
-  EXPECT_THAT(siblings.take(), locked(GetParam().message));
+  for (const Case& c : failingChecks()) {
+    EXPECT_EQ(c.call(), failed);
+    EXPECT_THAT(siblings.take(),
+                locked("QorVIO_" + std::string(c.function) + "() arg. failed:" + c.failedCheck));
+  }
   EXPECT_THAT(sizes, testing::Each(99U));
 }
 
-TEST_P(ArgumentCheck, ComesAfterTheLookup) {
-  EXPECT_EQ(GetParam().call(), failed);
-  EXPECT_THAT(
-      siblings.take(),
-      locked("Data structures not initialized for VIO core Device:0, user chain number:1, core index:0."));
-}
-
-INSTANTIATE_TEST_SUITE_P(All, ArgumentCheck, testing::ValuesIn(failingChecks()));
-
 TEST_F(VioTest, InformationChecksTheRecordBeforeTheLockAndTheResultAfterIt) {
-  TextMap* map = noMap;
+  TextMap* map = nullptr;
   EXPECT_EQ(QorVIO_getInfo(session, ref, nullptr), failed);
   EXPECT_EQ(QorVIO_getCoreInfo(session, ref, nullptr), failed);
   EXPECT_EQ(QorVIO_getCoreInfo(session, ref, &map), failed);
@@ -140,10 +115,16 @@ TEST_F(VioTest, WhateverIsThrownBelowBecomesOneMessageAfterTheLock) {
   EXPECT_THAT(siblings.take(), ElementsAre("lock 7 60000", "message 100 unknown session 7"));
 }
 
-TEST_F(VioTest, AMessageSinkThatThrowsLetsNothingOut) {
+TEST_F(VioTest, AFailedReadLeavesTheMapAndAMessageSinkThatThrowsLetsNothingOut) {
+  initCore(4, 3, 8, 10);
+  siblings.before["sequence"] = [] { throw std::runtime_error("link"); };
   siblings.before["message"] = [] { throw std::runtime_error("full"); };
+  TextMap map{{"async_in_data", "mine"}};
+  TextMap* pointer = &map;
+  EXPECT_EQ(QorVIO_readValues(session, ref, &pointer), failed);
+  EXPECT_EQ(map, (TextMap{{"async_in_data", "mine"}}));
+  siblings.info.core_type = 7;
   EXPECT_EQ(QorVIO_initCore(session, ref), failed);
-  EXPECT_EQ(write({}), failed);
 }
 
 }  // namespace

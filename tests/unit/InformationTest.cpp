@@ -46,35 +46,19 @@ TEST_F(StatusWord, IsDecodedByTheCoresVersion) {
   }
 }
 
-TEST_F(StatusWord, OfAllOnesGivesTheWidestPorts) {
-  for (auto [major, widest] : {std::pair{6U, 255U}, {9U, 65535U}, {10U, 65535U}}) {
-    answer(major, 0, {});
-    QORVIO_CORE_INFO info{};
-    EXPECT_EQ(QorVIO_getInfo(session, ref, &info), 0U);
-    EXPECT_THAT((std::vector{info.async_input_count, info.sync_input_count, info.async_output_count,
-                             info.sync_output_count}),
-                testing::Each(widest));
-  }
-}
-
 TEST_F(StatusWord, FillsTwelveEntriesOfTheMapAndLeavesTheOthers) {
   answer(6, 1, {{40, 8, 10}, {48, 8, 0}, {56, 8, 255}, {64, 8, 4}});
   TextMap map{{"note", "mine"}, {"core_type", "old"}};
   TextMap* pointer = &map;
   EXPECT_EQ(QorVIO_getCoreInfo(session, ref, &pointer), 0U);
-  EXPECT_EQ(map, (TextMap{{"note", "mine"},
-                          {"manufacturer_id", "81"},
-                          {"core_type", "9"},
-                          {"core_major_version", "6"},
-                          {"core_minor_version", "1"},
-                          {"core_revision", "3"},
-                          {"cg_major_version", "0"},
-                          {"cg_minor_version", "0"},
-                          {"cg_minor_version_alpha", "0"},
-                          {"async_input_count", "10"},
-                          {"sync_input_count", "0"},
-                          {"async_output_count", "255"},
-                          {"sync_output_count", "4"}}));
+  std::string told;
+  for (const char* key :
+       {"manufacturer_id", "core_type", "core_major_version", "core_minor_version", "core_revision",
+        "cg_major_version", "cg_minor_version", "cg_minor_version_alpha", "async_input_count",
+        "sync_input_count", "async_output_count", "sync_output_count", "note"})
+    told += map[key] + ' ';
+  EXPECT_EQ(told, "81 9 6 1 3 0 0 0 10 0 255 4 mine ");
+  EXPECT_EQ(map.size(), 13U);
 }
 
 TEST_F(VioTest, AnotherCoreTypeIsToldAndAbortsUnderTheLock) {

@@ -18,6 +18,8 @@ using testing::ElementsAre;
 constexpr unsigned session = 7;
 constexpr unsigned failed = 0x80000000;
 constexpr QOR_CORE_REF ref{0, 1, 0};
+constexpr const char* lookupFailed =
+    "Data structures not initialized for VIO core Device:0, user chain number:1, core index:0.";
 
 enum PortType : unsigned { syncOut, syncIn, asyncOut, asyncIn };
 
