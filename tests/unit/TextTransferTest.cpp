@@ -58,7 +58,7 @@ TEST_F(TextWrite, StagesNothingOfAFailedCheckAndAddressesNothingAfterAFailedText
       {"pulse.pulsetrain", tooLong, noNumber + tooLong},
   };
   for (const auto& [key, text, message] : cases) {
-    EXPECT_EQ(write({{"sync_out_data", "3"}, {key, text}}), failed);
+    EXPECT_EQ(write({{"sync_out_data", "3"}, {key, text}, {"async_out_data", "0"}}), failed);
     EXPECT_THAT(siblings.take(), locked(message));
     EXPECT_EQ(write({}), 0U);
     const std::size_t from = message.find(noNumber) == 0 ? 12 + 32 : 0;
