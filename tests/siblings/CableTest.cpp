@@ -1,9 +1,5 @@
 #include <gtest/gtest.h>
 
-#include <memory>
-#include <string>
-#include <vector>
-
 #include "ScriptedCable.h"
 
 namespace {
@@ -13,11 +9,21 @@ using Lines = std::vector<std::string>;
 
 class CableQueue : public testing::Test {
  protected:
+  std::string ir(unsigned device, unsigned userChain) {
+    return thrownBy([=] { cable.scanIr(device, userChain); });
+  }
+  std::string dr(unsigned device, const Bytes& out, std::size_t bits) {
+    return thrownBy([&] { cable.scanDr(device, out, bits, true); });
+  }
+  std::string captured(std::size_t scan) {
+    return thrownBy([=] { cable.captured(scan); });
+  }
+
   std::shared_ptr<Script> script = std::make_shared<Script>();
   ScriptedCable cable{script};
 };
 
-TEST_F(CableQueue, RunsEverythingInOneExchangeAndOnce) {
+TEST_F(CableQueue, RunsEverythingInOneExchangeAndOnceAndStartsAnew) {
   script->answers = {bitsOf(0x2A5, 10)};
   cable.scanIr(1, 4);
   cable.scanDr(1, {0xFF, 0x01}, 9, false);
@@ -26,45 +32,33 @@ TEST_F(CableQueue, RunsEverythingInOneExchangeAndOnce) {
   EXPECT_EQ(script->log, Lines());
   EXPECT_EQ(cable.captured(second), Bytes({0xA5, 0xFE}));
   cable.flush();
-  EXPECT_EQ(script->log, Lines({"ir 1 4", "dr 1 9 1FF", "dr 0 10 200", "idle 3", "run"}));
-}
-
-TEST_F(CableQueue, StartsAnewAfterARun) {
-  cable.flush();
-  cable.idle(1);
-  cable.flush();
-  const std::size_t scan = cable.scanDr(0, {0x01}, 1, true);
-  EXPECT_EQ(cable.captured(scan), Bytes({0xFE}));
+  const std::size_t next = cable.scanDr(0, {0x01}, 1, true);
+  EXPECT_EQ(cable.captured(next), Bytes({0xFE}));
   cable.idle(2);
   cable.drop();
   cable.flush();
-  EXPECT_EQ(script->log, Lines({"idle 1", "run", "dr 0 1 1", "run"}));
+  EXPECT_EQ(script->log, Lines({"ir 1 4", "dr 1 9 1FF", "dr 0 10 200", "idle 3", "run", "dr 0 1 1", "run"}));
 }
 
 TEST_F(CableQueue, QueuesNothingThatTheChainCannotDo) {
-  EXPECT_EQ(thrownBy([&] { cable.scanIr(2, 1); }), "logic: there is no device 2: the chain has 2 devices");
-  EXPECT_EQ(thrownBy([&] { cable.scanIr(0, 0); }), "logic: device 0 has no user chain 0: they are 1 to 4");
-  EXPECT_EQ(thrownBy([&] { cable.scanIr(0, 5); }), "logic: device 0 has no user chain 5: they are 1 to 4");
-  EXPECT_EQ(thrownBy([&] { cable.scanDr(2, {0}, 8, true); }),
-            "logic: there is no device 2: the chain has 2 devices");
-  EXPECT_EQ(thrownBy([&] { cable.scanDr(0, {0}, 9, true); }),
-            "logic: a DR scan of 9 bits does not fit 1 bytes");
-  EXPECT_EQ(thrownBy([&] {
-              cable.scanDr(0, {0, 0}, 8, true);
-            }),
-            "logic: a DR scan of 8 bits does not fit 2 bytes");
+  EXPECT_EQ(ir(2, 1), "logic: there is no device 2: the chain has 2 devices");
+  EXPECT_EQ(ir(0, 0), "logic: device 0 has no user chain 0: they are 1 to 4");
+  EXPECT_EQ(ir(0, 5), "logic: device 0 has no user chain 5: they are 1 to 4");
+  EXPECT_EQ(dr(2, {0}, 8), "logic: there is no device 2: the chain has 2 devices");
+  EXPECT_EQ(dr(0, {0}, 9), "logic: a DR scan of 9 bits does not fit 1 bytes");
+  EXPECT_EQ(dr(0, {0, 0}, 8), "logic: a DR scan of 8 bits does not fit 2 bytes");
   cable.flush();
   EXPECT_EQ(script->log, Lines());
 }
 
 TEST_F(CableQueue, HasNoCaptureOfAScanThatDidNotCaptureOrFailed) {
-  const std::size_t blind = cable.scanDr(0, {0x01}, 1, false);
-  EXPECT_EQ(thrownBy([&] { cable.captured(blind); }), "logic: scan 0 of the queue captured nothing");
-  EXPECT_EQ(thrownBy([&] { cable.captured(7); }), "logic: scan 7 of the queue captured nothing");
+  const std::string nothing = "logic: scan 0 of the queue captured nothing";
+  EXPECT_EQ(captured(cable.scanDr(0, {0x01}, 1, false)), nothing);
+  EXPECT_EQ(captured(7), "logic: scan 7 of the queue captured nothing");
   script->failure = "the link is dead";
   const std::size_t lost = cable.scanDr(0, {0x01}, 1, true);
-  EXPECT_EQ(thrownBy([&] { cable.flush(); }), "runtime: the link is dead");
-  EXPECT_EQ(thrownBy([&] { cable.captured(lost); }), "logic: scan 0 of the queue captured nothing");
+  EXPECT_EQ(thrownBy([this] { cable.flush(); }), "runtime: the link is dead");
+  EXPECT_EQ(captured(lost), nothing);
   EXPECT_EQ(script->logged("run").size(), 2U);
 }
 

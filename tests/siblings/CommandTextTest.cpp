@@ -19,44 +19,30 @@ TEST(CommandText, IsRefusedBeforeAnythingIsSent) {
     const char* where;
   } const cases[] = {
       {"", "1, device index: "},
-      {write1, "2, device index: "},
       {write1 + write2 + "\n", "3, device index: "},
       {" " + write1 + write2, "1, device index: "},
       {"0 1 0 01 0 00000006 1F" + write2, "1, device index: 0"},
-      {"00\t1 0 01 0 00000006 1F" + write2, "1, device index: 00\t1"},
       {"00  1 0 01 0 00000006 1F" + write2, "1, user chain number: "},
-      {"00 01 0 01 0 00000006 1F" + write2, "1, user chain number: 01"},
       {"00 1 G 01 0 00000006 1F" + write2, "1, core index: G"},
       {"00 1 0 00 0 00000006 1F" + write2, "1, code: 00"},
-      {"00 1 0 02 0 00000004 0" + read2, "1, code: 02"},
-      {"00 1 0 101 0 00000006 1F" + write2, "1, code: 101"},
       {"00 1 0 01 1 00000006 1F" + write2, "1, capture flag: 1"},
       {"00 1 0 03 0 00000010 0" + read2, "1, capture flag: 0"},
       {"00 1 0 01 0 6 1F" + write2, "1, bit count: 6"},
       {"00 1 0 01 0 00000000 0" + write2, "1, bit count: 00000000"},
       {"00 1 0 03 1 0000000F 0" + read2, "1, bit count: 0000000F"},
-      {"00 1 0 01 0 00000006" + write2, "1, data: "},
       {"00 1 0 01 0 00000006 " + write2, "1, data: "},
       {"00 1 0 01 0 00000006 1F " + write2, "1, data: 1F "},
-      {"00 1 0 01 0 00000006 1F 0" + write2, "1, data: 1F 0"},
       {"00 1 0 01 0 00000006 1G" + write2, "1, data: 1G"},
-      {"00 1 0 01 0 00000006 01F" + write2, "1, data: 01F"},
       {"00 1 0 01 0 00000006 20" + write2, "1, data: 20"},
-      {"00 1 0 01 0 00000009 100" + write2, "1, data: 100"},
       {"00 1 0 01 0 00000001 1" + write2, "1, data: 1"},
       {"00 1 0 01 0 00000006 " + std::string(50, '0') + write2,
        "1, data: 0000000000000000000000000000000000000000..."},
-      {"00 1 0 03 1 00000010 00" + read2, "1, data: 00"},
       {write1 + "\n01 1 0 02 0 00000004 0", "2, device index: 01"},
       {write1 + "\n00 2 0 02 0 00000004 0", "2, user chain number: 2"},
       {write1 + "\n00 1 F 02 0 00000004 0", "2, core index: F"},
-      {write1 + "\n00 1 0 07 0 00000004 0", "2, code: 07"},
-      {write1 + read2, "2, code: 04"},
       {read1 + write2, "2, code: 02"},
       {write1 + "\n00 1 0 02 1 00000004 0", "2, capture flag: 1"},
       {write1 + "\n00 1 0 02 0 00000005 0", "2, bit count: 00000005"},
-      {write1 + "\n00 1 0 02 0 00000004 1", "2, data: 1"},
-      {write1 + "\n00 1 0 02 0 00000004 0\r", "2, data: 0\r"},
       {write1 + write2 + "\n" + write1 + read2, "4, code: 04"},
   };
   ScriptedSession session;
@@ -73,8 +59,7 @@ TEST(CommandText, ReadsDataAsANumberOfAnyLengthThatFits) {
     session.script->answers = {answerOf(0xA020)};
     const std::string text = "00 1 0 01 0 00000006 " + std::string(data) + write2;
     Qor_CoreComm::commandSequence(session.handle, text, nullptr, 0, nullptr);
-    const Bits scan = frameScan(0x02, bitsOf(static_cast<unsigned>(std::stoul(data, nullptr, 16)), 5), 31);
-    EXPECT_EQ(session.script->log[1], "dr 0 31 " + hexOf(scan));
+    EXPECT_EQ(session.script->log[1], "dr 0 31 " + hexOf(frameScan(0x02, bitsOfHex(data, 5), 31)));
   }
 }
 

@@ -10,6 +10,7 @@
 
 #include "QorJtag_Host.h"
 #include "Qor_Cable.h"
+#include "ThrownBy.h"
 #include "WireBits.h"
 
 /// Shared by a test and the cable that its session owns.
@@ -87,17 +88,3 @@ class ScriptedSession {
  private:
   bool isOpen_ = true;
 };
-
-/// What the call throws: "logic: TEXT" for a logic_error, "runtime: TEXT" for a runtime_error, else
-/// "nothing".
-template <typename Call>
-std::string thrownBy(Call call) {
-  try {
-    call();
-  } catch (const std::logic_error& e) {
-    return std::string("logic: ") + e.what();
-  } catch (const std::runtime_error& e) {
-    return std::string("runtime: ") + e.what();
-  }
-  return "nothing";
-}

@@ -5,7 +5,8 @@
 #include <string>
 
 #include "QorUtil.h"
-#include "ScriptedCable.h"
+#include "ThrownBy.h"
+#include "WireBits.h"
 
 namespace {
 
@@ -67,6 +68,7 @@ TEST(NumberUtil, WritesNumbers) {
 }
 
 TEST(NumberUtil, RefusesWhatItCannotConvertAndLeavesNothingHalfDone) {
+  const std::string notHex = "logic: the text has a character that is not a hexadecimal digit";
   std::string out = "before";
   const auto hexOfNumber = [&](unsigned value, unsigned width) {
     return thrownBy([&] { Qor_NumberUtil::uInt2HexStr(value, width, out); });
@@ -85,11 +87,8 @@ TEST(NumberUtil, RefusesWhatItCannotConvertAndLeavesNothingHalfDone) {
     for (const char wrong : {'G', 'g', '/', ':', '@', '`', ' ', '\xC1'}) {
       std::string hex(19, 'A');
       hex[at] = wrong;
-      EXPECT_EQ(thrownBy([&] { Qor_NumberUtil::hexStr2BinStr(hex.c_str(), 30, out); }),
-                "logic: the text has a character that is not a hexadecimal digit");
-      const Qor_ByteBuffer text = bufferOf(hex.c_str());
-      EXPECT_EQ(thrownBy([&] { delete text.hex2Bin(0, 18); }),
-                "logic: the text has a character that is not a hexadecimal digit");
+      EXPECT_EQ(thrownBy([&] { Qor_NumberUtil::hexStr2BinStr(hex.c_str(), 30, out); }), notHex);
+      EXPECT_EQ(thrownBy([&] { delete bufferOf(hex.c_str()).hex2Bin(0, 18); }), notHex);
     }
   }
   EXPECT_EQ(out, "");
@@ -117,32 +116,34 @@ TEST(ByteBuffer, TurnsIntoHexadecimalTextAndBack) {
   EXPECT_STREQ(out.ptr(), "");
   buffer.bin2HexString(0, buffer);
   EXPECT_STREQ(buffer.ptr(), "A0CB12");
-  const std::unique_ptr<Qor_ByteBuffer> odd(bufferOf("fA0cB12").hex2Bin(0, 6));
-  EXPECT_EQ(std::vector<unsigned char>(odd->uPtr(), odd->uPtr() + odd->getSize()),
-            std::vector<unsigned char>({0x12, 0xCB, 0xA0, 0x0F}));
-  const std::unique_ptr<Qor_ByteBuffer> middle(bufferOf("A0CB12").hex2Bin(1, 3));
-  EXPECT_EQ(std::vector<unsigned char>(middle->uPtr(), middle->uPtr() + middle->getSize()),
-            std::vector<unsigned char>({0xCB, 0x00}));
+  const auto bytes = [](const char* text, unsigned first, unsigned last) {
+    const std::unique_ptr<Qor_ByteBuffer> number(bufferOf(text).hex2Bin(first, last));
+    return std::vector<unsigned char>(number->uPtr(), number->uPtr() + number->getSize());
+  };
+  EXPECT_EQ(bytes("fA0cB12", 0, 6), std::vector<unsigned char>({0x12, 0xCB, 0xA0, 0x0F}));
+  EXPECT_EQ(bytes("A0CB12", 1, 3), std::vector<unsigned char>({0xCB, 0x00}));
 }
 
 TEST(ByteBuffer, RefusesWhatDoesNotLieInIt) {
   const Qor_ByteBuffer two = bufferOf({0x31, 0x31}), none;
   Qor_ByteBuffer out = bufferOf("before");
-  EXPECT_EQ(thrownBy([&] { two.getBits(9, 8); }),
-            "logic: 8 bits from bit 9 on do not lie in a buffer of 2 bytes");
-  EXPECT_EQ(thrownBy([&] { two.getBits(4294967295, 32); }),
-            "logic: 32 bits from bit 4294967295 on do not lie in a buffer of 2 bytes");
-  EXPECT_EQ(thrownBy([&] { two.getBits(0, 0); }), "logic: a field of 0 bits is not 1 to 32 bits long");
-  EXPECT_EQ(thrownBy([&] { two.getBits(0, 33); }), "logic: a field of 33 bits is not 1 to 32 bits long");
+  const auto field = [&](unsigned first, unsigned count) {
+    return thrownBy([&] { two.getBits(first, count); });
+  };
+  const auto digits = [&](unsigned first, unsigned last) {
+    return thrownBy([&] { delete two.hex2Bin(first, last); });
+  };
+  EXPECT_EQ(field(9, 8), "logic: 8 bits from bit 9 on do not lie in a buffer of 2 bytes");
+  EXPECT_EQ(field(4294967295, 32), "logic: 32 bits from bit 4294967295 on do not lie in a buffer of 2 bytes");
+  EXPECT_EQ(field(0, 0), "logic: a field of 0 bits is not 1 to 32 bits long");
+  EXPECT_EQ(field(0, 33), "logic: a field of 33 bits is not 1 to 32 bits long");
   EXPECT_EQ(thrownBy([&] { two.bin2HexString(3, out); }),
             "logic: byte 3 does not lie in a buffer of 2 bytes");
   EXPECT_STREQ(out.ptr(), "before");
   EXPECT_EQ(thrownBy([&] { delete none.bin2HexString(0U, 1U); }),
             "logic: 1 bits from bit 0 on do not lie in a buffer of 0 bytes");
-  EXPECT_EQ(thrownBy([&] { delete two.hex2Bin(1, 0); }),
-            "logic: digits 1 to 0 do not lie in a text of 2 bytes");
-  EXPECT_EQ(thrownBy([&] { delete two.hex2Bin(0, 2); }),
-            "logic: digits 0 to 2 do not lie in a text of 2 bytes");
+  EXPECT_EQ(digits(1, 0), "logic: digits 1 to 0 do not lie in a text of 2 bytes");
+  EXPECT_EQ(digits(0, 2), "logic: digits 0 to 2 do not lie in a text of 2 bytes");
 }
 
 }  // namespace
