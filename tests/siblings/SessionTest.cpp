@@ -18,15 +18,11 @@ std::string lockThrows(unsigned session, unsigned timeout) {
 }
 
 TEST(Session, OpensOnlyCablesThatAUrlNames) {
-  struct {
-    const char* url;
-    const char* thrown;
-  } const cases[] = {
-      {nullptr, "logic: the cable URL is null"},
-      {":", "logic: the cable URL \":\" is of the unknown kind \"\"; known: sim"},
-      {"Sim:x:y", "logic: the cable URL \"Sim:x:y\" is of the unknown kind \"Sim\"; known: sim"},
-  };
-  for (const auto& c : cases) EXPECT_EQ(thrownBy([&] { QorJtag_session_open(c.url); }), c.thrown);
+  const auto opening = [](const char* url) { return thrownBy([=] { QorJtag_session_open(url); }); };
+  EXPECT_EQ(opening(nullptr), "logic: the cable URL is null");
+  EXPECT_EQ(opening(":"), "logic: the cable URL \":\" is of the unknown kind \"\"; known: sim");
+  EXPECT_EQ(opening("Sim:x:y"),
+            "logic: the cable URL \"Sim:x:y\" is of the unknown kind \"Sim\"; known: sim");
   EXPECT_EQ(thrownBy([] { QorJtag_session_openCable(nullptr); }), "logic: the cable of a session is null");
 }
 
@@ -117,29 +113,24 @@ TEST(Session, CallsEachCloseHookOnce) {
   EXPECT_EQ(hooked, std::vector<unsigned>({session.handle}));
 }
 
-TEST(Messages, GoToTheHandlerOfTheSession) {
+TEST(Messages, GoToTheHandlerOfTheSessionOrToStderrOneALine) {
   ScriptedSession session;
+  const unsigned handle = session.handle;
+  const std::string prefix = "session " + std::to_string(handle);
   std::vector<std::string> seen;
-  QorJtag_session_setMessageHandler(session.handle, [&](unsigned type, const char* text) {
+  QorJtag_session_setMessageHandler(handle, [&](unsigned type, const char* text) {
     seen.push_back(std::to_string(type) + " " + text);
-    QorJtag_session_setMessageHandler(session.handle, [](unsigned, const char*) { throw 1; });
+    QorJtag_session_setMessageHandler(handle, [](unsigned, const char*) { throw 1; });
   });
-  EXPECT_EQ(QorJtag_session_sendMessage(session.handle, 0x100, "first"), 0U);
-  EXPECT_EQ(QorJtag_session_sendMessage(session.handle, 0x8000, "second"), 1U);
-  EXPECT_EQ(seen, std::vector<std::string>({"256 first"}));
-}
-
-TEST(Messages, GoToStderrByDefaultOneALine) {
-  ScriptedSession session;
-  const std::string prefix = "session " + std::to_string(session.handle);
-  QorJtag_session_setMessageHandler(session.handle, [](unsigned, const char*) {});
   testing::internal::CaptureStderr();
-  EXPECT_EQ(QorJtag_session_sendMessage(session.handle, 0x100, "unseen"), 0U);
-  QorJtag_session_setMessageHandler(session.handle, nullptr);
-  EXPECT_EQ(QorJtag_session_sendMessage(session.handle, 0x100, "seen"), 0U);
-  EXPECT_EQ(QorJtag_session_sendMessage(session.handle, 0x100, nullptr), 0U);
+  EXPECT_EQ(QorJtag_session_sendMessage(handle, 0x100, "first"), 0U);
+  EXPECT_EQ(QorJtag_session_sendMessage(handle, 0x8000, "second"), 1U);
+  QorJtag_session_setMessageHandler(handle, nullptr);
+  EXPECT_EQ(QorJtag_session_sendMessage(handle, 0x100, "seen"), 0U);
+  EXPECT_EQ(QorJtag_session_sendMessage(handle, 0x100, nullptr), 0U);
   EXPECT_EQ(QorJtag_session_sendMessage(0, 0x100, "lost"), 1U);
   EXPECT_EQ(testing::internal::GetCapturedStderr(), prefix + ": seen\n" + prefix + ": \nsession 0: lost\n");
+  EXPECT_EQ(seen, std::vector<std::string>({"256 first"}));
 }
 
 }  // namespace
