@@ -20,6 +20,8 @@ std::string lockThrows(unsigned session, unsigned timeout) {
 TEST(Session, OpensOnlyCablesThatAUrlNames) {
   const auto opening = [](const char* url) { return thrownBy([=] { QorJtag_session_open(url); }); };
   EXPECT_EQ(opening(nullptr), "logic: the cable URL is null");
+  EXPECT_EQ(opening(""), "logic: the cable URL is empty");
+  EXPECT_EQ(opening("sim"), "logic: the cable URL \"sim\" has no colon after its kind");
   EXPECT_EQ(opening(":"), "logic: the cable URL \":\" is of the unknown kind \"\"; known: sim");
   EXPECT_EQ(opening("Sim:x:y"),
             "logic: the cable URL \"Sim:x:y\" is of the unknown kind \"Sim\"; known: sim");

@@ -128,6 +128,11 @@ TEST_F(Group, CopiesShareTheImageAndTheName) {
   assigned = sync;
   const auto& self = assigned;
   assigned = self;
+  QorRT::QorVIO_Command imageCopy;
+  imageCopy = image;
+  std::string text;
+  EXPECT_EQ(imageCopy.buildCommandText({0, 1, 0}, 1, text, nullptr),
+            "00 1 0 01 0 000000A1 " + std::string(40, '0'));
   for (const auto* g : {&copy, &assigned}) {
     EXPECT_EQ(g->getCommand(), &image);
     EXPECT_EQ(g->getKeyName(), "g");
@@ -138,7 +143,8 @@ TEST_F(Group, CopiesShareTheImageAndTheName) {
 
 TEST(Signal, StartsWithItsDefaultProperties) {
   const QorRT::QorVIO_Signal signal(Qor_SignalBase::SIGNAL_TYPE_VIO_ASYNC_INPUT, 0, 3, "led");
-  const QorRT::QorVIO_Signal copy(signal);  // NOLINT(performance-unnecessary-copy-initialization)
+  QorRT::QorVIO_Signal copy(Qor_SignalBase::SIGNAL_TYPE_VIO_SYNC_INPUT, 0, 0, "other");
+  copy = QorRT::QorVIO_Signal(signal);
   EXPECT_EQ(copy.getProperty("format"), "led:%b %a'");
   EXPECT_EQ(copy.getProperty("reset_value"), "0");
   EXPECT_EQ(copy.getProperty("low_value"), "0");

@@ -109,6 +109,9 @@ TEST_F(Registry, AssigningACoreDuplicatesItsNamesOntoItsOwnImage) {
   TextMap map{{"LED", "1"}};
   twin.writeValues(session, ref, &map);
   EXPECT_EQ(writtenDigits(8 + 160 + 8 + 10).substr(0, 8), "00010000");
+  twin.addSignal(nullptr);
+  twin.removeSignal(nullptr);
+  EXPECT_EQ(twin.getSignal("led", 0, 0), nullptr);
 }
 
 }  // namespace
