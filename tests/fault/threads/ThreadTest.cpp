@@ -61,11 +61,8 @@ TEST(Threads, HaveACoreEachAndSomeSetTheirsUpAnew) {
     for (unsigned round = 0; round < rounds; ++round) {
       if (worker % 2 == 1) {
         EXPECT_EQ(QorVIO_terminateCore(own.session, own.ref), 0U);
-        EXPECT_EQ(QorRT::Qor_CoreList::getCore(own.session, own.ref), nullptr);
         EXPECT_EQ(QorVIO_initCore(own.session, own.ref), 0U);
       }
-      for (int look = 0; look < 50; ++look)  // meanwhile others change the list
-        EXPECT_NE(QorRT::Qor_CoreList::getCore(own.session, own.ref), nullptr);
       own.write({{"async_out_data", digit(worker) + digit(round) + "0000"}, {"sync_out_data", digit(round)}});
       TextMap values = own.read();
       EXPECT_EQ(values["async_in_data"], digit(worker) + digit(round) + "0000");
@@ -73,6 +70,22 @@ TEST(Threads, HaveACoreEachAndSomeSetTheirsUpAnew) {
     }
   });
   EXPECT_THAT(boards[0].takeMessages(), testing::IsEmpty());
+}
+
+TEST(Threads, SetUpAndRemoveACoreEach) {
+  auto builder = chain().device(0x11);
+  for (unsigned worker = 0; worker < workers; ++worker) builder.core(1, worker, core());
+  Board board(builder.cable());
+  together([&](unsigned worker) {
+    const QOR_CORE_REF own{0, 1, worker};
+    for (unsigned round = 0; round < 5 * rounds; ++round) {
+      EXPECT_EQ(QorVIO_initCore(board.session, own), 0U);
+      for (int look = 0; look < 50; ++look)  // meanwhile others change the list
+        EXPECT_NE(QorRT::Qor_CoreList::getCore(board.session, own), nullptr);
+      EXPECT_EQ(QorVIO_terminateCore(board.session, own), 0U);
+      EXPECT_EQ(QorRT::Qor_CoreList::getCore(board.session, own), nullptr);
+    }
+  });
 }
 
 TEST(Threads, OpenAndCloseASessionEach) {
