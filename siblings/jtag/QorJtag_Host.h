@@ -24,6 +24,14 @@ using QorJtag_MessageHandler = std::function<void(unsigned type, const char* tex
 /// Throws, and opens nothing, when the URL is malformed or of an unknown kind, or its cable cannot be opened.
 extern "C" QOR_API unsigned QorJtag_session_open(const char* cableUrl);
 
+namespace QorRT {
+
+/// Opens the cable of a URL without a session, for a host that puts a cable of its own around it. Throws as
+/// QorJtag_session_open() does.
+QOR_API std::unique_ptr<Qor_Cable> openCable(const char* url);
+
+}  // namespace QorRT
+
 /// Opens a session on a cable of the caller's own, which the session owns from then on. Throws on a null
 /// cable.
 extern "C" QOR_API unsigned QorJtag_session_openCable(std::unique_ptr<QorRT::Qor_Cable> cable);

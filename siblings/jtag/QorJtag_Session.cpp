@@ -2,8 +2,7 @@
 #include <stdexcept>
 #include <utility>
 
-#include "QorJtag.h"
-#include "Qor_CableTable.h"
+#include "QorJtag_Host.h"
 #include "Qor_SessionAccess.h"
 #include "Qor_SessionTable.h"
 

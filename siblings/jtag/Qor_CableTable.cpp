@@ -1,9 +1,8 @@
-#include "Qor_CableTable.h"
-
 #include <stdexcept>
 #include <string>
 #include <string_view>
 
+#include "QorJtag_Host.h"
 #include "Qor_CableFactories.h"
 
 namespace QorRT {

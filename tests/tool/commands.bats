@@ -1,0 +1,129 @@
+# The everyday commands, as typed. Needs QORVIO, the tool, and QORVIO_SOURCES, the sources.
+
+setup() {
+  cd "$BATS_TEST_TMPDIR" || exit 1
+  unset QORVIO_CABLE QORVIO_CORE QORVIO_SIGNALS
+  export XDG_STATE_HOME=$PWD
+}
+
+qorvio() { "$QORVIO" "$@"; }
+
+fails() {  # fails STATUS TEXT COMMAND...
+  local wanted=$1 text=$2
+  shift 2
+  run "$QORVIO" "$@"
+  echo "$*: exit $status, says: $output"
+  [ "$status" -eq "$wanted" ] && [ "$output" = "qorvio: $text" ]
+}
+
+signals_file() {
+  cat >bench.toml <<'TOML'
+core = "0.1.0"
+[[signal]]
+name = "mode"
+port = "async_out"
+bits = "1:0"
+enum = { off = 0, slow = 1, fast = 2 }
+[[signal]]
+name = "mode"
+port = "async_in"
+bits = "1:0"
+enum = { off = 0, slow = 1, fast = 2 }
+[[signal]]
+name = "turned"
+port = "async_in"
+bits = "2:7"
+radix = "bin"
+[[signal]]
+name = "volts"
+port = "sync_in"
+bits = [3, 2, 1, 0]
+radix = "signed"
+scale = 0.5
+unit = "V"
+TOML
+}
+
+@test "scan and info tell what stands on the board" {
+  run qorvio scan
+  [ "$status" -eq 0 ]
+  [ "$output" = "DEVICE  IDCODE    NAME  IR
+0       0A5F1093  fpga  6
+1       1234567B  cpld  8
+
+CORE   TYPE    VERSION  ASYNC OUT  SYNC OUT  ASYNC IN  SYNC IN
+0.1.0  VIO     10.0     8          8         8         8
+0.1.1  type 7  10.0     -          -         -         -
+1.1.0  VIO     6.1      4          4         16        16" ]
+  run qorvio --json --core 1.1.0 info
+  [[ $output == *'"core_major_version": 6,'*'"async_input_count": 16,'* ]]
+}
+
+@test "read shows values in their radix with what moved" {
+  run qorvio --core 1.1.0 read async_in_data --radix dec
+  [ "${lines[0]}" = "NAME           VALUE  ACTIVITY  SYNC" ]
+  [ "${lines[1]}" = "async_in_data  33     ↕" ]
+  run qorvio --core 1.1.0 read 'sync_in_data[0:3]' --radix bin
+  [ "${lines[1]}" = "sync_in_data[0:3]  0b1000  ↕         ↕" ]
+}
+
+@test "write takes every spelling of a value, and tells it in one exchange" {
+  signals_file
+  run qorvio --signals bench.toml --json write mode=fast 'async_out_data[7:4]=0b1010' 'sync_out_data=0d200' \
+    'sync_out_data[0].pulsetrain=0,1,0'
+  [ "$status" -eq 0 ]
+  [ "$(tr -d ' \n' <<<"$output")" = '[{"name":"mode","width":2,"steps":["2"]},{"name":"async_out_data[7:4]","width":4,"steps":["A"]},{"name":"sync_out_data","width":8,"steps":["C8"]},{"name":"sync_out_data[0]","width":1,"steps":["0","1","0","0","0","0","0","0","0","0","0","0","0","0","0","0"]}]' ]
+}
+
+@test "a signals file names, checks and is begun by the tool" {
+  signals_file
+  run qorvio --signals bench.toml signals check
+  [ "$output" = "4 signals, all fit core 0.1.0" ]
+  run qorvio --signals bench.toml read
+  [ "${lines[1]}" = "mode    off       ·" ]
+  [ "${lines[2]}" = "turned  0b000000  ·" ]
+  [ "${lines[3]}" = "volts   0 V       ·         ·" ]
+  qorvio --core 1.1.0 signals init >first.toml
+  run qorvio --signals first.toml signals check
+  [ "$output" = "40 signals, all fit core 1.1.0" ]
+  run qorvio --signals first.toml --core 0.1.0 signals check
+  [ "$status" -eq 2 ]
+  [ "${lines[0]}" = "async_in_8: bit 8 is beyond async_in, which has 8 bits" ]
+}
+
+@test "wrong use says what is wrong, and ends with 2" {
+  fails 2 "no output of that name (did you mean async_out_data?): asinc_out_data" write asinc_out_data=1
+  fails 2 "no output of that name (it is an input): async_in_data" write async_in_data=1
+  fails 2 "async_out_data has 8 bits, too few for the value: 1FF" write async_out_data=1FF
+  fails 2 "not a value for async_out_data, whose radix is hex: 5G" write async_out_data=5G
+  fails 2 "async_out_data has 8 bits: async_out_data[8]" toggle 'async_out_data[8]'
+  fails 2 "an asynchronous output plays no pulses, press it instead: async_out_data[5]" pulse 'async_out_data[5]'
+  fails 2 "a pulse must begin and end within 16 steps, the last of them low: steps 10 to 15" \
+    pulse 'sync_out_data[5]' --at 10 --width 6
+  fails 2 "not a core address DEVICE.CHAIN.INDEX: 0.1" --core 0.1 info
+  fails 2 "no such command: frob" frob
+  signals_file
+  sed -i 's/"async_in"/"asynk_in"/' bench.toml
+  fails 2 'bench.toml:9: signal[1].port: must be async_out, sync_out, async_in or sync_in, is "asynk_in"' \
+    --signals bench.toml read
+}
+
+@test "a board that fails says so with the library's words, and ends with 1" {
+  fails 1 "cannot open the cable sim:nix.toml: nix.toml: cannot be opened: No such file or directory" \
+    --cable sim:nix.toml scan
+  fails 1 "cannot set up the core 0.1.7: QorVIO_initCore() for the wrong core type or non-existant core." \
+    --core 0.1.7 read
+}
+
+@test "whole ports, gestures, and settings from environment and file" {
+  run qorvio --core 1.1.0 port get async_in
+  [ "${lines[1]}" = "async_in  16     0021   003F  001F" ] || { echo "$output"; false; }
+  qorvio port set async_out 5A --mask F0
+  qorvio pulse 'sync_out_data[5]' --width 3
+  qorvio press 'async_out_data[0]' --for 1ms
+  [ "$(qorvio toggle 'async_out_data[0]')" = "async_out_data[0] = 1" ]
+  echo 'core = "1.1.0"' >qorvio.toml
+  [[ $(qorvio info) == *"1.1.0"* ]]
+  [[ $(QORVIO_CORE=0.1.0 qorvio info) == *"0.1.0"* ]]
+  [[ $(QORVIO_CORE=0.1.0 qorvio --core 1.1.0 info) == *"1.1.0"* ]]
+}

@@ -1,0 +1,21 @@
+// Activity flags as arrows.
+#pragma once
+
+#include <string>
+
+#include "CoreSession.h"
+
+namespace tool {
+
+/// Whether any bit of the signal rose or fell since the read before.
+struct Activity {
+  bool up = false, down = false;
+  bool syncUp = false, syncDown = false;  ///< as the design's clock saw it; synchronous inputs only
+};
+
+Activity activityOf(const Signal& signal, const Sample& sample);
+
+/// "↑" rising, "↓" falling, "↕" both, "·" none.
+const char* arrow(bool up, bool down);
+
+}  // namespace tool

@@ -1,0 +1,16 @@
+// NAME=VALUE as the command line gives it.
+#pragma once
+
+#include <string>
+
+#include "Context.h"
+
+namespace tool {
+
+/// "NAME=VALUE", or "NAME.pulsetrain=V0,V1,...". Throws WrongUse.
+Assignment parseAssignment(const SignalTable& signals, const std::string& text);
+
+/// With --json, tells on stdout what was written.
+void printWritten(const Context& context, const std::vector<Assignment>& assignments);
+
+}  // namespace tool

@@ -1,0 +1,25 @@
+// The commands. Each adds itself to the command line, with a help text that ends in an example.
+#pragma once
+
+#include <CLI/CLI.hpp>
+
+#include "Context.h"
+
+namespace tool {
+
+using AddCommand = void (*)(CLI::App& app, Context& context);
+
+void addScan(CLI::App& app, Context& context);
+void addInfo(CLI::App& app, Context& context);
+void addSignals(CLI::App& app, Context& context);
+void addRead(CLI::App& app, Context& context);
+void addWrite(CLI::App& app, Context& context);
+void addGestures(CLI::App& app, Context& context);  // pulse, toggle, press
+void addPort(CLI::App& app, Context& context);
+void addWatch(CLI::App& app, Context& context);
+void addRecord(CLI::App& app, Context& context);
+void addPlay(CLI::App& app, Context& context);
+void addDoctor(CLI::App& app, Context& context);
+void addBench(CLI::App& app, Context& context);
+
+}  // namespace tool

@@ -1,0 +1,86 @@
+// pulse, toggle, press: what one does to a bit at the bench.
+#include <chrono>
+#include <thread>
+
+#include "Assignments.h"
+#include "Commands.h"
+#include "Duration.h"
+
+namespace tool {
+namespace {
+
+struct PulseOptions {
+  std::string name;
+  unsigned width = 1;
+  unsigned at = 0;
+};
+
+struct PressOptions {
+  std::string name;
+  std::string time = "100ms";
+};
+
+void write(Context& context, const Assignment& assignment) {
+  context.core().write({assignment});
+  printWritten(context, {assignment});
+}
+
+void press(Context& context, const PressOptions& options) {
+  const std::chrono::nanoseconds time = parseDuration(options.time);
+  const Signal signal = context.signals().find(options.name, Direction::output);
+  Assignment down = toggle(context.core(), signal);  // asks for one bit
+  down.steps = {{1}};
+  context.core().write({down});
+  std::this_thread::sleep_for(time);
+  write(context, level(signal, {0}));
+}
+
+void addPulse(CLI::App& app, Context& context) {
+  auto options = std::make_shared<PulseOptions>();
+  CLI::App* command =
+      app.add_subcommand("pulse", "one bit of a synchronous output high for a clock of the design");
+  command->add_option("NAME", options->name, "the output bit")->required();
+  command->add_option("--width", options->width, "clocks that it is high: 1 to 15");
+  command->add_option("--at", options->at, "the step at which it rises: 0 to 14");
+  command->footer("Example:\n  qorvio pulse sync_out_data[5] --width 3");
+  command->callback([&context, options] {
+    write(context,
+          pulse(context.signals().find(options->name, Direction::output), options->at, options->width));
+  });
+}
+
+void addToggle(CLI::App& app, Context& context) {
+  auto name = std::make_shared<std::string>();
+  CLI::App* command =
+      app.add_subcommand("toggle", "one output bit to the opposite of what it was given last");
+  command->add_option("NAME", *name, "the output bit")->required();
+  command->footer(
+      "Outputs cannot be read back: what they were given is remembered from run to run.\n\n"
+      "Example:\n  qorvio toggle async_out_data[0]");
+  command->callback([&context, name] {
+    const Assignment toggled = toggle(context.core(), context.signals().find(*name, Direction::output));
+    write(context, toggled);
+    if (!context.settings.json && !context.settings.quiet)
+      std::printf("%s = %u\n", toggled.signal.name.c_str(), static_cast<unsigned>(toggled.steps[0][0]));
+  });
+}
+
+void addPress(CLI::App& app, Context& context) {
+  auto options = std::make_shared<PressOptions>();
+  CLI::App* command =
+      app.add_subcommand("press", "one output bit to 1, and after a while to 0, like a button");
+  command->add_option("NAME", options->name, "the output bit")->required();
+  command->add_option("--for", options->time, "how long, such as 100ms or 2s");
+  command->footer("Example:\n  qorvio press async_out_data[0] --for 1s");
+  command->callback([&context, options] { press(context, *options); });
+}
+
+}  // namespace
+
+void addGestures(CLI::App& app, Context& context) {
+  addPulse(app, context);
+  addToggle(app, context);
+  addPress(app, context);
+}
+
+}  // namespace tool

@@ -1,0 +1,35 @@
+#include <cstdio>
+
+#include <nlohmann/json.hpp>
+
+#include "Commands.h"
+#include "CoreFields.h"
+#include "Table.h"
+
+namespace tool {
+namespace {
+
+void print(const QORVIO_CORE_INFO& info, QOR_CORE_REF ref, bool asJson) {
+  nlohmann::ordered_json json{{"core", refText(ref)}};
+  Table table({"FIELD", refText(ref)});
+  for (const CoreField& field : coreFields) {
+    json[field.name] = info.*field.member;
+    table.add({field.name, std::to_string(info.*field.member)});
+  }
+  std::printf("%s", asJson ? (json.dump(2) + "\n").c_str() : table.text().c_str());
+}
+
+}  // namespace
+
+void addInfo(CLI::App& app, Context& context) {
+  CLI::App* command = app.add_subcommand("info", "what a core says of itself: versions and port widths");
+  command->footer("Example:\n  qorvio --core 1.1.0 info");
+  command->callback([&context] {
+    const QOR_CORE_REF ref = context.coreRef();
+    QORVIO_CORE_INFO info{};
+    context.link().check(QorVIO_getInfo(context.link().session(), ref, &info));
+    print(info, ref, context.settings.json);
+  });
+}
+
+}  // namespace tool

@@ -1,0 +1,76 @@
+#include <cstdio>
+
+#include <nlohmann/json.hpp>
+
+#include "Activity.h"
+#include "Commands.h"
+#include "Table.h"
+
+namespace tool {
+namespace {
+
+struct ReadOptions {
+  std::vector<std::string> names;
+  std::string radix;
+};
+
+void printJson(const std::vector<Signal>& signals, const Sample& sample, const Radix* radix) {
+  nlohmann::ordered_json json = nlohmann::ordered_json::array();
+  Bytes value, up, down;
+  for (const Signal& each : signals) {
+    extract(each, sample.values(each.port), value);
+    extract(each, sample.up(each.port), up);
+    extract(each, sample.down(each.port), down);
+    nlohmann::ordered_json entry{{"name", each.name},
+                                 {"width", each.width()},
+                                 {"value", hexText(value, each.width())},
+                                 {"shown", shown(each, value, radix)},
+                                 {"activity_up", hexText(up, each.width())},
+                                 {"activity_down", hexText(down, each.width())}};
+    if (each.port == Port::syncIn) {
+      extract(each, sample.syncSyncUp, up);
+      extract(each, sample.syncSyncDown, down);
+      entry["sync_activity_up"] = hexText(up, each.width());
+      entry["sync_activity_down"] = hexText(down, each.width());
+    }
+    json.push_back(entry);
+  }
+  std::printf("%s\n", json.dump(2).c_str());
+}
+
+void printTable(const std::vector<Signal>& signals, const Sample& sample, const Radix* radix) {
+  Table table({"NAME", "VALUE", "ACTIVITY", "SYNC"});
+  Bytes value;
+  for (const Signal& each : signals) {
+    extract(each, sample.values(each.port), value);
+    const Activity activity = activityOf(each, sample);
+    const char* const both = arrow(activity.up, activity.down);
+    const bool moved = activity.up || activity.down;
+    table.add({each.name, shown(each, value, radix), inked(moved ? Ink::green : Ink::dim, both),
+               each.port == Port::syncIn ? arrow(activity.syncUp, activity.syncDown) : ""});
+  }
+  std::printf("%s", table.text().c_str());
+}
+
+void read(Context& context, const ReadOptions& options) {
+  Radix radix{};
+  if (!options.radix.empty()) radix = radixNamed(options.radix);
+  const std::vector<Signal> signals = context.signals().select(options.names, Direction::input);
+  Sample sample = context.core().emptySample();
+  context.core().read(sample);
+  (context.settings.json ? printJson : printTable)(signals, sample, options.radix.empty() ? nullptr : &radix);
+}
+
+}  // namespace
+
+void addRead(CLI::App& app, Context& context) {
+  auto options = std::make_shared<ReadOptions>();
+  CLI::App* command =
+      app.add_subcommand("read", "values of inputs, and what moved since they were read last");
+  command->add_option("NAME", options->names, "inputs; all when none is named. NAME[7:4] is a part of one");
+  command->add_option("--radix", options->radix, "hex, bin, dec or signed, in the place of the file's");
+  command->footer("Example:\n  qorvio --core 1.1.0 read --radix dec async_in_data sync_in_data[3:0]");
+  command->callback([&context, options] { read(context, *options); });
+}
+
+}  // namespace tool

@@ -1,0 +1,82 @@
+#include <cstdio>
+
+#include <nlohmann/json.hpp>
+
+#include "Commands.h"
+#include "CoreFields.h"
+#include "Table.h"
+
+namespace tool {
+namespace {
+
+using nlohmann::json;
+
+std::string hexadecimal(unsigned number) {
+  char text[16];
+  std::snprintf(text, sizeof text, "%08X", number);
+  return text;
+}
+
+json jsonOf(const FoundCore& core) {
+  json entry{{"core", refText(core.ref)}};
+  for (const CoreField& field : coreFields) {
+    if (!core.isVio() && !field.generic) break;
+    entry[field.name] = core.info.*field.member;
+  }
+  return entry;
+}
+
+void printJson(const std::vector<QorRT::Qor_Device>& devices, const std::vector<FoundCore>& cores) {
+  json chain = json::array();
+  for (unsigned device = 0; device < devices.size(); ++device) {
+    json found = json::array();
+    for (const FoundCore& core : cores)
+      if (core.ref.device_index == device) found.push_back(jsonOf(core));
+    chain.push_back({{"device", device},
+                     {"idcode", devices[device].idcode},
+                     {"name", devices[device].name},
+                     {"ir_length", devices[device].irLength},
+                     {"cores", found}});
+  }
+  std::printf("%s\n", json{{"devices", chain}}.dump(2).c_str());
+}
+
+std::vector<std::string> row(const FoundCore& core) {
+  const QORVIO_CORE_INFO& info = core.info;
+  const auto number = [&](unsigned width) { return core.isVio() ? std::to_string(width) : "-"; };
+  return {refText(core.ref),
+          core.isVio() ? "VIO" : "type " + std::to_string(info.core_type),
+          std::to_string(info.core_major_version) + "." + std::to_string(info.core_minor_version),
+          number(info.async_output_count),
+          number(info.sync_output_count),
+          number(info.async_input_count),
+          number(info.sync_input_count)};
+}
+
+void printTables(const std::vector<QorRT::Qor_Device>& devices, const std::vector<FoundCore>& cores) {
+  Table chain({"DEVICE", "IDCODE", "NAME", "IR"});
+  for (unsigned device = 0; device < devices.size(); ++device) {
+    chain.add({std::to_string(device),
+               devices[device].idcode != 0 ? hexadecimal(devices[device].idcode) : "none",
+               devices[device].name.empty() ? "-" : devices[device].name,
+               std::to_string(devices[device].irLength)});
+  }
+  Table found({"CORE", "TYPE", "VERSION", "ASYNC OUT", "SYNC OUT", "ASYNC IN", "SYNC IN"});
+  for (const FoundCore& core : cores) found.add(row(core));
+  std::printf("%s\n%s", chain.text().c_str(), found.text().c_str());
+}
+
+}  // namespace
+
+void addScan(CLI::App& app, Context& context) {
+  CLI::App* command =
+      app.add_subcommand("scan", "the chain: devices, and every core behind every user chain");
+  command->footer("Example:\n  qorvio --cable sim: scan");
+  command->callback([&context] {
+    const std::vector<QorRT::Qor_Device> devices = context.link().devices();
+    const std::vector<FoundCore> cores = findCores(context.link());
+    (context.settings.json ? printJson : printTables)(devices, cores);
+  });
+}
+
+}  // namespace tool

@@ -1,0 +1,79 @@
+#include <cstdio>
+
+#include <nlohmann/json.hpp>
+
+#include "Commands.h"
+#include "Errors.h"
+#include "Table.h"
+
+namespace tool {
+namespace {
+
+nlohmann::ordered_json jsonOf(const Signal& signal) {
+  nlohmann::ordered_json names = nlohmann::ordered_json::object();
+  for (const auto& [name, value] : signal.names) names[name] = value;
+  return {{"name", signal.name},
+          {"port", portName(signal.port)},
+          {"width", signal.width()},
+          {"bits", signal.bits},
+          {"radix", radixName(signal.radix)},
+          {"enum", names},
+          {"scale", signal.scale},
+          {"unit", signal.unit},
+          {"description", signal.description}};
+}
+
+void list(const std::vector<Signal>& signals, bool asJson) {
+  nlohmann::ordered_json json = nlohmann::ordered_json::array();
+  Table table({"NAME", "PORT", "WIDTH", "BITS", "RADIX", "DESCRIPTION"});
+  for (const Signal& each : signals) {
+    json.push_back(jsonOf(each));
+    table.add({each.name, portName(each.port), std::to_string(each.width()), bitsText(each.bits),
+               radixName(each.radix), each.description});
+  }
+  std::printf("%s", asJson ? (json.dump(2) + "\n").c_str() : table.text().c_str());
+}
+
+void check(Context& context) {
+  if (context.settings.signals.empty()) throw WrongUse("no signals file to check: use --signals FILE");
+  const std::vector<std::string> wrong = misfits(context.file(), context.core().info());
+  if (context.settings.json) {
+    std::printf("%s\n",
+                nlohmann::json{{"signals", context.file().fileSignals}, {"misfits", wrong}}.dump(2).c_str());
+  } else {
+    for (const std::string& each : wrong) std::printf("%s\n", each.c_str());
+  }
+  if (!wrong.empty())
+    throw WrongUse("signals do not fit core " + refText(context.core().ref()) + ": " +
+                   std::to_string(wrong.size()) + " of " + std::to_string(context.file().fileSignals));
+  if (!context.settings.json && !context.settings.quiet)
+    std::printf("%zu signals, all fit core %s\n", context.file().fileSignals,
+                refText(context.core().ref()).c_str());
+}
+
+}  // namespace
+
+void addSignals(CLI::App& app, Context& context) {
+  CLI::App* command = app.add_subcommand("signals", "the names known, their port, width and bits");
+  command->footer(
+      "Example:\n  qorvio signals init > bench.toml\n  qorvio --signals bench.toml signals check");
+  command->require_subcommand(0, 1);
+  auto namesOnly = std::make_shared<bool>(false);
+  command->add_flag("--names", *namesOnly, "the names alone, one a line");
+  command->add_subcommand("check", "holds the signals file against the core")
+      ->footer("Example:\n  qorvio --signals bench.toml signals check")
+      ->callback([&context] { check(context); });
+  command->add_subcommand("init", "writes a first signals file for the core")
+      ->footer("Example:\n  qorvio signals init > bench.toml")
+      ->callback([&context] {
+        std::printf("%s", firstSignalFile(context.core().ref(), context.core().info()).c_str());
+      });
+  command->callback([&context, command, namesOnly] {
+    if (!command->get_subcommands().empty()) return;
+    const std::vector<Signal>& signals = context.signals().signals;
+    if (!*namesOnly) return list(signals, context.settings.json);
+    for (const Signal& each : signals) std::printf("%s\n", each.name.c_str());
+  });
+}
+
+}  // namespace tool

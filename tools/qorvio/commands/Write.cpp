@@ -1,0 +1,26 @@
+#include <cstdio>
+
+#include <nlohmann/json.hpp>
+
+#include "Assignments.h"
+#include "Commands.h"
+
+namespace tool {
+
+void addWrite(CLI::App& app, Context& context) {
+  auto texts = std::make_shared<std::vector<std::string>>();
+  CLI::App* command = app.add_subcommand("write", "values for outputs, all in one exchange");
+  command->add_option("NAME=VALUE", *texts, "digits in the signal's radix, 0x, 0b, 0d, or an enumerated name")
+      ->required();
+  command->footer(
+      "NAME.pulsetrain=V0,V1,... plays up to 16 values, one a clock of the design; the last one stays.\n\n"
+      "Example:\n  qorvio write async_out_data=5A sync_out_data[2].pulsetrain=0,1,0");
+  command->callback([&context, texts] {
+    std::vector<Assignment> assignments;
+    for (const std::string& text : *texts) assignments.push_back(parseAssignment(context.signals(), text));
+    context.core().write(assignments);
+    printWritten(context, assignments);
+  });
+}
+
+}  // namespace tool
