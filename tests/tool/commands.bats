@@ -69,10 +69,10 @@ CORE   TYPE    VERSION  ASYNC OUT  SYNC OUT  ASYNC IN  SYNC IN
 
 @test "write takes every spelling of a value, and tells it in one exchange" {
   signals_file
-  run qorvio --signals bench.toml --json write mode=fast 'async_out_data[7:4]=0b1010' 'sync_out_data=0d200' \
+  run qorvio --signals bench.toml --json write mode=off mode=fast 'async_out_data[7:4]=0b1010' 'sync_out_data=0d200' \
     'sync_out_data[0].pulsetrain=0,1,0'
   [ "$status" -eq 0 ]
-  [ "$(tr -d ' \n' <<<"$output")" = '[{"name":"mode","width":2,"steps":["2"]},{"name":"async_out_data[7:4]","width":4,"steps":["A"]},{"name":"sync_out_data","width":8,"steps":["C8"]},{"name":"sync_out_data[0]","width":1,"steps":["0","1","0","0","0","0","0","0","0","0","0","0","0","0","0","0"]}]' ]
+  [ "$(tr -d ' \n' <<<"$output")" = '[{"name":"mode","width":2,"steps":["0"]},{"name":"mode","width":2,"steps":["2"]},{"name":"async_out_data[7:4]","width":4,"steps":["A"]},{"name":"sync_out_data","width":8,"steps":["C8"]},{"name":"sync_out_data[0]","width":1,"steps":["0","1","0","0","0","0","0","0","0","0","0","0","0","0","0","0"]}]' ]
 }
 
 @test "a signals file names, checks and is begun by the tool" {

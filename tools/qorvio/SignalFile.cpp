@@ -109,23 +109,12 @@ Signal readSignal(const TomlPlace& place) {
   return signal;
 }
 
-bool isTaken(const SignalTable& table, const Signal& signal) {
-  try {
-    table.find(signal.name, isInput(signal.port) ? Direction::input : Direction::output);
-    return true;
-  } catch (const WrongUse&) {
-    return false;
-  }
-}
-
 void readSignals(const std::string& path, const toml::node& list, SignalTable& table) {
   if (!list.is_array_of_tables())
     TomlPlace(path, list, "signal").fail("must be tables, each headed [[signal]]");
   for (const toml::node& each : *list.as_array()) {
-    const TomlPlace place(path, each, "signal[" + std::to_string(table.signals.size()) + "]");
-    Signal signal = readSignal(place);
-    if (isTaken(table, signal)) place.at("name").fail("is there already: " + signal.name);
-    table.signals.push_back(std::move(signal));
+    const TomlPlace place(path, each, "signal[" + std::to_string(table.signals().size()) + "]");
+    if (!table.add(readSignal(place))) place.at("name").fail("is there already: " + place.at("name").text());
   }
 }
 
@@ -144,7 +133,6 @@ SignalTable readSignalFile(const std::string& path) {
     }
   }
   if (root.has("signal")) readSignals(path, root.at("signal").node(), table);
-  table.fileSignals = table.signals.size();
   return table;
 }
 

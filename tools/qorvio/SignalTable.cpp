@@ -12,13 +12,18 @@ char folded(char letter) {
   return letter >= 'A' && letter <= 'Z' ? static_cast<char>(letter - 'A' + 'a') : letter;
 }
 
-bool sameName(std::string_view a, std::string_view b) {
-  return std::equal(a.begin(), a.end(), b.begin(), b.end(),
-                    [](char x, char y) { return folded(x) == folded(y); });
+std::string foldedName(std::string_view name) {
+  std::string text(name);
+  for (char& letter : text) letter = folded(letter);
+  return text;
+}
+
+Direction directionOf(const Signal& signal) {
+  return isInput(signal.port) ? Direction::input : Direction::output;
 }
 
 bool points(const Signal& signal, Direction direction) {
-  return isInput(signal.port) == (direction == Direction::input);
+  return directionOf(signal) == direction;
 }
 
 // How many letters to add, drop or change.
@@ -54,19 +59,6 @@ const Signal* nearest(const std::vector<Signal>& signals, std::string_view name,
   return best;
 }
 
-[[noreturn]] void failUnknown(const std::vector<Signal>& signals, std::string_view name,
-                              Direction direction) {
-  const Direction other = direction == Direction::input ? Direction::output : Direction::input;
-  std::string hint;
-  const auto isOther = [&](const Signal& each) { return points(each, other) && sameName(each.name, name); };
-  if (std::any_of(signals.begin(), signals.end(), isOther)) {
-    hint = std::string(" (it is an ") + wordFor(other) + ")";
-  } else if (const Signal* near = nearest(signals, name, direction)) {
-    hint = " (did you mean " + near->name + "?)";
-  }
-  throw WrongUse(std::string("no ") + wordFor(direction) + " of that name" + hint + ": " + std::string(name));
-}
-
 bool parseNumber(std::string_view text, unsigned& number) {
   const auto [rest, error] = std::from_chars(text.data(), text.data() + text.size(), number);
   return error == std::errc() && rest == text.data() + text.size();
@@ -90,30 +82,49 @@ Signal slice(const Signal& whole, std::string_view name, std::string_view inside
   }
 }
 
-const Signal* exact(const std::vector<Signal>& signals, std::string_view name, Direction direction) {
-  for (const Signal& each : signals)
-    if (points(each, direction) && sameName(each.name, name)) return &each;
-  return nullptr;
-}
-
 }  // namespace
 
+bool SignalTable::add(Signal signal) {
+  auto& places = places_[static_cast<unsigned>(directionOf(signal))];
+  if (!places.emplace(foldedName(signal.name), signals_.size()).second) return false;
+  signals_.push_back(std::move(signal));
+  fileSignals_ = signals_.size();
+  return true;
+}
+
 void SignalTable::addWholePorts(const QORVIO_CORE_INFO& info) {
+  const std::size_t before = fileSignals_;
   for (Port port : {Port::asyncOut, Port::syncOut, Port::asyncIn, Port::syncIn}) {
-    const Direction direction = isInput(port) ? Direction::input : Direction::output;
-    if (widthOf(info, port) == 0 || exact(signals, wholePortName(port), direction) != nullptr) continue;
     Signal whole{wholePortName(port), port};
     for (unsigned bit = 0; bit < widthOf(info, port); ++bit) whole.bits.push_back(bit);
-    signals.push_back(whole);
+    if (!whole.bits.empty()) add(std::move(whole));
   }
+  fileSignals_ = before;
+}
+
+const Signal* SignalTable::exact(std::string_view name, Direction direction) const {
+  const auto& places = places_[static_cast<unsigned>(direction)];
+  const auto place = places.find(foldedName(name));
+  return place != places.end() ? &signals_[place->second] : nullptr;
+}
+
+void SignalTable::failUnknown(std::string_view name, Direction direction) const {
+  const Direction other = direction == Direction::input ? Direction::output : Direction::input;
+  std::string hint;
+  if (exact(name, other) != nullptr) {
+    hint = std::string(" (it is an ") + wordFor(other) + ")";
+  } else if (const Signal* near = nearest(signals_, name, direction)) {
+    hint = " (did you mean " + near->name + "?)";
+  }
+  throw WrongUse(std::string("no ") + wordFor(direction) + " of that name" + hint + ": " + std::string(name));
 }
 
 Signal SignalTable::find(std::string_view name, Direction direction) const {
-  if (const Signal* signal = exact(signals, name, direction)) return *signal;
+  if (const Signal* signal = exact(name, direction)) return *signal;
   const std::size_t bracket = name.find('[');
-  if (bracket == name.npos || name.back() != ']') failUnknown(signals, name, direction);
-  const Signal* whole = exact(signals, name.substr(0, bracket), direction);
-  if (whole == nullptr) failUnknown(signals, name.substr(0, bracket), direction);
+  if (bracket == name.npos || name.back() != ']') failUnknown(name, direction);
+  const Signal* whole = exact(name.substr(0, bracket), direction);
+  if (whole == nullptr) failUnknown(name.substr(0, bracket), direction);
   return slice(*whole, name, name.substr(bracket + 1, name.size() - bracket - 2));
 }
 
@@ -124,17 +135,17 @@ std::vector<Signal> SignalTable::select(const std::vector<std::string>& names, D
   if (!names.empty()) return chosen;
   const auto pick = [&](std::size_t first, std::size_t last) {
     for (std::size_t i = first; i < last; ++i)
-      if (points(signals[i], direction)) chosen.push_back(signals[i]);
+      if (points(signals_[i], direction)) chosen.push_back(signals_[i]);
   };
-  pick(0, fileSignals);
-  if (chosen.empty()) pick(fileSignals, signals.size());
+  pick(0, fileSignals_);
+  if (chosen.empty()) pick(fileSignals_, signals_.size());
   return chosen;
 }
 
 std::vector<std::string> misfits(const SignalTable& table, const QORVIO_CORE_INFO& info) {
   std::vector<std::string> lines;
-  for (std::size_t i = 0; i < table.fileSignals; ++i) {
-    const Signal& signal = table.signals[i];
+  for (std::size_t i = 0; i < table.fileSignals(); ++i) {
+    const Signal& signal = table.signals()[i];
     const unsigned width = widthOf(info, signal.port);
     const unsigned highest = *std::max_element(signal.bits.begin(), signal.bits.end());
     if (highest < width) continue;

@@ -1,9 +1,11 @@
 // The signals that a user can name.
 #pragma once
 
+#include <array>
 #include <optional>
 #include <string>
 #include <string_view>
+#include <unordered_map>
 #include <vector>
 
 #include "Link.h"
@@ -14,22 +16,39 @@ namespace tool {
 
 enum class Direction { input, output };
 
-/// What a signals file says. Names are told apart without regard to case; inputs and outputs are two name spaces.
-struct SignalTable {
+/// What a signals file says, and the whole ports of a core. Names are told apart without regard to the case of A to Z;
+/// inputs and outputs are two name spaces.
+class SignalTable {
+ public:
   std::optional<QOR_CORE_REF> core;  ///< where the file's core stands
-  std::vector<Signal> signals;       ///< in the file's order
 
-  /// Adds the whole ports of a core under the library's names, where they are not taken.
+  /// Adds a signal; false, adding nothing, when its name is taken in its direction.
+  bool add(Signal signal);
+
+  /// Adds the whole ports of a core under the library's names, where they are not taken. select() and fileSignals()
+  /// tell them from the signals that were added before.
   void addWholePorts(const QORVIO_CORE_INFO& info);
+
+  /// All signals, in the order in which they were added.
+  const std::vector<Signal>& signals() const { return signals_; }
+
+  /// How many, from the front, are not whole ports.
+  std::size_t fileSignals() const { return fileSignals_; }
 
   /// The signal of that name, or a slice of one: "leds[3]", "leds[7:4]" are bits of its value. Throws WrongUse, with
   /// the nearest name there is, when it is not there or the slice is beyond it.
   Signal find(std::string_view name, Direction direction) const;
 
-  /// The named signals; all in that direction, whole ports left out when the file names any, when `names` is empty.
+  /// The named signals; without names all of that direction, whole ports left out when the file names any.
   std::vector<Signal> select(const std::vector<std::string>& names, Direction direction) const;
 
-  std::size_t fileSignals = 0;  ///< how many, from the front, are the file's own
+ private:
+  const Signal* exact(std::string_view name, Direction direction) const;
+  [[noreturn]] void failUnknown(std::string_view name, Direction direction) const;
+
+  std::vector<Signal> signals_;
+  std::size_t fileSignals_ = 0;
+  std::array<std::unordered_map<std::string, std::size_t>, 2> places_;  // by direction and folded name
 };
 
 /// Reads a signals file. Throws WrongUse, "FILE:LINE: KEY: what is wrong".

@@ -2,8 +2,9 @@
 
 #include <algorithm>
 #include <cerrno>
+#include <filesystem>
 #include <fstream>
-#include <sstream>
+#include <iterator>
 #include <system_error>
 
 #include "Errors.h"
@@ -11,14 +12,15 @@
 namespace tool {
 
 toml::table readToml(const std::string& path) {
+  std::error_code none;
+  const int directory = std::filesystem::is_directory(path, none) ? EISDIR : 0;
   std::ifstream file(path, std::ios::binary);
-  const int error = errno;
-  std::ostringstream text;
-  if (!file || !(text << file.rdbuf()))
-    throw WrongUse("cannot read the file " + path + ": " +
-                   (file ? "nothing in it" : std::generic_category().message(error)));
+  const int error = directory != 0 ? directory : errno;
+  if (directory != 0 || !file)
+    throw WrongUse("cannot read the file " + path + ": " + std::generic_category().message(error));
+  const std::string text{std::istreambuf_iterator<char>(file), {}};
   try {
-    return toml::parse(text.str());
+    return toml::parse(text);
   } catch (const toml::parse_error& wrong) {
     throw WrongUse(path + ":" + std::to_string(wrong.source().begin.line) + ": " +
                    std::string(wrong.description()));

@@ -112,13 +112,18 @@ std::string shown(const Signal& signal, const Bytes& value, const Radix* radix) 
 }
 
 Bytes parseValue(const Signal& signal, std::string_view text) {
-  for (const auto& [name, number] : signal.names)
-    if (name == text) return *numberOf(std::to_string(number), 10);
+  const std::size_t byteCount = (signal.width() + 7) / 8;
+  for (const auto& [name, number] : signal.names) {
+    if (name != text) continue;
+    Bytes value = *numberOf(std::to_string(number), 10);
+    value.resize(byteCount);
+    return value;
+  }
   const Spelled parts = spelled(text, signal.radix);
   std::optional<Bytes> number = numberOf(parts.digits, parts.base);
   if (!number) failText(signal, text);
   if (bitLength(*number) > signal.width()) failWidth(signal, text);
-  number->resize((signal.width() + 7) / 8);
+  number->resize(byteCount);
   if (!parts.isNegative) {
     // In a signed radix the top bit is the sign, unless the value was spelled bit by bit.
     if (signal.radix == Radix::signedDec && parts.base == 10 && isNegative(*number, signal.width()))

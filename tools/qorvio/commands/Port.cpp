@@ -20,7 +20,7 @@ struct SetOptions {
 Signal wholePort(const QORVIO_CORE_INFO& info, const std::string& name, Direction direction) {
   SignalTable ports;
   ports.addWholePorts(info);
-  for (const Signal& each : ports.signals)
+  for (const Signal& each : ports.signals())
     if (name == portName(each.port) && isInput(each.port) == (direction == Direction::input)) return each;
   throw WrongUse(std::string("not an ") + (direction == Direction::input ? "input" : "output") +
                  " port of this core: " + name);

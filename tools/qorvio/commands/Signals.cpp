@@ -38,16 +38,17 @@ void check(Context& context) {
   if (context.settings.signals.empty()) throw WrongUse("no signals file to check: use --signals FILE");
   const std::vector<std::string> wrong = misfits(context.file(), context.core().info());
   if (context.settings.json) {
-    std::printf("%s\n",
-                nlohmann::json{{"signals", context.file().fileSignals}, {"misfits", wrong}}.dump(2).c_str());
+    std::printf(
+        "%s\n",
+        nlohmann::json{{"signals", context.file().fileSignals()}, {"misfits", wrong}}.dump(2).c_str());
   } else {
     for (const std::string& each : wrong) std::printf("%s\n", each.c_str());
   }
   if (!wrong.empty())
     throw WrongUse("signals do not fit core " + refText(context.core().ref()) + ": " +
-                   std::to_string(wrong.size()) + " of " + std::to_string(context.file().fileSignals));
+                   std::to_string(wrong.size()) + " of " + std::to_string(context.file().fileSignals()));
   if (!context.settings.json && !context.settings.quiet)
-    std::printf("%zu signals, all fit core %s\n", context.file().fileSignals,
+    std::printf("%zu signals, all fit core %s\n", context.file().fileSignals(),
                 refText(context.core().ref()).c_str());
 }
 
@@ -70,7 +71,7 @@ void addSignals(CLI::App& app, Context& context) {
       });
   command->callback([&context, command, namesOnly] {
     if (!command->get_subcommands().empty()) return;
-    const std::vector<Signal>& signals = context.signals().signals;
+    const std::vector<Signal>& signals = context.signals().signals();
     if (!*namesOnly) return list(signals, context.settings.json);
     for (const Signal& each : signals) std::printf("%s\n", each.name.c_str());
   });
