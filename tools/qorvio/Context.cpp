@@ -49,7 +49,10 @@ void Settings::complete() {
 }
 
 Link& Context::link() {
-  if (!link_) link_ = std::make_unique<Link>(settings.cable);
+  if (link_) return *link_;
+  std::unique_ptr<QorRT::Qor_Cable> cable = openCable(settings.cable);
+  if (traffic_ != nullptr) cable = std::make_unique<CountingCable>(std::move(cable), *traffic_);
+  link_ = std::make_unique<Link>(std::move(cable));
   return *link_;
 }
 

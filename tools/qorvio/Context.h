@@ -6,6 +6,7 @@
 #include <string>
 
 #include "CoreSession.h"
+#include "CountingCable.h"
 #include "Link.h"
 #include "SignalTable.h"
 
@@ -30,6 +31,9 @@ class Context {
 
   Link& link();
 
+  /// Has the cable's traffic counted, from its opening on. `traffic` outlives the context.
+  void countTraffic(Traffic& traffic) { traffic_ = &traffic; }
+
   /// The core that was named, or that the signals file names, or the first VIO core. Set up.
   CoreSession& core();
 
@@ -43,6 +47,7 @@ class Context {
   const SignalTable& signals();
 
  private:
+  Traffic* traffic_ = nullptr;
   std::unique_ptr<Link> link_;
   std::unique_ptr<CoreSession> core_;
   std::optional<SignalTable> file_;

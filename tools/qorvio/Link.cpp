@@ -15,14 +15,6 @@ using QorRT::Qor_ByteBuffer;
 constexpr unsigned statusBytes = 16, statusBits = 8 * statusBytes;
 constexpr unsigned coresOfAHub = 16;
 
-unsigned openSession(const std::string& url) {
-  try {
-    return QorJtag_session_open(url.c_str());
-  } catch (const std::exception& error) {
-    throw Failure("cannot open the cable " + url + ": " + error.what());
-  }
-}
-
 // Reads the status word; false when there is no such core. Throws when nothing answers.
 bool probe(unsigned session, FoundCore& core) {
   const QorRT::QorJtagTargetLock lock(session, 60000);
@@ -59,8 +51,12 @@ void findBehind(Link& link, unsigned device, unsigned userChain, std::vector<Fou
 
 }  // namespace
 
-Link::Link(const std::string& url) : session_(openSession(url)) {
-  listen();
+std::unique_ptr<QorRT::Qor_Cable> openCable(const std::string& url) {
+  try {
+    return QorRT::openCable(url.c_str());
+  } catch (const std::exception& error) {
+    throw Failure("cannot open the cable " + url + ": " + error.what());
+  }
 }
 
 Link::Link(std::unique_ptr<QorRT::Qor_Cable> cable) : session_(QorJtag_session_openCable(std::move(cable))) {

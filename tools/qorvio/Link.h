@@ -10,12 +10,13 @@
 
 namespace tool {
 
+/// Throws Failure, "cannot open the cable URL: why".
+std::unique_ptr<QorRT::Qor_Cable> openCable(const std::string& url);
+
 /// Keeps the session's messages, and throws them as Failure.
 class Link {
  public:
-  /// Opens a session. Throws Failure, "cannot open the cable: URL: why".
-  explicit Link(const std::string& url);
-  /// A session on a cable of the caller's own.
+  /// Opens a session on the cable.
   explicit Link(std::unique_ptr<QorRT::Qor_Cable> cable);
   Link(const Link&) = delete;
   Link& operator=(const Link&) = delete;

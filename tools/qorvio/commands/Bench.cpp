@@ -1,0 +1,100 @@
+// How fast the board can be polled, and what a poll costs on the wire.
+#include <algorithm>
+#include <chrono>
+#include <cstdio>
+
+#include <nlohmann/json.hpp>
+
+#include "Commands.h"
+#include "CountingCable.h"
+#include "Errors.h"
+#include "Table.h"
+
+namespace tool {
+namespace {
+
+using Clock = std::chrono::steady_clock;
+
+struct Figures {
+  std::vector<double> latencies;  // microseconds, in ascending order
+  double seconds = 0;
+  Traffic traffic;
+};
+
+Figures measure(CoreSession& core, unsigned polls, Traffic& traffic) {
+  Sample sample = core.emptySample();
+  core.read(sample);  // what a first read sets up is not a poll's
+  traffic = {};
+  Figures figures;
+  figures.latencies.reserve(polls);
+  const Clock::time_point begin = Clock::now();
+  Clock::time_point last = begin;
+  for (unsigned i = 0; i < polls; ++i) {
+    core.read(sample);
+    const Clock::time_point now = Clock::now();
+    figures.latencies.push_back(std::chrono::duration<double, std::micro>(now - last).count());
+    last = now;
+  }
+  figures.seconds = std::chrono::duration<double>(last - begin).count();
+  figures.traffic = traffic;
+  std::sort(figures.latencies.begin(), figures.latencies.end());
+  return figures;
+}
+
+double percentile(const std::vector<double>& sorted, double part) {
+  return sorted[static_cast<std::size_t>(part * static_cast<double>(sorted.size() - 1))];
+}
+
+std::string decimals(double number, int digits) {
+  char text[64];
+  std::snprintf(text, sizeof text, "%.*f", digits, number);
+  return text;
+}
+
+void print(const Figures& figures, bool asJson) {
+  const auto polls = static_cast<double>(figures.latencies.size());
+  const auto each = [&](std::uint64_t count) { return static_cast<double>(count) / polls; };
+  const double rate = polls / figures.seconds, median = percentile(figures.latencies, 0.5),
+               worst = percentile(figures.latencies, 0.99);
+  if (asJson) {
+    const nlohmann::ordered_json json{{"polls", figures.latencies.size()},
+                                      {"polls_per_second", rate},
+                                      {"median_us", median},
+                                      {"percentile_99_us", worst},
+                                      {"exchanges_per_poll", each(figures.traffic.exchanges)},
+                                      {"scans_per_poll", each(figures.traffic.scans)},
+                                      {"bits_per_poll", each(figures.traffic.bits)},
+                                      {"idle_tcks_per_poll", each(figures.traffic.idle)}};
+    std::printf("%s\n", json.dump(2).c_str());
+    return;
+  }
+  Table table({"FIGURE", "VALUE"});
+  table.add({"polls a second", decimals(rate, 0)});
+  table.add({"median latency", decimals(median, 1) + " us"});
+  table.add({"99th percentile", decimals(worst, 1) + " us"});
+  table.add({"exchanges a poll", decimals(each(figures.traffic.exchanges), 2)});
+  table.add({"scans a poll", decimals(each(figures.traffic.scans), 2)});
+  table.add({"bits on the wire a poll", decimals(each(figures.traffic.bits), 1)});
+  table.add({"idle TCKs a poll", decimals(each(figures.traffic.idle), 1)});
+  std::printf("%s", table.text().c_str());
+}
+
+void bench(Context& context, unsigned polls) {
+  if (polls == 0) throw WrongUse("nothing to measure: --polls 0");
+  Traffic traffic;
+  context.countTraffic(traffic);
+  print(measure(context.core(), polls, traffic), context.settings.json);
+}
+
+}  // namespace
+
+void addBench(CLI::App& app, Context& context) {
+  auto polls = std::make_shared<unsigned>(1000);
+  CLI::App* command =
+      app.add_subcommand("bench", "polls a second, their latency, and what each costs on the wire");
+  command->add_option("--polls", *polls, "how many reads to measure");
+  command->footer("Example:\n  qorvio bench --polls 10000");
+  command->callback([&context, polls] { bench(context, *polls); });
+}
+
+}  // namespace tool
