@@ -1,4 +1,4 @@
-# Debian packages of the two components, for CPack. scripts/package configures such a build, and makes them.
+# Debian packages of the three components, for CPack. scripts/package configures such a build, and makes them.
 set(QORVIO_MAINTAINER "The QorVIO authors <authors@qorvio.invalid>" CACHE STRING "Who answers for the packages")
 set(release 1)
 set(about "A debug core inside an FPGA lends a host program virtual pins: inputs whose
@@ -11,7 +11,7 @@ set(CPACK_PACKAGING_INSTALL_PREFIX /usr)
 set(CPACK_STRIP_FILES ON)
 set(CPACK_INSTALL_DEFAULT_DIRECTORY_PERMISSIONS
     OWNER_READ OWNER_WRITE OWNER_EXECUTE GROUP_READ GROUP_EXECUTE WORLD_READ WORLD_EXECUTE)
-set(CPACK_COMPONENTS_ALL libqorvio libqorvio-dev)
+set(CPACK_COMPONENTS_ALL libqorvio libqorvio-dev qorvio)
 set(CPACK_DEB_COMPONENT_INSTALL ON)
 set(CPACK_DEBIAN_FILE_NAME DEB-DEFAULT)
 set(CPACK_DEBIAN_PACKAGE_RELEASE ${release})
@@ -32,6 +32,14 @@ set(CPACK_DEBIAN_LIBQORVIO-DEV_PACKAGE_DEPENDS "libqorvio (= ${PROJECT_VERSION}-
 set(CPACK_COMPONENT_LIBQORVIO-DEV_DESCRIPTION "${about}
 
 This package holds the headers, and what CMake and pkg-config need.")
+
+set(CPACK_DEBIAN_QORVIO_PACKAGE_NAME qorvio)
+set(CPACK_DEBIAN_QORVIO_PACKAGE_SECTION electronics)
+set(CPACK_DEBIAN_QORVIO_PACKAGE_SHLIBDEPS ON)
+set(CPACK_DEBIAN_QORVIO_PACKAGE_DEPENDS "libqorvio (= ${PROJECT_VERSION}-${release})")
+set(CPACK_COMPONENT_QORVIO_DESCRIPTION "${about}
+
+This package holds the command line.")
 
 file(WRITE ${PROJECT_BINARY_DIR}/triggers "activate-noawait ldconfig\n")
 set(shlibs "")

@@ -1,0 +1,48 @@
+# doctor and play, as typed. Needs QORVIO, the tool.
+
+setup() {
+  cd "$BATS_TEST_TMPDIR" || exit 1
+  unset QORVIO_CABLE QORVIO_CORE QORVIO_SIGNALS
+  export XDG_STATE_HOME=$PWD
+}
+
+@test "doctor finds everything well on the demo board" {
+  run "$QORVIO" doctor
+  [ "$status" -eq 0 ]
+  [ "${#lines[@]}" -eq 8 ]
+  [ "${lines[3]}" = "ok       user registers       hubs behind 0.1, 1.1" ]
+  [ "${lines[7]}" = "ok       write and read back  8 bits written and read back" ]
+  run "$QORVIO" --core 1.1.0 doctor
+  [ "${lines[5]}" = "ok       status word          core 1.1.0, oldest layout, outputs 4 async 4 sync, inputs 16 async 16 sync" ]
+  [ "${lines[7]}" = "ok       write and read back  the design does not loop its outputs back" ]
+}
+
+@test "doctor names the step that fails, what it saw, and what to try" {
+  printf '[[device]]\nidcode = 0x11\n' >empty.toml
+  run "$QORVIO" --cable sim:empty.toml --quiet doctor
+  [ "$status" -eq 1 ]
+  [ "${lines[0]}" = "FAILED   user registers       no hub signature A behind any user register: all zeros" ]
+  [ "${lines[2]}" = "qorvio: the check failed: user registers" ]
+  [ "$("$QORVIO" --cable sim:empty.toml --json doctor 2>&1 | grep -c '"result": "skipped"')" -eq 4 ]
+  printf '[[device]]\nidcode = 0x10\n' >even.toml
+  run "$QORVIO" --cable sim:even.toml --quiet doctor
+  [ "${lines[0]}" = "FAILED   idcodes              bit 0 is not 1: 00000010" ]
+  printf 'tcks_per_clock = 0\n[[device]]\n[[device.core]]\nuser_chain = 1\nindex = 0\ntype = "vio"\nsync_in = 4\n' >stopped.toml
+  run "$QORVIO" --cable sim:stopped.toml --quiet doctor
+  [ "${lines[0]}" = "FAILED   read                 device 0, user chain 1, core 0: design clock stopped" ]
+}
+
+@test "play checks a whole table first, then drives it in bursts where it can" {
+  { echo 'sync_out_data,sync_out_data[0]'; for i in {1..20}; do echo "$i,1"; done; } >steps.csv
+  [ "$("$QORVIO" play steps.csv)" = "20 rows in 2 exchanges" ]
+  [ "$("$QORVIO" play steps.csv --rate 1000)" = "20 rows in 20 exchanges" ]
+  printf 'async_out_data\n1\n2\n' >levels.csv
+  [ "$("$QORVIO" --json play levels.csv)" = '{"rows": 2, "exchanges": 2}' ]
+  printf 'sync_out_data\n1\n2FF\n' >wide.csv
+  run "$QORVIO" play wide.csv
+  [ "$status" -eq 2 ]
+  [ "$output" = "qorvio: wide.csv:3: sync_out_data has 8 bits, too few for the value: 2FF" ]
+  printf 'leds\n1\n' >unknown.csv
+  run "$QORVIO" play unknown.csv
+  [ "$output" = "qorvio: unknown.csv:1: no output of that name: leds" ]
+}

@@ -1,0 +1,185 @@
+// Checks from the cable up, each told with what was seen and what to try next.
+#include <algorithm>
+#include <cstdio>
+#include <functional>
+
+#include <nlohmann/json.hpp>
+
+#include "Commands.h"
+#include "Errors.h"
+#include "Table.h"
+
+namespace tool {
+namespace {
+
+struct Check {
+  const char* name;
+  const char* next;                  // what to try when it fails
+  std::function<std::string()> run;  // tells what was seen, or throws what is wrong
+};
+
+std::string hexadecimal(unsigned number) {
+  char text[16];
+  std::snprintf(text, sizeof text, "%08X", number);
+  return text;
+}
+
+std::string counted(std::size_t count, const char* what) {
+  return std::to_string(count) + " " + what + (count == 1 ? "" : "s");
+}
+
+std::string idcodes(const std::vector<QorRT::Qor_Device>& devices) {
+  std::string text;
+  for (const QorRT::Qor_Device& each : devices) {
+    // Bit 0 of an IDCODE is always 1: it tells it from a BYPASS register.
+    if (each.idcode != 0 && (each.idcode & 1) == 0)
+      throw Failure("bit 0 is not 1: " + hexadecimal(each.idcode));
+    if (each.idcode == 0xFFFFFFFF) throw Failure("TDO is stuck at 1: FFFFFFFF");
+    text += (text.empty() ? "" : ", ") + (each.idcode != 0 ? hexadecimal(each.idcode) : "none");
+  }
+  return text;
+}
+
+// The first 16 bits that a user register delivers: the head of a hub, if one is there.
+unsigned headBehind(QorRT::Qor_Cable& cable, unsigned device, unsigned userChain) {
+  cable.scanIr(device, userChain);
+  const std::size_t scan = cable.scanDr(device, Bytes(4, 0xFF), 32, true);
+  const Bytes& bits = cable.captured(scan);
+  return bits[0] | static_cast<unsigned>(bits[1]) << 8;
+}
+
+std::string hubs(QorRT::Qor_Cable& cable) {
+  std::string found, seen;
+  for (unsigned device = 0; device < cable.devices().size(); ++device) {
+    for (unsigned chain = 1; chain <= QorRT::Qor_Cable::userChainCount; ++chain) {
+      const unsigned head = headBehind(cable, device, chain);
+      const std::string place = std::to_string(device) + "." + std::to_string(chain);
+      if (head >> 12 == 0xA) found += (found.empty() ? "" : ", ") + place;
+      if (head >> 12 != 0xA && head != 0) seen += ", " + place + " delivers " + hexadecimal(head).substr(4);
+    }
+  }
+  if (found.empty())
+    throw Failure("no hub signature A behind any user register" + (seen.empty() ? ": all zeros" : seen));
+  return "hubs behind " + found + seen;
+}
+
+std::string layout(CoreSession& core) {
+  QORVIO_CORE_INFO again{};
+  core.link().check(QorVIO_getInfo(core.link().session(), core.ref(), &again));
+  const QORVIO_CORE_INFO& info = core.info();
+  if (again.async_input_count != info.async_input_count || again.sync_input_count != info.sync_input_count ||
+      again.async_output_count != info.async_output_count ||
+      again.sync_output_count != info.sync_output_count)
+    throw Failure("two reads of the status word differ");
+  const unsigned key = info.core_major_version << 4 | info.core_minor_version;
+  return std::string(key < 98    ? "oldest"
+                     : key < 160 ? "middle"
+                                 : "current") +
+         " layout, outputs " + std::to_string(info.async_output_count) + " async " +
+         std::to_string(info.sync_output_count) + " sync, inputs " + std::to_string(info.async_input_count) +
+         " async " + std::to_string(info.sync_input_count) + " sync";
+}
+
+// Writes a pattern and its opposite, and puts back what the outputs were last known to hold.
+std::string loop(CoreSession& core) {
+  const unsigned width = std::min(core.info().async_output_count, core.info().async_input_count);
+  if (width == 0) return "nothing to compare: no asynchronous port in both directions";
+  Signal outputs{"async_out_data", Port::asyncOut}, inputs{"async_in_data", Port::asyncIn};
+  for (unsigned bit = 0; bit < width; ++bit) {
+    outputs.bits.push_back(bit);
+    inputs.bits.push_back(bit);
+  }
+  const Bytes before = core.lastWritten(outputs);
+  Sample sample = core.emptySample();
+  Bytes pattern((width + 7) / 8), value;
+  bool follows = true;
+  for (unsigned first : {0U, 1U}) {
+    for (unsigned bit = 0; bit < width; ++bit) setBit(pattern, bit, (bit + first) % 2);
+    core.write({level(outputs, pattern)});
+    core.read(sample);
+    extract(inputs, sample.asyncIn, value);
+    follows = follows && value == pattern;
+  }
+  core.write({level(outputs, before)});
+  return follows ? counted(width, "bit") + " written and read back"
+                 : "the design does not loop its outputs back";
+}
+
+std::vector<Check> checksOf(Context& context, std::unique_ptr<QorRT::Qor_Cable>& cable, bool mayWrite) {
+  std::vector<Check> checks{
+      {"cable", "is the adapter plugged in, its server running, the address right?",
+       [&] {
+         cable = openCable(context.settings.cable);
+         return context.settings.cable;
+       }},
+      {"chain", "is the board powered, and TDO connected?",
+       [&] {
+         if (cable->devices().empty()) throw Failure("no device");
+         return counted(cable->devices().size(), "device");
+       }},
+      {"idcodes", "compare with the data sheets; a slower TCK helps on long wires",
+       [&] { return idcodes(cable->devices()); }},
+      {"user registers", "is the design with the core loaded, and its hub on a user register?",
+       [&] { return hubs(*cable); }},
+      {"cores", "do core indexes collide, or does the hub have none?",
+       [&] {
+         cable.reset();
+         return counted(findCores(context.link()).size(), "core");
+       }},
+      {"status word", "choose a VIO core with --core; qorvio scan shows them",
+       [&] { return "core " + refText(context.core().ref()) + ", " + layout(context.core()); }},
+      {"read", "is the clock of the design running?",
+       [&] {
+         Sample sample = context.core().emptySample();
+         context.core().read(sample);
+         return std::string("inputs delivered, CRC right");
+       }},
+  };
+  if (mayWrite) {
+    checks.push_back(
+        {"write and read back", "is the clock of the design running?", [&] { return loop(context.core()); }});
+  }
+  return checks;
+}
+
+void doctor(Context& context, bool mayWrite) {
+  std::unique_ptr<QorRT::Qor_Cable> cable;
+  nlohmann::ordered_json json = nlohmann::ordered_json::array();
+  std::string failed;
+  for (const Check& check : checksOf(context, cable, mayWrite)) {
+    std::string result = "ok", seen;
+    try {
+      if (failed.empty()) seen = check.run();
+    } catch (const std::exception& error) {
+      seen = error.what();
+      result = "FAILED";
+    }
+    const bool isFailure = result == "FAILED";
+    if (!failed.empty()) result = "skipped";
+    if (isFailure) failed = check.name;
+    json.push_back(
+        {{"step", check.name}, {"result", result}, {"seen", seen}, {"next", isFailure ? check.next : ""}});
+    if (context.settings.json || (context.settings.quiet && !isFailure)) continue;
+    const Ink ink = isFailure ? Ink::red : result == "ok" ? Ink::green : Ink::dim;
+    std::printf("%s  %-20s %s\n", inked(ink, result + std::string(7 - result.size(), ' ')).c_str(),
+                check.name, seen.c_str());
+    if (isFailure) std::printf("         %-20s %s\n", "", check.next);
+  }
+  if (context.settings.json) std::printf("%s\n", json.dump(2).c_str());
+  if (!failed.empty()) throw Failure("the check failed: " + failed);
+}
+
+}  // namespace
+
+void addDoctor(CLI::App& app, Context& context) {
+  auto dry = std::make_shared<bool>(false);
+  CLI::App* command =
+      app.add_subcommand("doctor", "checks everything from the cable up, and says what to try");
+  command->add_flag("--no-write", *dry, "leave the outputs alone");
+  command->footer(
+      "Outputs are driven for a moment, and then set to what this tool last gave them.\n\n"
+      "Example:\n  qorvio --cable sim:board.toml doctor --no-write");
+  command->callback([&context, dry] { doctor(context, !*dry); });
+}
+
+}  // namespace tool
