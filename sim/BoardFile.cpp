@@ -1,37 +1,17 @@
-#include <algorithm>
-#include <array>
-#include <cerrno>
-#include <fstream>
-#include <stdexcept>
-#include <system_error>
-
-#include "BoardEntry.h"
 #include "BoardError.h"
 #include "Sim.h"
+#include "TomlEntry.h"
+#include "TomlFile.h"
+#include "TomlKeys.h"
 
 namespace qorsim {
 namespace {
 
-// The keys that a kind of table may have, and what each does to the thing that the table describes. Keys
-// without an effect of their own are read where the thing is made.
-template <class Thing>
-struct Key {
-  std::string_view name;
-  void (*apply)(const BoardEntry& entry, Thing& thing);
-};
+using QorRT::applyTomlKeys;
+using QorRT::TomlEntry;
+using QorRT::TomlKey;
 
-template <class Thing, std::size_t count>
-void applyKeys(const BoardEntry& table, const std::array<Key<Thing>, count>& keys, Thing& thing) {
-  for (const auto& [name, node] : table.table()) {
-    const std::string_view spelled = name.str();
-    const auto key =
-        std::find_if(keys.begin(), keys.end(), [&](const Key<Thing>& each) { return each.name == spelled; });
-    if (key == keys.end()) table.failAt(spelled, "is no key of a board file");
-    if (key->apply != nullptr) key->apply(table.at(spelled), thing);
-  }
-}
-
-std::shared_ptr<Design> designNamed(const BoardEntry& entry) {
+std::shared_ptr<Design> designNamed(const TomlEntry& entry) {
   const std::string name = entry.text();
   if (name == "loopback") return loopback();
   if (name == "counter") return counter();
@@ -40,38 +20,38 @@ std::shared_ptr<Design> designNamed(const BoardEntry& entry) {
   entry.fail("must be \"loopback\", \"counter\", \"toggle\" or \"idle\", is \"" + name + "\"");
 }
 
-constexpr std::array<Key<CoreSpec>, 12> coreKeys{{
+constexpr std::array<TomlKey<CoreSpec>, 12> coreKeys{{
     {"user_chain", nullptr},
     {"index", nullptr},
     {"type", nullptr},
     {"version",
-     [](const BoardEntry& entry, CoreSpec& core) {
+     [](const TomlEntry& entry, CoreSpec& core) {
        const std::vector<unsigned> parts = entry.version(2);
        core.version(parts[0], parts[1]);
      }},
-    {"revision", [](const BoardEntry& entry, CoreSpec& core) { core.revision(entry.number()); }},
-    {"manufacturer", [](const BoardEntry& entry, CoreSpec& core) { core.manufacturer(entry.number()); }},
+    {"revision", [](const TomlEntry& entry, CoreSpec& core) { core.revision(entry.number()); }},
+    {"manufacturer", [](const TomlEntry& entry, CoreSpec& core) { core.manufacturer(entry.number()); }},
     {"cg_version",
-     [](const BoardEntry& entry, CoreSpec& core) {
+     [](const TomlEntry& entry, CoreSpec& core) {
        const std::vector<unsigned> parts = entry.version(3);
        core.cgVersion(parts[0], parts[1], parts[2]);
      }},
-    {"async_in", [](const BoardEntry& entry, CoreSpec& core) { core.asyncIn(entry.number()); }},
-    {"sync_in", [](const BoardEntry& entry, CoreSpec& core) { core.syncIn(entry.number()); }},
-    {"async_out", [](const BoardEntry& entry, CoreSpec& core) { core.asyncOut(entry.number()); }},
-    {"sync_out", [](const BoardEntry& entry, CoreSpec& core) { core.syncOut(entry.number()); }},
-    {"design", [](const BoardEntry& entry, CoreSpec& core) { core.design(designNamed(entry)); }},
+    {"async_in", [](const TomlEntry& entry, CoreSpec& core) { core.asyncIn(entry.number()); }},
+    {"sync_in", [](const TomlEntry& entry, CoreSpec& core) { core.syncIn(entry.number()); }},
+    {"async_out", [](const TomlEntry& entry, CoreSpec& core) { core.asyncOut(entry.number()); }},
+    {"sync_out", [](const TomlEntry& entry, CoreSpec& core) { core.syncOut(entry.number()); }},
+    {"design", [](const TomlEntry& entry, CoreSpec& core) { core.design(designNamed(entry)); }},
 }};
 
-CoreSpec coreOfType(const BoardEntry& type) {
+CoreSpec coreOfType(const TomlEntry& type) {
   if (!type.isText()) return otherCore(type.number());
   if (type.text() != "vio") type.fail("must be \"vio\" or a number, is \"" + type.text() + "\"");
   return vio();
 }
 
-void addCore(const BoardEntry& table, ChainBuilder& board) {
+void addCore(const TomlEntry& table, ChainBuilder& board) {
   CoreSpec core = coreOfType(table.at("type"));
-  applyKeys(table, coreKeys, core);
+  applyTomlKeys(table, coreKeys, core);
   const unsigned userChain = table.at("user_chain").number(), index = table.at("index").number();
   try {
     board.core(userChain, index, core);
@@ -80,7 +60,7 @@ void addCore(const BoardEntry& table, ChainBuilder& board) {
   }
 }
 
-void setIrLength(const BoardEntry& entry, ChainBuilder& board) {
+void setIrLength(const TomlEntry& entry, ChainBuilder& board) {
   const unsigned bits = entry.number();
   try {
     board.irLength(bits);
@@ -89,63 +69,44 @@ void setIrLength(const BoardEntry& entry, ChainBuilder& board) {
   }
 }
 
-void addCores(const BoardEntry& entry, ChainBuilder& board) {
-  for (const BoardEntry& core : entry.tables()) addCore(core, board);
+void addCores(const TomlEntry& entry, ChainBuilder& board) {
+  for (const TomlEntry& core : entry.tables()) addCore(core, board);
 }
 
-constexpr std::array<Key<ChainBuilder>, 4> deviceKeys{{
+// The name of the TAP matters to the cables that lead to a real board.
+constexpr std::array<TomlKey<ChainBuilder>, 5> deviceKeys{{
     {"idcode", nullptr},
-    {"name", [](const BoardEntry& entry, ChainBuilder& board) { board.named(entry.text()); }},
+    {"name", [](const TomlEntry& entry, ChainBuilder& board) { board.named(entry.text()); }},
     {"ir_length", setIrLength},
     {"core", addCores},
+    {"tap", [](const TomlEntry& entry, ChainBuilder&) { entry.text(); }},
 }};
 
-void addDevices(const BoardEntry& entry, ChainBuilder& board) {
-  for (const BoardEntry& device : entry.tables()) {
+void addDevices(const TomlEntry& entry, ChainBuilder& board) {
+  for (const TomlEntry& device : entry.tables()) {
     board.device(device.table().contains("idcode") ? device.at("idcode").number() : 0);
-    applyKeys(device, deviceKeys, board);
+    applyTomlKeys(device, deviceKeys, board);
   }
 }
 
-constexpr std::array<Key<ChainBuilder>, 2> boardKeys{{
+constexpr std::array<TomlKey<ChainBuilder>, 2> boardKeys{{
     {"tcks_per_clock",
-     [](const BoardEntry& entry, ChainBuilder& board) { board.tcksPerClock(entry.number()); }},
+     [](const TomlEntry& entry, ChainBuilder& board) { board.tcksPerClock(entry.number()); }},
     {"device", addDevices},
 }};
-
-std::string contents(const std::string& path) {
-  std::ifstream file(path, std::ios::binary);
-  const int error = errno;
-  if (!file) throw std::runtime_error(path + ": cannot be opened: " + std::generic_category().message(error));
-  std::string text;
-  std::array<char, 4096> block{};
-  while (file.read(block.data(), block.size()) || file.gcount() > 0)
-    text.append(block.data(), static_cast<std::size_t>(file.gcount()));
-  if (file.bad()) throw std::runtime_error(path + ": cannot be read");
-  return text;
-}
-
-toml::table parse(const std::string& text, const std::string& file) {
-  try {
-    return toml::parse(text);
-  } catch (const toml::parse_error& error) {
-    throw std::runtime_error(file + ":" + std::to_string(error.source().begin.line) + ": " +
-                             std::string(error.description()));
-  }
-}
 
 }  // namespace
 
 ChainBuilder boardFile(const std::string& path) {
-  return boardText(contents(path), path);
+  return boardText(QorRT::fileContents(path), path);
 }
 
 ChainBuilder boardText(const std::string& text, const std::string& file) {
-  const toml::table parsed = parse(text, file);
-  const BoardEntry root(file, parsed, "");
+  const toml::table parsed = QorRT::parseToml(text, file);
+  const TomlEntry root(file, parsed, "");
   ChainBuilder board = chain();
   root.at("device");
-  applyKeys(root, boardKeys, board);
+  applyTomlKeys(root, boardKeys, board);
   return board;
 }
 

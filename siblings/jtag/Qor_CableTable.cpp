@@ -15,6 +15,8 @@ struct CableKind {
 
 constexpr CableKind cableKinds[] = {
     {"sim", openSimulatedCable},
+    {"rbb", openBitbangCable},
+    {"openocd", openOpenOcdCable},
 };
 
 std::string knownKinds() {

@@ -12,4 +12,12 @@ namespace QorRT {
 /// the file.
 std::unique_ptr<Qor_Cable> openSimulatedCable(const std::string& boardFile);
 
+/// `rbb:HOST:PORT` a remote_bitbang server; behind a "?" may stand `board=FILE` and `timeout=SECONDS`, with "&"
+/// between. Throws when the URL, the server or the chain behind it does not do.
+std::unique_ptr<Qor_Cable> openBitbangCable(const std::string& rest);
+
+/// `openocd:HOST:PORT` the Tcl port of an OpenOCD server; `openocd:?config=FILE` a server of our own, which ends
+/// with the cable. The same options and failures.
+std::unique_ptr<Qor_Cable> openOpenOcdCable(const std::string& rest);
+
 }  // namespace QorRT

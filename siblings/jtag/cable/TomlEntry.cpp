@@ -1,11 +1,11 @@
-#include "BoardEntry.h"
+#include "TomlEntry.h"
 
 #include <charconv>
 #include <limits>
 #include <stdexcept>
 #include <utility>
 
-namespace qorsim {
+namespace QorRT {
 namespace {
 
 std::string quoted(std::string_view text) {
@@ -24,29 +24,29 @@ std::string shown(const toml::node& node) {
 
 }  // namespace
 
-BoardEntry::BoardEntry(const std::string& file, const toml::node& node, std::string key)
+TomlEntry::TomlEntry(const std::string& file, const toml::node& node, std::string key)
     : file_(&file), node_(&node), key_(std::move(key)) {}
 
-void BoardEntry::fail(const std::string& problem) const {
+void TomlEntry::fail(const std::string& problem) const {
   const std::string line = std::to_string(node_->source().begin.line);
   throw std::runtime_error(*file_ + ":" + line + ": " + key_ + ": " + problem);
 }
 
-void BoardEntry::failKind(const char* wanted) const {
+void TomlEntry::failKind(const char* wanted) const {
   fail(std::string("must be ") + wanted + ", is " + shown(*node_));
 }
 
-const toml::table& BoardEntry::table() const {
+const toml::table& TomlEntry::table() const {
   if (const toml::table* table = node_->as_table()) return *table;
   failKind("a table");
 }
 
-std::string BoardEntry::text() const {
+std::string TomlEntry::text() const {
   if (const auto* text = node_->as_string()) return text->get();
   failKind("a text");
 }
 
-unsigned BoardEntry::number() const {
+unsigned TomlEntry::number() const {
   const auto* number = node_->as_integer();
   if (number == nullptr) failKind("a whole number");
   if (number->get() < 0 || number->get() > std::numeric_limits<std::uint32_t>::max())
@@ -54,7 +54,15 @@ unsigned BoardEntry::number() const {
   return static_cast<unsigned>(number->get());
 }
 
-std::vector<unsigned> BoardEntry::version(std::size_t count) const {
+std::vector<unsigned> TomlEntry::numbers() const {
+  if (!node_->is_array()) failKind("an array of numbers");
+  std::vector<unsigned> all;
+  for (const toml::node& each : *node_->as_array())
+    all.push_back(TomlEntry(*file_, each, key_ + "[" + std::to_string(all.size()) + "]").number());
+  return all;
+}
+
+std::vector<unsigned> TomlEntry::version(std::size_t count) const {
   const std::string whole = text();
   const char* const end = whole.data() + whole.size();
   std::vector<unsigned> parts(count);
@@ -71,26 +79,26 @@ std::vector<unsigned> BoardEntry::version(std::size_t count) const {
   return parts;
 }
 
-std::vector<BoardEntry> BoardEntry::tables() const {
+std::vector<TomlEntry> TomlEntry::tables() const {
   if (!node_->is_array_of_tables()) failKind("an array of tables");
-  std::vector<BoardEntry> entries;
+  std::vector<TomlEntry> entries;
   for (const toml::node& each : *node_->as_array())
     entries.emplace_back(*file_, each, key_ + "[" + std::to_string(entries.size()) + "]");
   return entries;
 }
 
-BoardEntry BoardEntry::at(std::string_view name) const {
+TomlEntry TomlEntry::at(std::string_view name) const {
   if (const toml::node* node = table().get(name)) return {*file_, *node, pathOf(name)};
   failAt(name, "is missing");
 }
 
-void BoardEntry::failAt(std::string_view name, const std::string& problem) const {
+void TomlEntry::failAt(std::string_view name, const std::string& problem) const {
   const toml::node* node = table().get(name);
-  BoardEntry(*file_, node != nullptr ? *node : *node_, pathOf(name)).fail(problem);
+  TomlEntry(*file_, node != nullptr ? *node : *node_, pathOf(name)).fail(problem);
 }
 
-std::string BoardEntry::pathOf(std::string_view name) const {
+std::string TomlEntry::pathOf(std::string_view name) const {
   return key_.empty() ? std::string(name) : key_ + "." + std::string(name);
 }
 
-}  // namespace qorsim
+}  // namespace QorRT

@@ -1,4 +1,4 @@
-// A value in a board file, with the place that messages name.
+// A value in a file that describes a board, with the place that messages name.
 #pragma once
 
 #include <toml++/toml.h>
@@ -7,13 +7,13 @@
 #include <string_view>
 #include <vector>
 
-namespace qorsim {
+namespace QorRT {
 
 /// A view of a node of the parsed file, which must outlive it. Failures are runtime_error, "FILE:LINE: KEY:
 /// what is wrong".
-class BoardEntry {
+class TomlEntry {
  public:
-  BoardEntry(const std::string& file, const toml::node& node, std::string key);
+  TomlEntry(const std::string& file, const toml::node& node, std::string key);
 
   /// The key path, such as "device[0].core[1].async_in"; empty for the whole file.
   const std::string& key() const { return key_; }
@@ -27,14 +27,17 @@ class BoardEntry {
   /// 0 to 4294967295.
   unsigned number() const;
 
+  /// An array of such numbers.
+  std::vector<unsigned> numbers() const;
+
   /// `count` decimal numbers, separated by dots, in a text such as "10.0".
   std::vector<unsigned> version(std::size_t count) const;
 
   /// The tables of an array of tables.
-  std::vector<BoardEntry> tables() const;
+  std::vector<TomlEntry> tables() const;
 
   /// The entry of a table under `name`. Fails when it is missing.
-  BoardEntry at(std::string_view name) const;
+  TomlEntry at(std::string_view name) const;
 
   /// Reports a problem with the entry under `name`, or where it would be.
   [[noreturn]] void failAt(std::string_view name, const std::string& problem) const;
@@ -50,4 +53,4 @@ class BoardEntry {
   std::string key_;
 };
 
-}  // namespace qorsim
+}  // namespace QorRT

@@ -1,0 +1,116 @@
+#include "OpenOcdCable.h"
+
+#include <algorithm>
+#include <stdexcept>
+#include <utility>
+
+#include "Qor_CableFactories.h"
+
+namespace QorRT {
+namespace {
+
+constexpr char endOfText = 0x1A;
+
+// A command of several megabytes is never answered.
+constexpr std::size_t longestCommand = 1 << 20;
+
+// Slower adapters than this, in TCKs a second, are not waited for.
+constexpr double slowestTck = 20000;
+
+std::size_t tcksOf(const Qor_Scan& scan) {
+  return scan.kind == Qor_Scan::Kind::idle ? scan.cycles : scan.bitCount + 32;
+}
+
+// A scan of no device or of another than the last IR scan's would end the server.
+void requireOrder(const std::vector<Qor_Scan>& scans) {
+  const Qor_Scan* selected = nullptr;
+  for (const Qor_Scan& scan : scans) {
+    if (scan.kind == Qor_Scan::Kind::ir) selected = &scan;
+    if (scan.kind != Qor_Scan::Kind::dr) continue;
+    if (selected == nullptr || selected->device != scan.device)
+      throw std::logic_error("a DR scan of device " + std::to_string(scan.device) +
+                             " is queued before an IR scan of it");
+    if (scan.bitCount == 0) throw std::logic_error("a DR scan of no bits is queued");
+  }
+}
+
+std::vector<Qor_Device> headsOf(const std::vector<OpenOcdTap>& taps) {
+  std::vector<Qor_Device> heads;
+  heads.reserve(taps.size());
+  for (const OpenOcdTap& tap : taps) heads.push_back({tap.idcode, tap.name, tap.irLength});
+  return heads;
+}
+
+}  // namespace
+
+std::unique_ptr<Qor_Cable> openOpenOcdCable(const std::string& rest) {
+  WireUrl url = parseWireUrl("openocd", rest);
+  if (url.endpoint.host.empty() == url.config.empty())
+    throw std::logic_error("the cable URL \"openocd:" + rest +
+                           "\" must name a server, HOST:PORT, or a configuration to start one, ?config=FILE");
+  return std::make_unique<OpenOcdCable>(std::move(url));
+}
+
+OpenOcdCable::OpenOcdCable(WireUrl url) : url_(std::move(url)) {
+  open();
+}
+
+OpenOcdCable::~OpenOcdCable() {
+  try {
+    if (stream_ && !server_ && !logLevel_.empty()) ask("debug_level " + logLevel_);
+  } catch (const std::exception&) {  // the server has gone first
+  }
+}
+
+void OpenOcdCable::disconnect() noexcept {
+  stream_.reset();
+}
+
+std::vector<WireDevice> OpenOcdCable::connect() {
+  stream_ = reach();
+  silenceLog();
+  taps_ = tapsIn(ask("capture scan_chain"));
+  requireTaps(taps_, url_.board);
+  return describedDevices(headsOf(taps_), url_.board);
+}
+
+std::unique_ptr<TcpStream> OpenOcdCable::reach() {
+  if (url_.config.empty()) return std::make_unique<TcpStream>(url_.endpoint, url_.timeout);
+  if (!server_ || !server_->runs()) server_ = std::make_unique<OpenOcdServer>(url_.config);
+  return server_->connect(url_.timeout);
+}
+
+// The level is asked for once: after a lost connection it is what this cable has set.
+void OpenOcdCable::silenceLog() {
+  if (logLevel_.empty()) {
+    const std::string answer = ask("debug_level");
+    const std::size_t digits = std::min(answer.find_first_of("-0123456789"), answer.size());
+    logLevel_ = answer.substr(digits, answer.find_first_not_of("-0123456789", digits) - digits);
+  }
+  ask("debug_level -3");
+}
+
+void OpenOcdCable::exchange(std::vector<Qor_Scan>& scans) {
+  requireOrder(scans);
+  std::string commands;
+  std::size_t tcks = 0;
+  auto first = scans.begin();  // of those whose commands are not sent yet
+  for (auto scan = scans.begin(); scan != scans.end(); ++scan) {
+    appendStep(commands, taps_, wireDevices(), *scan);
+    tcks += tcksOf(*scan);
+    if (commands.size() < longestCommand && scan + 1 != scans.end()) continue;
+    CaptureReader captures(ask(batchOf(commands), tcks));
+    for (; first != scan + 1; ++first)
+      if (first->capture) first->in = captures.next(first->bitCount);
+    captures.finish();
+    commands.clear();
+    tcks = 0;
+  }
+}
+
+std::string OpenOcdCable::ask(const std::string& command, std::size_t tcks) {
+  return stream_->ask(command + endOfText, endOfText,
+                      TcpStream::Seconds(static_cast<double>(tcks) / slowestTck));
+}
+
+}  // namespace QorRT

@@ -1,0 +1,40 @@
+// A chain behind an OpenOCD server, which drives the adapter; spoken to by its Tcl port.
+#pragma once
+
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "OpenOcdServer.h"
+#include "OpenOcdText.h"
+#include "QorExport.h"
+#include "WireCable.h"
+#include "WireUrl.h"
+
+namespace QorRT {
+
+/// A queue is one command, so that nobody else's come between; only one far above a megabyte goes in several.
+/// The server's log is silenced while the cable is connected: it would hold every scan.
+class QOR_API OpenOcdCable : public WireCable {
+ public:
+  /// The server at the endpoint of the URL, or one of our own for its configuration file. Throws runtime_error
+  /// when there is no such server, or its chain does not fit the board file.
+  explicit OpenOcdCable(WireUrl url);
+  ~OpenOcdCable() override;
+
+ private:
+  std::vector<WireDevice> connect() override;
+  void exchange(std::vector<Qor_Scan>& scans) override;
+  void disconnect() noexcept override;
+  std::unique_ptr<TcpStream> reach();
+  std::string ask(const std::string& command, std::size_t tcks = 0);
+  void silenceLog();
+
+  WireUrl url_;
+  std::unique_ptr<OpenOcdServer> server_;  // null for one that is not ours
+  std::unique_ptr<TcpStream> stream_;      // null without a connection
+  std::string logLevel_;                   // what the log is set back to; empty when it is not known
+  std::vector<OpenOcdTap> taps_;
+};
+
+}  // namespace QorRT

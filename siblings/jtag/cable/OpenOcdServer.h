@@ -1,0 +1,45 @@
+// An OpenOCD server of our own.
+#pragma once
+
+#include <sys/types.h>
+
+#include <cstdio>
+#include <memory>
+#include <string>
+
+#include "QorExport.h"
+#include "TcpStream.h"
+
+namespace QorRT {
+
+/// Runs from its construction to its destruction, with its Tcl port on a free loopback port and its other ports
+/// closed.
+class QOR_API OpenOcdServer {
+ public:
+  /// Throws runtime_error when no server can be started. What is wrong with the configuration file shows when
+  /// the server ends; see awaitPort().
+  explicit OpenOcdServer(const std::string& configFile);
+  ~OpenOcdServer();
+  OpenOcdServer(const OpenOcdServer&) = delete;
+  OpenOcdServer& operator=(const OpenOcdServer&) = delete;
+
+  /// A connection to its Tcl port, as soon as it takes one. Throws runtime_error, with the last errors of the
+  /// server's log, when it ends instead, or when `patience` passes first.
+  std::unique_ptr<TcpStream> connect(TcpStream::Seconds patience);
+
+  /// Whether it still runs.
+  bool runs();
+
+ private:
+  std::string errors() const;
+
+  struct CloseFile {
+    void operator()(std::FILE* file) const { std::fclose(file); }
+  };
+
+  Endpoint endpoint_;
+  std::unique_ptr<std::FILE, CloseFile> log_;  // has no name, and goes with us
+  pid_t process_ = -1;
+};
+
+}  // namespace QorRT

@@ -1,0 +1,55 @@
+// The texts that an OpenOCD server's Tcl port takes and gives.
+#pragma once
+
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "QorExport.h"
+#include "Qor_Cable.h"
+#include "WireDevice.h"
+
+namespace QorRT {
+
+/// One TAP of the server's chain.
+struct OpenOcdTap {
+  std::string name;
+  unsigned idcode = 0;             ///< as the server read it when it started; 0 for none
+  std::vector<unsigned> expected;  ///< any of them will do; empty for any
+  unsigned irLength = 0;           ///< bits; 0 for a TAP that the server's configuration does not know
+};
+
+/// The enabled TAPs in the server's table of its scan chain, the one nearest to TDO first. Throws runtime_error
+/// for a table that is none.
+QOR_API std::vector<OpenOcdTap> tapsIn(const std::string& table);
+
+/// Throws runtime_error when a TAP answers with an unexpected IDCODE or is not configured, or when the board
+/// file names another TAP at its place.
+QOR_API void requireTaps(const std::vector<OpenOcdTap>& taps, const std::vector<DeviceEntry>& board);
+
+/// Appends the commands of one step; what its scan returns is appended to the variable `r` if it captures.
+QOR_API void appendStep(std::string& commands, const std::vector<OpenOcdTap>& taps,
+                        const std::vector<WireDevice>& devices, const Qor_Scan& scan);
+
+/// Puts commands of appendStep() into one command that answers "ok" and every capture, or what failed.
+QOR_API std::string batchOf(const std::string& commands);
+
+/// The captures in an answer to a batch, taken in order. Throws runtime_error for whatever is no such answer.
+class QOR_API CaptureReader {
+ public:
+  explicit CaptureReader(std::string answer);
+
+  /// The next `bitCount` bits, in fields as appendStep() asks for them.
+  std::vector<unsigned char> next(std::size_t bitCount);
+
+  /// Throws when there is more.
+  void finish();
+
+ private:
+  std::string_view word();
+
+  std::string answer_;
+  std::size_t place_ = 0;
+};
+
+}  // namespace QorRT

@@ -1,0 +1,45 @@
+// A device on a real chain, and what a board file says of the devices there.
+#pragma once
+
+#include <array>
+#include <cstdint>
+#include <optional>
+#include <string>
+#include <vector>
+
+#include "QorExport.h"
+#include "Qor_Cable.h"
+
+namespace QorRT {
+
+struct WireDevice {
+  Qor_Device head;
+  std::array<std::uint64_t, Qor_Cable::userChainCount> userOpcodes{2, 3, 4, 5};  ///< of USER1 to USER4
+};
+
+/// What a board file says of one device; nothing, for what is to be found out.
+struct DeviceEntry {
+  std::optional<unsigned> idcode;
+  std::optional<unsigned> irLength;
+  std::optional<decltype(WireDevice::userOpcodes)> userOpcodes;
+  std::string name;
+  std::string tap;  ///< what a JTAG server calls it
+};
+
+/// The devices of a board file, the one nearest to TDO first; of a simulated board's file, what is known of it
+/// from outside. Throws runtime_error, "FILE:LINE: KEY: what is wrong".
+/// @{
+QOR_API std::vector<DeviceEntry> boardDevices(const std::string& path);
+QOR_API std::vector<DeviceEntry> boardDevicesOf(const std::string& text, const std::string& file);
+/// @}
+
+/// Lays what the board file says over what was found on the chain: names, IR lengths, opcodes. Throws
+/// runtime_error when they contradict each other: another number of devices, another IDCODE or IR length, an
+/// opcode that the IR has no room for. An IR length found as 0 is an unknown one, and must be in the file.
+QOR_API std::vector<WireDevice> describedDevices(const std::vector<Qor_Device>& found,
+                                                 const std::vector<DeviceEntry>& entries);
+
+/// "0A5F1093".
+QOR_API std::string idcodeText(unsigned idcode);
+
+}  // namespace QorRT
