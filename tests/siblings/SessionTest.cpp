@@ -22,9 +22,9 @@ TEST(Session, OpensOnlyCablesThatAUrlNames) {
   EXPECT_EQ(opening(nullptr), "logic: the cable URL is null");
   EXPECT_EQ(opening(""), "logic: the cable URL is empty");
   EXPECT_EQ(opening("sim"), "logic: the cable URL \"sim\" has no colon after its kind");
-  EXPECT_EQ(opening(":"), "logic: the cable URL \":\" is of the unknown kind \"\"; known: sim");
+  EXPECT_EQ(opening(":"), "logic: the cable URL \":\" is of the unknown kind \"\"; known: sim, rbb, openocd");
   EXPECT_EQ(opening("Sim:x:y"),
-            "logic: the cable URL \"Sim:x:y\" is of the unknown kind \"Sim\"; known: sim");
+            "logic: the cable URL \"Sim:x:y\" is of the unknown kind \"Sim\"; known: sim, rbb, openocd");
   EXPECT_EQ(thrownBy([] { QorJtag_session_openCable(nullptr); }), "logic: the cable of a session is null");
 }
 

@@ -111,7 +111,7 @@ TEST(BoardFacts, AreLaidOverWhatWasFoundAndMayNotContradictIt) {
       {"[[device]]\nuser_opcodes = [64]\n" + rest,
        "runtime: device 0 has an IR of 6 bits, too short for the opcode 64 of a user register"},
       {"[[device]]\nuser_opcodes = [1, -2]\n",
-       "runtime: b.toml:2: device[0].user_opcodes[1]: 0 to 4294967295"},
+       "runtime: b.toml:2: device[0].user_opcodes[1]: must be 0 to 4294967295, is -2"},
       {"[[device]]\nuser_opcodes = []\n",
        "runtime: b.toml:2: device[0].user_opcodes: must be the opcodes of 1 to 4 user registers, is 0"},
       {"[[device]]\nspeed = 3\n", "runtime: b.toml:2: device[0].speed: is no key of a board file"},

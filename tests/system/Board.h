@@ -4,6 +4,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include <cstdlib>
 #include <memory>
 #include <string>
 #include <utility>
@@ -19,6 +20,12 @@ using Bytes = std::vector<unsigned char>;
 using testing::ElementsAre;
 
 constexpr unsigned failed = 0x80000000;
+
+/// The demo board: simulated in process, or behind the cable that the environment names, as it stands there.
+inline std::string demoUrl() {
+  const char* const url = std::getenv("QORVIO_TEST_CABLE");
+  return url != nullptr ? url : "sim:";
+}
 
 enum PortType : unsigned { syncOut, syncIn, asyncOut, asyncIn };
 

@@ -9,20 +9,6 @@ using qorsim::chain;
 using qorsim::loopback;
 using qorsim::vio;
 
-TEST(DemoBoard, TellsWhatStandsOnIt) {
-  Board board("sim:");
-  const std::pair<QOR_CORE_REF, unsigned> cores[] = {{{0, 1, 0}, 1}, {{0, 1, 1}, 0}, {{1, 1, 0}, 1}};
-  unsigned result = 99;
-  for (auto [ref, isVio] : cores) {
-    EXPECT_EQ(QorVIO_isVIOCore(board.session, ref, &result), 0U);
-    EXPECT_EQ(result, isVio);
-  }
-  EXPECT_NE(QorVIO_isVIOCore(board.session, {0, 1, 15}, &result),
-            0U);  // the hub says so: no failure of the link
-  EXPECT_EQ(result, 0U);
-  EXPECT_TRUE(board.takeMessages().empty());
-}
-
 TEST(Names, GoOutThroughTheDesignAndBackWithTheirActivityInOneExchangeEach) {
   auto cable = chain()
                    .device(0x11)

@@ -8,26 +8,6 @@ using qorsim::vio;
 
 constexpr QOR_CORE_REF first{0, 1, 0};
 
-TEST(Addresses, ThatLeadNowhereSaySo) {
-  Board board("sim:");
-  const std::pair<QOR_CORE_REF, const char*> cases[] = {
-      {{2, 1, 0}, "100 there is no device 2: the chain has 2 devices"},
-      {{0, 5, 0}, "100 device 0 has no user chain 5: they are 1 to 4"},
-      {{0, 2, 0}, "100 device 0, user chain 2, core 0: no debug hub answers, TDO is all zeros"},
-      {{0, 1, 16}, "100 the core index 16 is above 15"},
-  };
-  for (const auto& [ref, message] : cases) {
-    EXPECT_EQ(QorVIO_initCore(board.session, ref), failed);
-    EXPECT_THAT(board.takeMessages(), ElementsAre(message));
-  }
-  for (QOR_CORE_REF ref : {QOR_CORE_REF{0, 1, 1}, {0, 1, 9}}) {
-    EXPECT_EQ(QorVIO_initCore(board.session, ref), failed);
-    EXPECT_THAT(board.takeMessages(),
-                ElementsAre("100 QorVIO_initCore() for the wrong core type or non-existant core.",
-                            "8000 Qor abort command"));
-  }
-}
-
 TEST(Sessions, ThatAreUnknownOrClosedFailEveryCall) {
   EXPECT_EQ(QorVIO_initCore(4000000000, first), failed);
   Board board("sim:");
