@@ -16,15 +16,18 @@ class Hub {
   /// Puts a core behind the hub, at an index that is free.
   void add(unsigned index, std::unique_ptr<Core> core);
 
-  /// A DR scan: replaces what TDI brings by what goes out, as many bits.
-  void scan(Bits& stream);
+  /// Capture-DR: what goes out first, with zeros behind it.
+  Bits capture();
+
+  /// Update-DR after that capture: all that TDI has brought since.
+  void update(const Bits& received);
 
   /// One design clock of every core.
   void clock();
 
  private:
   Bits answer() const;
-  void obey(const Frame& frame, bool resultSeen);
+  void obey(const Frame& frame);
 
   std::array<std::unique_ptr<Core>, coreCount> cores_;
 
@@ -35,6 +38,8 @@ class Hub {
 
   // The fate of the last frame of all.
   Reply reply_ = Reply::accepted;
+
+  bool resultSeen_ = false;  // the last capture delivered a finished snapshot of core_
 };
 
 }  // namespace qorsim

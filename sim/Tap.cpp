@@ -1,25 +1,22 @@
 #include "Tap.h"
 
-#include <algorithm>
-
 namespace qorsim {
 namespace {
 
 constexpr std::uint32_t idcodeOpcode = 1, bypassOpcode = 0xFFFFFFFF;
 
-// Shifts the stream through a register that holds `captured`; returns what stays in it.
-Bits shift(Bits& stream, const Bits& captured) {
-  stream.insert(stream.begin(), captured.begin(), captured.end());
-  const std::size_t out = stream.size() - captured.size();
-  Bits left(stream.begin() + static_cast<std::ptrdiff_t>(out), stream.end());
-  stream.resize(out);
-  return left;
+Bits bitsOf(std::uint32_t value, unsigned count) {
+  Bits bits;
+  bits.reserve(count);
+  appendNumber(bits, value, count);
+  return bits;
 }
 
 }  // namespace
 
-Tap::Tap(std::uint32_t idcode, unsigned irLength)
-    : idcode_(idcode), irLength_(irLength), instruction_(idcode != 0 ? idcodeOpcode : bypassOpcode) {}
+Tap::Tap(std::uint32_t idcode, unsigned irLength) : idcode_(idcode), irLength_(irLength) {
+  reset();
+}
 
 Hub& Tap::hub(unsigned userChain) {
   std::unique_ptr<Hub>& hub = hubs_[userChain - 1];
@@ -27,30 +24,56 @@ Hub& Tap::hub(unsigned userChain) {
   return *hub;
 }
 
+void Tap::reset() {
+  instruction_ = idcode_ != 0 ? idcodeOpcode : bypassOpcode;
+}
+
+void Tap::captureIr() {
+  register_ = ShiftRegister::passing(bitsOf(1, irLength_));
+}
+
+void Tap::captureDr() {
+  if (Hub* const hub = selectedHub())
+    register_ = ShiftRegister::keeping(hub->capture());
+  else if (userSelected())
+    register_ = ShiftRegister::keeping({});
+  else if (instruction_ == idcodeOpcode && idcode_ != 0)
+    register_ = ShiftRegister::passing(bitsOf(idcode_, 32));
+  else
+    register_ = ShiftRegister::passing({0});
+}
+
+void Tap::updateIr() {
+  instruction_ = numberAt(register_.take().data(), irLength_);
+}
+
+void Tap::updateDr() {
+  if (Hub* const hub = selectedHub()) hub->update(register_.take());
+}
+
 void Tap::scanIr(Bits& stream) {
-  Bits captured;
-  appendNumber(captured, 1, irLength_);
-  instruction_ = numberAt(shift(stream, captured).data(), irLength_);
+  captureIr();
+  register_.shift(stream);
+  updateIr();
 }
 
 void Tap::scanDr(Bits& stream) {
-  const bool user = instruction_ >= userOpcode(1) && instruction_ <= userOpcode(userChainCount);
-  if (user && hubs_[instruction_ - userOpcode(1)]) {
-    hubs_[instruction_ - userOpcode(1)]->scan(stream);
-  } else if (user) {
-    std::fill(stream.begin(), stream.end(), static_cast<unsigned char>(0));
-  } else if (instruction_ == idcodeOpcode && idcode_ != 0) {
-    Bits captured;
-    appendNumber(captured, idcode_, 32);
-    shift(stream, captured);
-  } else {
-    shift(stream, Bits{0});
-  }
+  captureDr();
+  register_.shift(stream);
+  updateDr();
 }
 
 void Tap::clock() {
   for (const std::unique_ptr<Hub>& hub : hubs_)
     if (hub) hub->clock();
+}
+
+bool Tap::userSelected() const {
+  return instruction_ >= userOpcode(1) && instruction_ <= userOpcode(userChainCount);
+}
+
+Hub* Tap::selectedHub() const {
+  return userSelected() ? hubs_[instruction_ - userOpcode(1)].get() : nullptr;
 }
 
 }  // namespace qorsim

@@ -1,4 +1,4 @@
-// The TAP of one device on the chain, at the level of whole IR and DR scans.
+// The registers of one device on the chain: captured, shifted bit by bit or as a whole scan, and updated.
 #pragma once
 
 #include <array>
@@ -6,6 +6,7 @@
 #include <memory>
 
 #include "Hub.h"
+#include "ShiftRegister.h"
 
 namespace qorsim {
 
@@ -25,6 +26,20 @@ class Tap {
   /// The hub behind a user chain, which appears when it is first asked for.
   Hub& hub(unsigned userChain);
 
+  /// Test-Logic-Reset: the instruction of a new TAP.
+  void reset();
+
+  /// Capture, and update after it. In between, each shift is a TCK that moves the register on by one bit, out()
+  /// the one that then stands at TDO.
+  /// @{
+  void captureIr();
+  void captureDr();
+  bool out() const { return register_.out(); }
+  void shift(bool in) { register_.shift(in); }
+  void updateIr();
+  void updateDr();
+  /// @}
+
   /// Whole scans from capture to update: replace what TDI brings by what goes out of TDO, as many bits.
   void scanIr(Bits& stream);
   void scanDr(Bits& stream);
@@ -33,10 +48,14 @@ class Tap {
   void clock();
 
  private:
+  bool userSelected() const;
+  Hub* selectedHub() const;
+
   std::uint32_t idcode_;
   unsigned irLength_;
-  std::uint32_t instruction_;
+  std::uint32_t instruction_ = 0;
   std::array<std::unique_ptr<Hub>, userChainCount> hubs_;
+  ShiftRegister register_ = ShiftRegister::passing({0});
 };
 
 }  // namespace qorsim
