@@ -7,7 +7,7 @@
 
 namespace qorsim {
 
-/// Every scan begins and ends in Run-Test/Idle. The design clock stands still during scans and ticks once for
+/// Every whole scan begins and ends in Run-Test/Idle. The design clock stands still during scans and ticks once for
 /// every `tcksPerClock` TCKs of idle(), so that the same steps always give the same bits; with 0 it stands
 /// still altogether.
 class Chain {
@@ -16,6 +16,19 @@ class Chain {
 
   /// Adds a device at the TDI end: the first one is device 0, nearest to TDO.
   void add(Tap tap);
+
+  /// Test-Logic-Reset of every device.
+  void reset();
+
+  /// Every device at once: capture, TCKs that bring a bit from TDI each, update. out() is the bit at TDO.
+  /// @{
+  void captureIr();
+  void captureDr();
+  bool out() const { return taps_.front().out(); }
+  void shift(bool tdi);
+  void updateIr();
+  void updateDr();
+  /// @}
 
   /// Scans of the whole chain: replace what goes into TDI by what comes out of TDO.
   void scanIr(Bits& stream);

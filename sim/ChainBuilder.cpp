@@ -52,17 +52,25 @@ ChainBuilder& ChainBuilder::tcksPerClock(unsigned tcks) {
 }
 
 std::unique_ptr<SimCable> ChainBuilder::cable() const {
-  if (devices_.empty()) throw BoardError("chain", "device", "is missing: a chain has at least one");
   std::vector<QorRT::Qor_Device> heads;
+  for (const Device& device : devices_) heads.push_back(device.head);
+  return std::make_unique<SimCable>(std::move(heads), powerUp());
+}
+
+std::unique_ptr<SimPins> ChainBuilder::pins() const {
+  return std::make_unique<SimPins>(powerUp());
+}
+
+std::unique_ptr<Chain> ChainBuilder::powerUp() const {
+  if (devices_.empty()) throw BoardError("chain", "device", "is missing: a chain has at least one");
   auto chain = std::make_unique<Chain>(tcksPerClock_);
   for (const Device& device : devices_) {
     Tap tap(device.head.idcode, device.head.irLength);
     for (const PlacedCore& core : device.cores)
       tap.hub(core.userChain).add(core.index, makeCore(core.description));
     chain->add(std::move(tap));
-    heads.push_back(device.head);
   }
-  return std::make_unique<SimCable>(std::move(heads), std::move(chain));
+  return chain;
 }
 
 ChainBuilder::Device& ChainBuilder::lastDevice(const char* what) {

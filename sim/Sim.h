@@ -25,6 +25,7 @@
 #include "SimCable.h"
 #include "SimCoreDescription.h"
 #include "SimDesign.h"
+#include "SimPins.h"
 
 namespace qorsim {
 
@@ -93,6 +94,9 @@ class QOR_API ChainBuilder {
   /// The cable to the board, powered up.
   std::unique_ptr<SimCable> cable() const;
 
+  /// The board's four wires, powered up and in Test-Logic-Reset.
+  std::unique_ptr<SimPins> pins() const;
+
  private:
   struct PlacedCore {
     unsigned userChain = 0;
@@ -104,6 +108,7 @@ class QOR_API ChainBuilder {
     std::vector<PlacedCore> cores;
   };
 
+  std::unique_ptr<Chain> powerUp() const;
   Device& lastDevice(const char* what);
   std::string nameOfLast() const;
   void requireFree(const std::string& part, unsigned userChain, unsigned index) const;

@@ -1,0 +1,7 @@
+#include "Pins.h"
+
+namespace qorsim {
+
+Pins::~Pins() = default;
+
+}  // namespace qorsim
