@@ -9,8 +9,9 @@ namespace {
 enum ExitStatus { done = 0, deviceFailed = 1, wrongUse = 2 };
 
 constexpr tool::AddCommand commands[] = {
-    tool::addScan, tool::addInfo,  tool::addSignals, tool::addRead, tool::addWrite,  tool::addGestures,
-    tool::addPort, tool::addWatch, tool::addRecord,  tool::addPlay, tool::addDoctor, tool::addBench,
+    tool::addScan,     tool::addInfo,  tool::addSignals,  tool::addRead,   tool::addWrite,
+    tool::addGestures, tool::addPort,  tool::addWatch,    tool::addRecord, tool::addPlay,
+    tool::addDoctor,   tool::addBench, tool::addSimulate,
 };
 
 int complain(const char* what, ExitStatus status) {

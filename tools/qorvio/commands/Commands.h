@@ -21,5 +21,6 @@ void addRecord(CLI::App& app, Context& context);
 void addPlay(CLI::App& app, Context& context);
 void addDoctor(CLI::App& app, Context& context);
 void addBench(CLI::App& app, Context& context);
+void addSimulate(CLI::App& app, Context& context);
 
 }  // namespace tool

@@ -1,0 +1,64 @@
+// A simulated board that outlives its hosts, for every program that speaks remote_bitbang.
+#include <cstdio>
+
+#include <nlohmann/json.hpp>
+
+#include "BitbangServer.h"
+#include "Commands.h"
+#include "Errors.h"
+#include "Sim.h"
+#include "Stop.h"
+
+namespace tool {
+namespace {
+
+constexpr const char* host = "127.0.0.1";
+
+struct SimulateOptions {
+  std::string board;
+  std::uint16_t port = 0;
+};
+
+std::unique_ptr<qorsim::Pins> powerUp(const std::string& board) {
+  try {
+    return (board.empty() ? qorsim::demoBoard() : qorsim::boardFile(board)).pins();
+  } catch (const std::runtime_error& error) {
+    throw WrongUse(error.what());
+  }
+}
+
+void printPlace(const std::string& board, unsigned port, bool json) {
+  if (json) {
+    const nlohmann::ordered_json place{
+        {"host", host}, {"port", port}, {"board", board.empty() ? "demo" : board}};
+    std::printf("%s\n", place.dump().c_str());
+  } else {
+    std::printf("serving %s on %s:%u; cable rbb:%s:%u; Ctrl-C ends it\n",
+                board.empty() ? "the demo board" : board.c_str(), host, port, host, port);
+  }
+  std::fflush(stdout);
+}
+
+void simulate(const Settings& settings, const SimulateOptions& options) {
+  const std::unique_ptr<qorsim::Pins> pins = powerUp(options.board);
+  qorsim::BitbangServer server(*pins, options.port);
+  const Stop stop;
+  printPlace(options.board, server.port(), settings.json);
+  server.serve([&stop] { return stop.asked(); },
+               [](const std::string& reason) { std::fprintf(stderr, "qorvio: %s\n", reason.c_str()); });
+}
+
+}  // namespace
+
+void addSimulate(CLI::App& app, Context& context) {
+  auto options = std::make_shared<SimulateOptions>();
+  CLI::App* command = app.add_subcommand("simulate", "a simulated board, kept alive for other programs");
+  command->add_option("BOARD", options->board, "a file that describes it; the demo board without one");
+  command->add_option("--port", options->port, "where it listens on this machine; any free port without it");
+  command->footer(
+      "It speaks remote_bitbang to one client after another, and stays as each leaves it.\n\n"
+      "Example:\n  qorvio simulate --port 9824");
+  command->callback([&context, options] { simulate(context.settings, *options); });
+}
+
+}  // namespace tool
