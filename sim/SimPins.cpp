@@ -3,7 +3,7 @@
 #include <utility>
 
 #include "Chain.h"
-#include "TapState.h"
+#include "TapStates.h"
 
 namespace qorsim {
 

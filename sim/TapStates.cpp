@@ -1,4 +1,4 @@
-#include "TapState.h"
+#include "TapStates.h"
 
 #include <array>
 #include <cstddef>
