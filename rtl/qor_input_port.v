@@ -1,0 +1,119 @@
+// One input port of a VIO core: samples its pins, collects activity on them, and keeps what is delivered.
+//
+// A take at clock edge n delivers the values that the pins had after edge n - 3, and all activity up to then. This
+// holds for both kinds of port, so that a snapshot shows one moment.
+`default_nettype none
+
+module qor_input_port #(
+    parameter WIDTH = 1,        // at least 1
+    parameter SYNCHRONOUS = 0,  // the pins change on clk
+    parameter EDGE_CAPTURE = 0  // see pulses shorter than a clock: two flip-flops an input that the pin clocks
+) (
+    input  wire             clk,
+    input  wire             sync_settled,
+    input  wire             async_settled,
+    input  wire             take,
+    input  wire             merge,
+    input  wire [WIDTH-1:0] pins,
+    output reg  [WIDTH-1:0] value,
+    output wire [WIDTH-1:0] up,
+    output wire [WIDTH-1:0] down,
+    output wire [WIDTH-1:0] clocked_up,   // of a synchronous port only
+    output wire [WIDTH-1:0] clocked_down
+);
+
+  reg  [WIDTH-1:0] now = 0, before = 0;
+  wire [WIDTH-1:0] kept = {WIDTH{merge}};
+  wire [WIDTH-1:0] rise = now & ~before, fall = ~now & before;
+
+  initial value = 0;
+  always @(posedge clk) before <= now;
+
+  generate
+    if (SYNCHRONOUS != 0) begin : direct
+      always @(posedge clk) now <= pins;
+      always @(posedge clk) if (take) value <= before;
+    end else begin : synchronised
+      // Crossing to clk: two flip-flops, of which only the second is used. Bits of a port may arrive a clock apart.
+      reg [WIDTH-1:0] first = 0;
+      always @(posedge clk) {now, first} <= {first, pins};
+      always @(posedge clk) if (take) value <= now;
+    end
+
+    // Activity as the design clock samples it. A change in the clock of a take is not lost: it is either delivered
+    // in that clock or begins the next collection.
+    if (SYNCHRONOUS != 0 || EDGE_CAPTURE == 0) begin : clocked
+      reg [WIDTH-1:0] live_up = 0, live_down = 0, told_up = 0, told_down = 0;
+      if (SYNCHRONOUS != 0) begin : one_clock_late
+        always @(posedge clk)
+          if (!sync_settled) begin
+            live_up <= 0;
+            live_down <= 0;
+          end else begin
+            live_up <= rise | live_up & {WIDTH{~take}};
+            live_down <= fall | live_down & {WIDTH{~take}};
+          end
+        always @(posedge clk)
+          if (take) begin
+            told_up <= live_up | told_up & kept;
+            told_down <= live_down | told_down & kept;
+          end
+      end else begin : at_once
+        always @(posedge clk)
+          if (!async_settled | take) begin
+            live_up <= 0;
+            live_down <= 0;
+          end else begin
+            live_up <= live_up | rise;
+            live_down <= live_down | fall;
+          end
+        always @(posedge clk)
+          if (take) begin
+            told_up <= live_up | rise | told_up & kept;
+            told_down <= live_down | fall | told_down & kept;
+          end
+      end
+      assign clocked_up = told_up;
+      assign clocked_down = told_down;
+    end else begin : not_clocked
+      assign clocked_up = 0;
+      assign clocked_down = 0;
+    end
+
+    if (EDGE_CAPTURE != 0) begin : edges
+      // Each flip-flop that a pin clocks takes the opposite of the state that clk has seen: the first edge after a
+      // take steps it, and others change nothing. Crossing to clk: two flip-flops. Crossing to the pin's clock:
+      // `seen` changes at a take only. An edge at that very moment may step the flip-flop or not; if not, it came
+      // before the take, whose flag tells it. So there is nothing to clear, and no edge is lost.
+      reg  [WIDTH-1:0] rose = 0, rose_first = 0, rose_now = 0, rose_seen = 0, told_up = 0;
+      reg  [WIDTH-1:0] fell = 0, fell_first = 0, fell_now = 0, fell_seen = 0, told_down = 0;
+      genvar           i;
+      for (i = 0; i < WIDTH; i = i + 1) begin : pin
+        always @(posedge pins[i]) rose[i] <= ~rose_seen[i];
+        always @(negedge pins[i]) fell[i] <= ~fell_seen[i];
+      end
+      always @(posedge clk) begin
+        {rose_now, rose_first} <= {rose_first, rose};
+        {fell_now, fell_first} <= {fell_first, fell};
+        if (take | ~async_settled) begin
+          rose_seen <= rose_now;
+          fell_seen <= fell_now;
+        end
+        if (take) begin
+          told_up <= rose_now ^ rose_seen | told_up & kept;
+          told_down <= fell_now ^ fell_seen | told_down & kept;
+        end
+      end
+      assign up = told_up;
+      assign down = told_down;
+    end else begin : no_edges
+      assign up = clocked_up;
+      assign down = clocked_down;
+    end
+  endgenerate
+
+  wire unused = &{1'b0, sync_settled, async_settled, rise, fall, kept};
+
+endmodule
+
+`default_nettype wire

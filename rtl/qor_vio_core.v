@@ -1,0 +1,133 @@
+// A VIO core: virtual inputs and outputs of a design, behind a hub.
+//
+// Codes 02 (write), 03 and 05 (snapshot) and 04 (acknowledge), beside those that every core knows. All registers
+// are 0 at power-up; there is no reset, and a reset of the TAP leaves the outputs as they are.
+`default_nettype none
+
+module qor_vio_core #(
+    parameter INDEX = 0,         // on its user chain, 0 to 15; no two cores of a hub have the same
+    parameter ASYNC_IN = 0,      // port widths, 0 to 65535 (255 before version 6.2); of a port of width 0 there
+    parameter SYNC_IN = 0,       // is one bit here, which means nothing
+    parameter ASYNC_OUT = 0,
+    parameter SYNC_OUT = 0,
+    parameter EDGE_CAPTURE = 0,  // see pulses on inputs that are shorter than a clock
+
+    parameter MANUFACTURER = 8'h51,  // the rest of the status word
+    parameter TYPE = 9,
+    parameter MAJOR = 10,
+    parameter MINOR = 0,
+    parameter REVISION = 0,
+    parameter CG_MAJOR = 1,
+    parameter CG_MINOR = 0,
+    parameter CG_MINOR_ALPHA = 0
+) (
+    input  wire        tck,
+    input  wire [46:0] to_core,
+    output wire [6:0]  from_core,
+
+    input  wire                                         clk,        // design clock
+    input  wire [ASYNC_IN == 0 ? 0 : ASYNC_IN-1 : 0]   async_in,
+    input  wire [SYNC_IN == 0 ? 0 : SYNC_IN-1 : 0]     sync_in,    // synchronous to clk
+    output wire [ASYNC_OUT == 0 ? 0 : ASYNC_OUT-1 : 0] async_out,  // changes on TCK
+    output wire [SYNC_OUT == 0 ? 0 : SYNC_OUT-1 : 0]   sync_out    // synchronous to clk
+);
+
+  localparam [3:0]  CODE_WRITE = 4'h2, CODE_READ = 4'h3, CODE_ACKNOWLEDGE = 4'h4, CODE_READ_AGAIN = 4'h5;
+  localparam        PAYLOAD_BITS = 2 * ASYNC_OUT + 17 * SYNC_OUT;
+  localparam        ASYNC_RECORD = 4, SYNC_RECORD = 6;  // bits an input
+  localparam        RECORD_BITS = ASYNC_RECORD * ASYNC_IN + SYNC_RECORD * SYNC_IN;
+
+  // Where the widths stand in the status word depends on the version.
+  localparam        VERSION = MAJOR * 16 + MINOR;
+  localparam [39:0] HEAD = {REVISION[7:0], MINOR[7:0], MAJOR[7:0], TYPE[7:0], MANUFACTURER[7:0]};
+  localparam [31:0] NARROW = {SYNC_OUT[7:0], ASYNC_OUT[7:0], SYNC_IN[7:0], ASYNC_IN[7:0]};
+  localparam [63:0] WIDE = {SYNC_OUT[15:0], ASYNC_OUT[15:0], SYNC_IN[15:0], ASYNC_IN[15:0]};
+  localparam [19:0] CG = {CG_MINOR_ALPHA[7:0], CG_MINOR[7:0], CG_MAJOR[3:0]};
+  localparam [127:0] STATUS_WORD = VERSION < 8'h62 ? {56'b0, NARROW, HEAD} :
+                                   VERSION < 8'hA0 ? {24'b0, WIDE, HEAD} : {4'b0, WIDE, CG, HEAD};
+
+  wire        capturing, shifting, payload_bit, obey, result_seen;
+  wire [20:0] frame_length;
+  wire [3:0]  code;
+
+  wire is_write = code == CODE_WRITE;
+  wire is_read = code == CODE_READ | code == CODE_READ_AGAIN;
+  wire is_acknowledge = code == CODE_ACKNOWLEDGE;
+  wire write_blocked, write_pending, snapshot_pending;
+  wire rejects = is_write & frame_length != PAYLOAD_BITS[20:0];
+  wire refuses = is_write & ~rejects & write_blocked | is_acknowledge & ~result_seen;
+  wire does = obey & ~rejects & ~refuses;
+
+  wire [RECORD_BITS == 0 ? 0 : RECORD_BITS-1 : 0] records;
+
+  qor_core_link #(
+      .INDEX(INDEX), .STATUS_WORD(STATUS_WORD), .RECORD_BITS(RECORD_BITS)
+  ) link (
+      .tck(tck), .to_core(to_core), .from_core(from_core),
+      .capturing(capturing), .shifting(shifting), .payload_bit(payload_bit),
+      .frame_length(frame_length), .frame_code(code), .obey(obey), .result_seen(result_seen),
+      .knows_code(is_write | is_read | is_acknowledge), .rejects(rejects), .refuses(refuses),
+      .pending(write_pending | snapshot_pending), .records(records)
+  );
+
+  qor_outputs #(
+      .ASYNC(ASYNC_OUT), .SYNC(SYNC_OUT)
+  ) outputs (
+      .tck(tck), .capturing(capturing), .shifting(shifting), .payload_bit(payload_bit),
+      .write(does & is_write), .blocked(write_blocked), .pending(write_pending),
+      .clk(clk), .async_out(async_out), .sync_out(sync_out)
+  );
+
+  wire take, merge, sync_settled, async_settled;
+
+  qor_snapshot snapshot (
+      .tck(tck), .request(does & is_read), .always_merge(code == CODE_READ_AGAIN),
+      .acknowledge(does & is_acknowledge), .pending(snapshot_pending),
+      .clk(clk), .take(take), .merge(merge), .sync_settled(sync_settled), .async_settled(async_settled)
+  );
+
+  // The record of input 0 is the last to be delivered: digit k of the records is bit RECORD_BITS-1-k.
+  generate
+    genvar i;
+    if (RECORD_BITS == 0) begin : without_records
+      wire unused = &{1'b0, take, merge, sync_settled, async_settled};
+      assign records = 1'b0;
+    end
+
+    if (ASYNC_IN == 0) begin : without_async_in
+      wire unused = async_in;
+    end else begin : async_port
+      wire [ASYNC_IN-1:0] value, up, down, unused_up, unused_down;
+      qor_input_port #(
+          .WIDTH(ASYNC_IN), .SYNCHRONOUS(0), .EDGE_CAPTURE(EDGE_CAPTURE)
+      ) port (
+          .clk(clk), .sync_settled(sync_settled), .async_settled(async_settled), .take(take), .merge(merge),
+          .pins(async_in), .value(value), .up(up), .down(down),
+          .clocked_up(unused_up), .clocked_down(unused_down)
+      );
+      for (i = 0; i < ASYNC_IN; i = i + 1) begin : input_bit
+        assign records[RECORD_BITS-1-ASYNC_RECORD*i-:ASYNC_RECORD] = {value[i], up[i], down[i], 1'b0};
+      end
+    end
+
+    if (SYNC_IN == 0) begin : without_sync_in
+      wire unused = sync_in;
+    end else begin : sync_port
+      wire [SYNC_IN-1:0] value, up, down, clocked_up, clocked_down;
+      qor_input_port #(
+          .WIDTH(SYNC_IN), .SYNCHRONOUS(1), .EDGE_CAPTURE(EDGE_CAPTURE)
+      ) port (
+          .clk(clk), .sync_settled(sync_settled), .async_settled(async_settled), .take(take), .merge(merge),
+          .pins(sync_in), .value(value), .up(up), .down(down),
+          .clocked_up(clocked_up), .clocked_down(clocked_down)
+      );
+      for (i = 0; i < SYNC_IN; i = i + 1) begin : input_bit
+        assign records[SYNC_RECORD*(SYNC_IN-i)-1-:SYNC_RECORD] =
+            {value[i], up[i], down[i], clocked_up[i], clocked_down[i], 1'b0};
+      end
+    end
+  endgenerate
+
+endmodule
+
+`default_nettype wire
