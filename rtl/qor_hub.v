@@ -120,8 +120,10 @@ module qor_hub #(
 
   initial tdo = 1'b0;
 
-  wire [21:0] frame_length = {{22 - LENGTH_BITS{1'b0}}, length[LENGTH_BITS-1:0]};
-  assign to_cores = {capturing, shifting, tail[0], obey, frame_core, frame_code, frame_length[20:0],
+  wire [20:0] frame_length;
+  wire        unused_bit;
+  assign {unused_bit, frame_length} = {{22 - LENGTH_BITS{1'b0}}, length[LENGTH_BITS-1:0]};
+  assign to_cores = {capturing, shifting, tail[0], obey, frame_core, frame_code, frame_length,
                      last_core, last_code, pending, behind_head, place[3:0]};
 
 endmodule

@@ -22,17 +22,17 @@ module qor_input_port #(
     output wire [WIDTH-1:0] clocked_down
 );
 
-  reg  [WIDTH-1:0] now = 0, before = 0;
+  reg  [WIDTH-1:0] now = 0, earlier = 0;
   wire [WIDTH-1:0] kept = {WIDTH{merge}};
-  wire [WIDTH-1:0] rise = now & ~before, fall = ~now & before;
+  wire [WIDTH-1:0] rise = now & ~earlier, fall = ~now & earlier;
 
   initial value = 0;
-  always @(posedge clk) before <= now;
+  always @(posedge clk) earlier <= now;
 
   generate
     if (SYNCHRONOUS != 0) begin : direct
       always @(posedge clk) now <= pins;
-      always @(posedge clk) if (take) value <= before;
+      always @(posedge clk) if (take) value <= earlier;
     end else begin : synchronised
       // Crossing to clk: two flip-flops, of which only the second is used. Bits of a port may arrive a clock apart.
       reg [WIDTH-1:0] first = 0;
@@ -85,12 +85,16 @@ module qor_input_port #(
       // take steps it, and others change nothing. Crossing to clk: two flip-flops. Crossing to the pin's clock:
       // `seen` changes at a take only. An edge at that very moment may step the flip-flop or not; if not, it came
       // before the take, whose flag tells it. So there is nothing to clear, and no edge is lost.
-      reg  [WIDTH-1:0] rose = 0, rose_first = 0, rose_now = 0, rose_seen = 0, told_up = 0;
-      reg  [WIDTH-1:0] fell = 0, fell_first = 0, fell_now = 0, fell_seen = 0, told_down = 0;
+      wire [WIDTH-1:0] rose, fell;
+      reg  [WIDTH-1:0] rose_first = 0, rose_now = 0, rose_seen = 0, told_up = 0;
+      reg  [WIDTH-1:0] fell_first = 0, fell_now = 0, fell_seen = 0, told_down = 0;
       genvar           i;
       for (i = 0; i < WIDTH; i = i + 1) begin : pin
-        always @(posedge pins[i]) rose[i] <= ~rose_seen[i];
-        always @(negedge pins[i]) fell[i] <= ~fell_seen[i];
+        reg rise_step = 1'b0, fall_step = 1'b0;
+        always @(posedge pins[i]) rise_step <= ~rose_seen[i];
+        always @(negedge pins[i]) fall_step <= ~fell_seen[i];
+        assign rose[i] = rise_step;
+        assign fell[i] = fall_step;
       end
       always @(posedge clk) begin
         {rose_now, rose_first} <= {rose_first, rose};

@@ -29,7 +29,7 @@ module qor_outputs #(
 
   generate
     if (BITS == 0) begin : without_payload
-      wire unused = &{1'b0, shifting, payload_bit};
+      wire unused = &{1'b0, tck, shifting, payload_bit};
     end else begin : payload
       // Crossing to clk: trains and their mask are taken from here by the design clock. They stand still from the
       // request to its answer, since a scan that begins in between is blocked from shifting.
