@@ -18,13 +18,17 @@ module qor_input_port #(
     output reg  [WIDTH-1:0] value,
     output wire [WIDTH-1:0] up,
     output wire [WIDTH-1:0] down,
-    output wire [WIDTH-1:0] clocked_up,   // of a synchronous port only
+    output wire [WIDTH-1:0] clocked_up,   // as clk samples it
     output wire [WIDTH-1:0] clocked_down
 );
 
   reg  [WIDTH-1:0] now = 0, earlier = 0;
   wire [WIDTH-1:0] kept = {WIDTH{merge}};
   wire [WIDTH-1:0] rise = now & ~earlier, fall = ~now & earlier;
+
+  reg [WIDTH-1:0] live_up = 0, live_down = 0, told_up = 0, told_down = 0;
+  assign clocked_up = told_up;
+  assign clocked_down = told_down;
 
   initial value = 0;
   always @(posedge clk) earlier <= now;
@@ -42,52 +46,45 @@ module qor_input_port #(
 
     // Activity as the design clock samples it. A change in the clock of a take is not lost: it is either delivered
     // in that clock or begins the next collection.
-    if (SYNCHRONOUS != 0 || EDGE_CAPTURE == 0) begin : clocked
-      reg [WIDTH-1:0] live_up = 0, live_down = 0, told_up = 0, told_down = 0;
-      if (SYNCHRONOUS != 0) begin : one_clock_late
-        always @(posedge clk)
-          if (!sync_settled) begin
-            live_up <= 0;
-            live_down <= 0;
-          end else begin
-            live_up <= rise | live_up & {WIDTH{~take}};
-            live_down <= fall | live_down & {WIDTH{~take}};
-          end
-        always @(posedge clk)
-          if (take) begin
-            told_up <= live_up | told_up & kept;
-            told_down <= live_down | told_down & kept;
-          end
-      end else begin : at_once
-        always @(posedge clk)
-          if (!async_settled | take) begin
-            live_up <= 0;
-            live_down <= 0;
-          end else begin
-            live_up <= live_up | rise;
-            live_down <= live_down | fall;
-          end
-        always @(posedge clk)
-          if (take) begin
-            told_up <= live_up | rise | told_up & kept;
-            told_down <= live_down | fall | told_down & kept;
-          end
-      end
-      assign clocked_up = told_up;
-      assign clocked_down = told_down;
-    end else begin : not_clocked
-      assign clocked_up = 0;
-      assign clocked_down = 0;
+    if (SYNCHRONOUS != 0) begin : one_clock_late
+      always @(posedge clk)
+        if (!sync_settled) begin
+          live_up <= 0;
+          live_down <= 0;
+        end else begin
+          live_up <= rise | live_up & {WIDTH{~take}};
+          live_down <= fall | live_down & {WIDTH{~take}};
+        end
+      always @(posedge clk)
+        if (take) begin
+          told_up <= live_up | told_up & kept;
+          told_down <= live_down | told_down & kept;
+        end
+    end else begin : at_once
+      always @(posedge clk)
+        if (!async_settled | take) begin
+          live_up <= 0;
+          live_down <= 0;
+        end else begin
+          live_up <= live_up | rise;
+          live_down <= live_down | fall;
+        end
+      always @(posedge clk)
+        if (take) begin
+          told_up <= live_up | rise | told_up & kept;
+          told_down <= live_down | fall | told_down & kept;
+        end
     end
 
     if (EDGE_CAPTURE != 0) begin : edges
       // Each flip-flop that a pin clocks takes the opposite of the state that clk has seen: the first edge after a
       // take steps it, and others change nothing. Crossing to clk: two flip-flops. Crossing to the pin's clock:
       // `seen` changes at a take only. An edge at that very moment may step the flip-flop or not; if not, it came
-      // before the take, whose flag tells it. So there is nothing to clear, and no edge is lost.
+      // before the take, whose flag tells it. So there is nothing to clear. An edge on its way to clk during a take
+      // that tells an earlier one changes nothing either; if it lasts, the sampled activity tells it next time.
       wire [WIDTH-1:0] rose, fell;
-      reg  [WIDTH-1:0] rose_first = 0, rose_now = 0, rose_seen = 0, told_up = 0;
-      reg  [WIDTH-1:0] fell_first = 0, fell_now = 0, fell_seen = 0, told_down = 0;
+      reg  [WIDTH-1:0] rose_first = 0, rose_now = 0, rose_seen = 0, told_rise = 0;
+      reg  [WIDTH-1:0] fell_first = 0, fell_now = 0, fell_seen = 0, told_fall = 0;
       genvar           i;
       for (i = 0; i < WIDTH; i = i + 1) begin : pin
         reg rise_step = 1'b0, fall_step = 1'b0;
@@ -104,19 +101,19 @@ module qor_input_port #(
           fell_seen <= fell_now;
         end
         if (take) begin
-          told_up <= rose_now ^ rose_seen | told_up & kept;
-          told_down <= fell_now ^ fell_seen | told_down & kept;
+          told_rise <= rose_now ^ rose_seen | told_rise & kept;
+          told_fall <= fell_now ^ fell_seen | told_fall & kept;
         end
       end
+      assign up = told_up | told_rise;
+      assign down = told_down | told_fall;
+    end else begin : no_edges
       assign up = told_up;
       assign down = told_down;
-    end else begin : no_edges
-      assign up = clocked_up;
-      assign down = clocked_down;
     end
   endgenerate
 
-  wire unused = &{1'b0, sync_settled, async_settled, rise, fall, kept};
+  wire unused = &{1'b0, sync_settled, async_settled};
 
 endmodule
 
