@@ -26,13 +26,9 @@ module qor_bench_top #(
     output wire [SYNC_OUT == 0 ? 0 : SYNC_OUT-1 : 0]   sync_out
 );
 
-  localparam PAYLOAD_BITS = 2 * ASYNC_OUT + 17 * SYNC_OUT;
-
-  wire [3:0]  user_sel;
-  wire        capture, shift, update, hub_tdo;
-  wire        unused = &{1'b0, user_sel[3:1]};
-  wire [46:0] to_core;
-  wire [6:0]  from_core;
+  wire [3:0] user_sel;
+  wire       capture, shift, update, hub_tdo;
+  wire       unused = &{1'b0, user_sel[3:1]};
 
   qor_sim_tap #(
       .IDCODE(32'h0A5F1093), .IR_LENGTH(6)
@@ -41,19 +37,12 @@ module qor_bench_top #(
       .update(update), .user_tdo({3'b000, hub_tdo}), .run_test_idle(run_test_idle)
   );
 
-  qor_hub #(
-      .LENGTH_BITS(PAYLOAD_BITS < 65536 ? 16 : 21)
-  ) hub (
-      .tck(tck), .sel(user_sel[0]), .capture(capture), .shift(shift), .update(update), .tdi(tdi), .tdo(hub_tdo),
-      .to_cores(to_core), .from_cores(from_core)
-  );
-
-  qor_vio_core #(
-      .INDEX(0), .ASYNC_IN(ASYNC_IN), .SYNC_IN(SYNC_IN), .ASYNC_OUT(ASYNC_OUT), .SYNC_OUT(SYNC_OUT),
+  qor_vio #(
+      .ASYNC_IN(ASYNC_IN), .SYNC_IN(SYNC_IN), .ASYNC_OUT(ASYNC_OUT), .SYNC_OUT(SYNC_OUT),
       .EDGE_CAPTURE(EDGE_CAPTURE), .MAJOR(MAJOR), .MINOR(MINOR)
-  ) core (
-      .tck(tck), .to_core(to_core), .from_core(from_core), .clk(clk),
-      .async_in(async_in), .sync_in(sync_in), .async_out(async_out), .sync_out(sync_out)
+  ) vio (
+      .tck(tck), .sel(user_sel[0]), .capture(capture), .shift(shift), .update(update), .tdi(tdi), .tdo(hub_tdo),
+      .clk(clk), .async_in(async_in), .sync_in(sync_in), .async_out(async_out), .sync_out(sync_out)
   );
 
 endmodule

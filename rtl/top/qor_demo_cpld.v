@@ -10,12 +10,10 @@ module qor_demo_cpld (
     output wire run_test_idle
 );
 
-  wire [3:0]  user_sel;
-  wire        capture, shift, update, hub_tdo;
-  wire [46:0] to_core;
-  wire [6:0]  from_core;
-  wire [3:0]  async_out, sync_out;
-  wire        unused = &{1'b0, user_sel[3:1], async_out, sync_out};
+  wire [3:0] user_sel;
+  wire       capture, shift, update, hub_tdo;
+  wire [3:0] async_out, sync_out;
+  wire       unused = &{1'b0, user_sel[3:1], async_out, sync_out};
 
   // The simulated core has no synchronisers: what happens in its design clock happens here two clocks later. A count
   // that is two clocks late reads the same.
@@ -33,16 +31,11 @@ module qor_demo_cpld (
       .update(update), .user_tdo({3'b000, hub_tdo}), .run_test_idle(run_test_idle)
   );
 
-  qor_hub hub (
+  qor_vio #(
+      .MAJOR(6), .MINOR(1), .ASYNC_IN(16), .SYNC_IN(16), .ASYNC_OUT(4), .SYNC_OUT(4)
+  ) vio (
       .tck(tck), .sel(user_sel[0]), .capture(capture), .shift(shift), .update(update), .tdi(tdi), .tdo(hub_tdo),
-      .to_cores(to_core), .from_cores(from_core)
-  );
-
-  qor_vio_core #(
-      .INDEX(0), .MAJOR(6), .MINOR(1), .ASYNC_IN(16), .SYNC_IN(16), .ASYNC_OUT(4), .SYNC_OUT(4)
-  ) core (
-      .tck(tck), .to_core(to_core), .from_core(from_core), .clk(clk),
-      .async_in(later), .sync_in(later), .async_out(async_out), .sync_out(sync_out)
+      .clk(clk), .async_in(later), .sync_in(later), .async_out(async_out), .sync_out(sync_out)
   );
 
 endmodule
