@@ -6,11 +6,12 @@
 #include <deque>
 
 #include "Chain.h"
+#include "PinsChain.h"
 #include "RandomScans.h"
-#include "RtlChain.h"
+#include "RtlPins.h"
 #include "SimDesign.h"
 #include "VioCore.h"
-#include "Vqor_bench_top.h"
+#include MODEL_HEADER
 
 namespace {
 
@@ -41,7 +42,7 @@ void set(Pins& pins, std::uint64_t value) {
 
 class Bench {
  public:
-  Bench() : sim_(1), rtl_(top_, [this] { ticked(); }) {
+  Bench() : pins_([this](MODEL&) { ticked(); }), top_(pins_.model()), sim_(1), rtl_(pins_) {
     CoreDescription core;
     core.asyncIn = ASYNC_IN;
     core.syncIn = SYNC_IN;
@@ -135,9 +136,10 @@ class Bench {
   std::uint64_t asyncOut_ = 0;
   bool outputsAgree_ = true;
   unsigned clocksSinceScan_ = 0;
-  Vqor_bench_top top_;
+  qorrtl::RtlPins<MODEL> pins_;
+  MODEL& top_;
   Chain sim_;
-  qorrtl::RtlChain<Vqor_bench_top> rtl_;
+  qorrtl::PinsChain rtl_;
 };
 
 }  // namespace
@@ -150,7 +152,7 @@ int main(int argc, char** argv) {
       std::printf("scan %lu, or an output behind it, differs\n", i);
       return 1;
     }
-  std::printf("core %d/%d/%d/%d, version %d.%d%s: %lu scans, all the same\n", ASYNC_IN, SYNC_IN, ASYNC_OUT, SYNC_OUT,
-              MAJOR, MINOR, EDGE_CAPTURE ? ", edge capture" : "", scans);
+  std::printf("core %d/%d/%d/%d, version %d.%d%s: %lu scans, all the same\n", ASYNC_IN, SYNC_IN, ASYNC_OUT,
+              SYNC_OUT, MAJOR, MINOR, EDGE_CAPTURE ? ", edge capture" : "", scans);
   return 0;
 }

@@ -3,8 +3,9 @@
 #include <cstdlib>
 
 #include "Chain.h"
+#include "PinsChain.h"
 #include "RandomScans.h"
-#include "RtlChain.h"
+#include "RtlPins.h"
 #include "SimDesign.h"
 #include "StatusWord.h"
 #include "VioCore.h"
@@ -50,8 +51,8 @@ int main(int argc, char** argv) {
   constexpr unsigned payloadBits[] = {2 * 8 + 17 * 8, 2 * 4 + 17 * 4};
   Chain sim(1);
   build(sim);
-  Vqor_demo_top top;
-  qorrtl::RtlChain<Vqor_demo_top> rtl(top, [] {});
+  qorrtl::RtlPins<Vqor_demo_top> pins;
+  qorrtl::PinsChain rtl(pins);
   qorrtl::RandomScans random(1);
   unsigned device = 0;
   for (unsigned long i = 0; i < scans; ++i) {

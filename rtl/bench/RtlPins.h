@@ -1,0 +1,61 @@
+// The wires of a board that Verilator has made of its Verilog.
+#pragma once
+
+#include <functional>
+#include <utility>
+
+#include "Pins.h"
+
+namespace qorrtl {
+
+/// `Model` has the ports tck, tms, tdi, tdo, clk and run_test_idle. Its design clock ticks once for every TCK that
+/// stays in Run-Test/Idle, as that of the simulated board does.
+template <class Model>
+class RtlPins : public qorsim::Pins {
+ public:
+  /// `afterEdge`, unless it is empty, is called after each rising edge of the design clock, and may change the
+  /// model's other inputs.
+  explicit RtlPins(std::function<void(Model&)> afterEdge = {}) : afterEdge_(std::move(afterEdge)) {
+    write(false, true, true);
+  }
+  ~RtlPins() override { model_.final(); }
+
+  Model& model() { return model_; }
+
+  void write(bool tck, bool tms, bool tdi) override {
+    const bool ticks = tck && model_.tck == 0 && model_.run_test_idle != 0 && !tms;
+    model_.tms = tms;
+    model_.tdi = tdi;
+    model_.tck = tck;
+    model_.eval();
+    if (ticks) tick();
+  }
+
+  bool tdo() override { return model_.tdo != 0; }
+
+  /// The boards have no TRST: five TCKs with TMS high do the same.
+  void setTrst(bool asserted) override {
+    for (int i = 0; asserted && i < 5; ++i) {
+      write(false, true, true);
+      write(true, true, true);
+    }
+    write(false, true, true);
+  }
+
+ private:
+  void tick() {
+    model_.clk = 1;
+    model_.eval();
+    if (afterEdge_) {
+      afterEdge_(model_);
+      model_.eval();
+    }
+    model_.clk = 0;
+    model_.eval();
+  }
+
+  Model model_;
+  std::function<void(Model&)> afterEdge_;
+};
+
+}  // namespace qorrtl
