@@ -8,7 +8,6 @@
 #include <thread>
 
 #include "BitbangServer.h"
-#include "ThrownBy.h"
 
 namespace {
 
@@ -42,7 +41,9 @@ class BitbangServerTest : public testing::Test {
     address.sin_family = AF_INET;
     address.sin_addr.s_addr = htonl(INADDR_LOOPBACK);
     address.sin_port = htons(server.port());
-    const int client = ::socket(AF_INET, SOCK_STREAM, 0);
+    const int client = ::socket(AF_INET, SOCK_STREAM, 0), small = 65536;
+    ::setsockopt(client, SOL_SOCKET, SO_SNDBUF, &small, sizeof small);
+    ::setsockopt(client, SOL_SOCKET, SO_RCVBUF, &small, sizeof small);
     EXPECT_EQ(::connect(client, reinterpret_cast<const sockaddr*>(&address), sizeof address), 0);
     return client;
   }
@@ -78,8 +79,14 @@ TEST_F(BitbangServerTest, ServesOneClientAfterAnotherOnTheSameWires) {
   EXPECT_EQ(talk(second, "RRQ"), "11");
   EXPECT_EQ(talk(connect(), "0R?1"), "0");
   EXPECT_EQ(talk(connect(), "1R\n"), "1");
-  EXPECT_EQ(talk(connect(), "RQ"), "1");
+  const int staying = connect();
+  ASSERT_EQ(::send(staying, "R", 1, 0), 1);
+  char answer = 0;
+  ASSERT_EQ(::recv(staying, &answer, 1, 0), 1);
   end();
+  EXPECT_EQ(answer, '1');
+  EXPECT_EQ(::recv(staying, &answer, 1, 0), 0);
+  ::close(staying);
   EXPECT_EQ(pins.notes, "01234567ttTT01");
   EXPECT_EQ(told,
             "the client sent a character that means nothing: \"?\";"
@@ -88,26 +95,11 @@ TEST_F(BitbangServerTest, ServesOneClientAfterAnotherOnTheSameWires) {
 
 TEST_F(BitbangServerTest, AnswersAClientThatSendsEverythingBeforeItReads) {
   std::string requests, answers;
-  for (int i = 0; i < 3000000; ++i) requests += i % 3 == 0 ? "5RR" : "0RR";
-  for (int i = 0; i < 3000000; ++i) answers += i % 3 == 0 ? "11" : "00";
+  for (int i = 0; i < 2000000; ++i) {
+    requests += i % 3 == 0 ? "5RRRR" : "0RRRR";
+    answers += i % 3 == 0 ? "1111" : "0000";
+  }
   EXPECT_TRUE(talk(connect(), requests + "Q") == answers);
-}
-
-TEST_F(BitbangServerTest, EndsWithAClientThatStays) {
-  const int client = connect();
-  ASSERT_EQ(::send(client, "0R", 2, 0), 2);
-  char answer = 0;
-  ASSERT_EQ(::recv(client, &answer, 1, 0), 1);
-  end();
-  EXPECT_EQ(::recv(client, &answer, 1, 0), 0);
-  EXPECT_EQ(told, "");
-  ::close(client);
-}
-
-TEST_F(BitbangServerTest, NamesAPortThatIsTaken) {
-  const std::string port = std::to_string(server.port());
-  EXPECT_EQ(thrownBy([this] { qorsim::BitbangServer(pins, server.port()); }),
-            "runtime: cannot listen on port " + port + ": Address already in use");
 }
 
 }  // namespace
