@@ -1,6 +1,9 @@
 // The main job, told as a story: what stands on the board, names for bits, values out and in, a pulse train,
 // whole ports, samples, and a mistake. Ends with a nonzero status if any value is not what it should be.
+//
+//     demo [URL]        the demo board behind that cable; the simulated one when it is left out
 #include <cstdio>
+#include <exception>
 #include <string>
 #include <vector>
 
@@ -156,18 +159,35 @@ void makeAMistake(unsigned session) {
   QorJtag_session_setMessageHandler(session, nullptr);
 }
 
-}  // namespace
+// A board behind a server is as the last host left it.
+void startFromZero(unsigned session) {
+  mustSucceed(write(session, {{"async_out_data", "00"}, {"sync_out_data", "00"}}));
+  read(session);
+}
 
-int main() {
-  unsigned session = QorJtag_session_open("sim:");
+void runOn(unsigned session) {
   showChain(session);
   showInformation(session);
   nameSignals(session);
+  startFromZero(session);
   writeAndReadBack(session);
   playPulseTrain(session);
   writeWholePort(session);
   readSamples(session);
   makeAMistake(session);
+}
+
+}  // namespace
+
+int main(int argc, char** argv) {
+  unsigned session = 0;
+  try {
+    session = QorJtag_session_open(argc > 1 ? argv[1] : "sim:");
+  } catch (const std::exception& error) {
+    std::fprintf(stderr, "demo: %s\n", error.what());
+    return 1;
+  }
+  runOn(session);
   QorJtag_session_close(session);
   std::printf("\n%s\n",
               surprises == 0 ? "Every value was what it should be." : "SOMETHING WAS NOT WHAT IT SHOULD BE.");

@@ -1,10 +1,8 @@
 #include "OpenOcdServer.h"
 
 #include <fcntl.h>
-#include <netinet/in.h>
 #include <signal.h>
 #include <spawn.h>
-#include <sys/socket.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
@@ -24,22 +22,6 @@ constexpr milliseconds glance{20}, farewell{2000};
 
 [[noreturn]] void fail(const std::string& what, int error) {
   throw std::runtime_error(what + ": " + std::generic_category().message(error));
-}
-
-// A port that is free now. Someone else may take it before the server does, which then says so.
-std::string freePort() {
-  const int probe = socket(AF_INET, SOCK_STREAM | SOCK_CLOEXEC, 0);
-  if (probe < 0) fail("no socket", errno);
-  sockaddr_in address{};
-  address.sin_family = AF_INET;
-  address.sin_addr.s_addr = htonl(INADDR_LOOPBACK);
-  socklen_t length = sizeof address;
-  auto* const plain = reinterpret_cast<sockaddr*>(&address);  // the way of the socket interface
-  const bool bound = bind(probe, plain, length) == 0 && getsockname(probe, plain, &length) == 0;
-  const int error = errno;
-  close(probe);
-  if (!bound) fail("no free port", error);
-  return std::to_string(ntohs(address.sin_port));
 }
 
 struct SpawnActions {
@@ -62,11 +44,11 @@ std::string quoted(const std::string& text) {
 
 }  // namespace
 
-OpenOcdServer::OpenOcdServer(const std::string& configFile)
-    : endpoint_{"127.0.0.1", freePort()}, log_(std::tmpfile()) {
+OpenOcdServer::OpenOcdServer(const std::string& configFile) : log_(std::tmpfile()) {
   if (!log_) fail("no temporary file", errno);
+  fcntl(fileno(log_.get()), F_SETFL, O_APPEND);  // the server shares our place in it
   std::string source = "source " + quoted(configFile);
-  std::string ports = "bindto 127.0.0.1; telnet_port disabled; gdb_port disabled; tcl_port " + endpoint_.port;
+  std::string ports = "bindto 127.0.0.1; telnet_port disabled; gdb_port disabled; tcl_port 0";
   std::string name = "openocd", command = "-c";
   const std::array<char*, 6> arguments{name.data(),    command.data(), source.data(),
                                        command.data(), ports.data(),   nullptr};
@@ -91,11 +73,9 @@ OpenOcdServer::~OpenOcdServer() {
 std::unique_ptr<TcpStream> OpenOcdServer::connect(TcpStream::Seconds patience) {
   const auto end = steady_clock::now() + std::chrono::duration_cast<steady_clock::duration>(patience);
   while (runs()) {
-    try {
-      return std::make_unique<TcpStream>(endpoint_, patience);
-    } catch (const std::runtime_error&) {
-      if (steady_clock::now() >= end) throw std::runtime_error("openocd opens no port; it says: " + errors());
-    }
+    if (const std::string port = tclPort(); !port.empty())
+      return std::make_unique<TcpStream>(Endpoint{"127.0.0.1", port}, patience);
+    if (steady_clock::now() >= end) throw std::runtime_error("openocd opens no port; it says: " + errors());
     std::this_thread::sleep_for(glance);
   }
   throw std::runtime_error("openocd has ended; it says: " + errors());
@@ -106,18 +86,43 @@ bool OpenOcdServer::runs() {
   return process_ >= 0;
 }
 
-// The lines of its log that tell of errors, or else its last line.
+// As its log tells it; empty as long as it does not.
+std::string OpenOcdServer::tclPort() const {
+  constexpr std::string_view before = "Listening on port ", behind = " for tcl connections";
+  for (const std::string& line : logLines()) {
+    const std::size_t start = line.find(before), end = line.find(behind);
+    if (start != line.npos && end != line.npos)
+      return line.substr(start + before.size(), end - start - before.size());
+  }
+  return "";
+}
+
+// What its log tells of errors, or else the last line.
 std::string OpenOcdServer::errors() const {
+  constexpr std::string_view mark = "Error: ";
   std::string errors, last;
-  std::array<char, 1024> line{};
-  std::rewind(log_.get());
-  while (std::fgets(line.data(), line.size(), log_.get()) != nullptr) {
-    std::string text(line.data());
-    while (!text.empty() && (text.back() == '\n' || text.back() == ' ')) text.pop_back();
-    if (text.rfind("Error: ", 0) == 0) errors += (errors.empty() ? "" : "; ") + text.substr(7);
-    if (!text.empty()) last = text;
+  for (const std::string& line : logLines()) {
+    if (line.rfind(mark, 0) == 0) errors.append(errors.empty() ? "" : "; ").append(line.substr(mark.size()));
+    if (!line.empty()) last = line;
   }
   return errors.empty() ? last : errors;
+}
+
+// The whole lines that are there, without the blanks at their ends.
+std::vector<std::string> OpenOcdServer::logLines() const {
+  std::vector<std::string> lines;
+  std::string text;
+  std::rewind(log_.get());
+  for (int each = std::fgetc(log_.get()); each != EOF; each = std::fgetc(log_.get())) {
+    if (each != '\n') {
+      text += static_cast<char>(each);
+      continue;
+    }
+    text.erase(text.find_last_not_of(" \r") + 1);
+    lines.push_back(std::move(text));
+    text.clear();
+  }
+  return lines;
 }
 
 }  // namespace QorRT

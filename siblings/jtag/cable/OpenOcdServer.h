@@ -6,6 +6,7 @@
 #include <cstdio>
 #include <memory>
 #include <string>
+#include <vector>
 
 #include "QorExport.h"
 #include "TcpStream.h"
@@ -31,13 +32,14 @@ class QOR_API OpenOcdServer {
   bool runs();
 
  private:
+  std::string tclPort() const;
   std::string errors() const;
+  std::vector<std::string> logLines() const;
 
   struct CloseFile {
     void operator()(std::FILE* file) const { std::fclose(file); }
   };
 
-  Endpoint endpoint_;
   std::unique_ptr<std::FILE, CloseFile> log_;  // has no name, and goes with us
   pid_t process_ = -1;
 };
