@@ -1,88 +1,103 @@
 #include "Recorder.h"
 
 #include <algorithm>
-#include <cstring>
+#include <numeric>
 #include <utility>
 
 namespace tool {
+namespace {
 
-Recorder::Recorder(CoreSession& core, std::vector<Signal> signals, SampleWriter& writer)
+bool hasBit(const Signal& signal, const Bytes& portImage) {
+  return std::any_of(signal.bits.begin(), signal.bits.end(),
+                     [&](unsigned bit) { return bitAt(portImage.data(), bit) != 0; });
+}
+
+}  // namespace
+
+Recorder::Recorder(CoreSession& core, const std::vector<Signal>& signals, SampleWriter& writer)
     : core_(core),
       writer_(writer),
-      signals_(std::move(signals)),
+      signals_(signals),
       next_(core.emptySample()),
       shown_(core.emptySample()),
-      values_(signals_.size()),
-      isMarked_(signals_.size()),
-      moved_(signals_.size()) {
-  bySignalBit_[0].resize(core.info().async_input_count);
-  bySignalBit_[1].resize(core.info().sync_input_count);
-  for (std::size_t i = 0; i < signals_.size(); ++i) {
-    values_[i].resize((signals_[i].width() + 7) / 8);
-    for (unsigned bit : signals_[i].bits)
-      bySignalBit_[signals_[i].port == Port::asyncIn ? 0 : 1][bit].push_back(i);
-  }
-  marked_.reserve(signals_.size());
-  changed_.reserve(signals_.size());
+      values_(signals.size()),
+      moved_(signals.size()),
+      isMarked_(signals.size()) {
+  index(signals);
+  marked_.reserve(signals.size());
+  movedOtherwise_.reserve(signals.size());
+  changed_.resize(signals.size());
+  std::iota(changed_.begin(), changed_.end(), 0U);
   writer_.begin(signals_, refText(core.ref()));
+}
+
+void Recorder::index(const std::vector<Signal>& signals) {
+  for (Port port : {Port::asyncIn, Port::syncIn}) {
+    const Bytes room = next_.values(port);
+    InputPort input{port, {}, room, room};
+    input.signals.resize(8 * room.size());
+    for (std::size_t i = 0; i < signals.size(); ++i)
+      for (unsigned bit : signals[i].bits)
+        if (signals[i].port == port) input.signals[bit].push_back(i);
+    inputs_.push_back(std::move(input));
+  }
 }
 
 void Recorder::write(std::uint64_t nanoseconds, std::uint64_t missed) {
   findChanged();
   findMoved();
-  writer_.add({nanoseconds, missed, values_, changed_, moved_});
+  writer_.add({nanoseconds, missed, values_, changed_, moved_, movedOtherwise_});
   std::swap(shown_, next_);
   isFirst_ = false;
 }
 
-// Marks the signals with a bit that differs between the two images, or that is set in either.
-void Recorder::mark(Port port, const Bytes& first, const Bytes& second, bool differing) {
-  constexpr std::size_t word = sizeof(std::uint64_t);
-  const SignalsOfBits& signals = signalsOf(port);
-  for (std::size_t byte = 0; byte < first.size(); byte += word) {
-    std::uint64_t a = 0, b = 0;
-    const std::size_t count = std::min(word, first.size() - byte);
-    std::memcpy(&a, &first[byte], count);
-    std::memcpy(&b, &second[byte], count);
-    if ((differing ? a ^ b : a | b) == 0) continue;
-    const std::size_t last = std::min(signals.size(), 8 * (byte + count));
-    for (std::size_t bit = 8 * byte; bit < last; ++bit) {
-      const unsigned x = bitAt(first.data(), static_cast<unsigned>(bit)),
-                     y = bitAt(second.data(), static_cast<unsigned>(bit));
-      if ((differing ? x ^ y : x | y) == 0) continue;
-      for (std::size_t signal : signals[bit]) {
-        if (isMarked_[signal]) continue;
-        isMarked_[signal] = true;
+// Marks the signals with a bit that differs between the two images.
+void Recorder::mark(const InputPort& input, const Bytes& now, const Bytes& before) {
+  for (std::size_t byte = 0; byte < now.size(); ++byte) {
+    std::size_t bit = 8 * byte;
+    for (unsigned differing = now[byte] ^ before[byte]; differing != 0; differing >>= 1, ++bit) {
+      if ((differing & 1) == 0) continue;
+      for (std::size_t signal : input.signals[bit]) {
+        if (isMarked_[signal] != 0) continue;
+        isMarked_[signal] = 1;
         marked_.push_back(signal);
       }
     }
   }
 }
 
-void Recorder::findChanged() {
-  changed_.clear();
+void Recorder::clearMarks() {
+  for (std::size_t i : marked_) isMarked_[i] = 0;
   marked_.clear();
-  if (isFirst_) {
-    for (std::size_t i = 0; i < signals_.size(); ++i) changed_.push_back(i);
-  } else {
-    mark(Port::asyncIn, next_.asyncIn, shown_.asyncIn, true);
-    mark(Port::syncIn, next_.syncIn, shown_.syncIn, true);
+}
+
+// All of them at the first poll.
+void Recorder::findChanged() {
+  if (!isFirst_) {
+    for (const InputPort& each : inputs_) mark(each, next_.values(each.port), shown_.values(each.port));
     changed_.assign(marked_.begin(), marked_.end());
-    std::sort(changed_.begin(), changed_.end());
+    clearMarks();
   }
-  for (std::size_t i : marked_) isMarked_[i] = false;
   for (std::size_t i : changed_) extract(signals_[i], next_.values(signals_[i].port), values_[i]);
 }
 
+// A bit that moved otherwise than before need not be the only one of its signal.
 void Recorder::findMoved() {
-  marked_.clear();
-  std::fill(moved_.begin(), moved_.end(), false);
-  mark(Port::asyncIn, next_.asyncUp, next_.asyncDown, false);
-  mark(Port::syncIn, next_.syncUp, next_.syncDown, false);
-  for (std::size_t i : marked_) {
-    moved_[i] = true;
-    isMarked_[i] = false;
+  for (InputPort& each : inputs_) {
+    const Bytes &up = next_.up(each.port), &down = next_.down(each.port);
+    std::swap(each.moved, each.movedBefore);
+    std::transform(up.begin(), up.end(), down.begin(), each.moved.begin(),
+                   [](unsigned char a, unsigned char b) { return static_cast<unsigned char>(a | b); });
+    mark(each, each.moved, each.movedBefore);
   }
+  movedOtherwise_.clear();
+  for (std::size_t i : marked_) {
+    const InputPort& input = inputs_[signals_[i].port == Port::asyncIn ? 0 : 1];
+    const unsigned char moved = hasBit(signals_[i], input.moved) ? 1 : 0;
+    if (moved != moved_[i]) movedOtherwise_.push_back(i);
+    moved_[i] = moved;
+  }
+  clearMarks();
 }
 
 }  // namespace tool

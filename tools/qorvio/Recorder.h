@@ -2,7 +2,6 @@
 // signal whose bits stayed as they were.
 #pragma once
 
-#include <array>
 #include <cstdint>
 #include <vector>
 
@@ -14,34 +13,42 @@ namespace tool {
 class Recorder {
  public:
   /// Core and writer must outlive the recorder. Begins the file.
-  Recorder(CoreSession& core, std::vector<Signal> signals, SampleWriter& writer);
+  Recorder(CoreSession& core, const std::vector<Signal>& signals, SampleWriter& writer);
 
-  /// Reads once; times as in Poll. Throws Failure, with nothing of the poll written.
+  /// Reads once. Throws Failure, with nothing of the poll written.
   void read() { core_.read(next_); }
 
-  /// Writes what read() brought.
+  /// Writes what read() brought; times as in Poll.
   void write(std::uint64_t nanoseconds, std::uint64_t missed);
 
  private:
-  using SignalsOfBits = std::vector<std::vector<std::size_t>>;
+  /// Which bits of an input port moved at this poll and the one before, and which signals each of them belongs to.
+  struct InputPort {
+    Port port;
+    std::vector<std::vector<std::size_t>> signals;
+    Bytes moved;
+    Bytes movedBefore;
+  };
 
-  void mark(Port port, const Bytes& first, const Bytes& second, bool differing);
+  void index(const std::vector<Signal>& signals);
   void findChanged();
   void findMoved();
-  const SignalsOfBits& signalsOf(Port port) const { return bySignalBit_[port == Port::asyncIn ? 0 : 1]; }
+  void mark(const InputPort& input, const Bytes& now, const Bytes& before);
+  void clearMarks();
 
   CoreSession& core_;
   SampleWriter& writer_;
   std::vector<Signal> signals_;
-  std::array<SignalsOfBits, 2> bySignalBit_;
+  std::vector<InputPort> inputs_;
   Sample next_;
   Sample shown_;
   bool isFirst_ = true;
   std::vector<Bytes> values_;
-  std::vector<std::size_t> marked_;
-  std::vector<bool> isMarked_;
+  std::vector<unsigned char> moved_;
   std::vector<std::size_t> changed_;
-  std::vector<bool> moved_;
+  std::vector<std::size_t> movedOtherwise_;
+  std::vector<std::size_t> marked_;
+  std::vector<unsigned char> isMarked_;
 };
 
 }  // namespace tool

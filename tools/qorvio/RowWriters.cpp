@@ -1,5 +1,5 @@
 // CSV and JSON lines: one line a poll, with every value. A value's digits are made only when it changes.
-#include <cstdio>
+#include <algorithm>
 
 #include <nlohmann/json.hpp>
 
@@ -9,11 +9,10 @@ namespace tool {
 namespace {
 
 void appendSeconds(std::string& text, std::uint64_t nanoseconds) {
-  char digits[32];
-  const int length = std::snprintf(digits, sizeof digits, "%llu.%09llu",
-                                   static_cast<unsigned long long>(nanoseconds / 1000000000),
-                                   static_cast<unsigned long long>(nanoseconds % 1000000000));
-  text.append(digits, static_cast<std::size_t>(length));
+  text += std::to_string(nanoseconds / 1000000000);
+  text += ".000000000";
+  std::uint64_t rest = nanoseconds % 1000000000;
+  for (char* digit = &text.back(); rest != 0; rest /= 10) *digit-- = static_cast<char>('0' + rest % 10);
 }
 
 // In double quotes where a comma, a quote or a line end would be taken for the table's own.
@@ -24,24 +23,74 @@ std::string csvField(const std::string& text) {
   return quoted + '"';
 }
 
+std::string jsonText(const std::string& text) {
+  return nlohmann::json(text).dump();
+}
+
+bool isShownInDigits(const Signal& signal) {
+  return signal.names.empty() && signal.unit.empty();
+}
+
+// A line's cells, kept as one text from poll to poll: a cell that changes and keeps its length is changed in place.
+class Row {
+ public:
+  /// `key` stands before the cell.
+  void add(std::string key) { cells_.push_back({std::move(key), {}, 0}); }
+
+  void set(std::size_t i, const std::string& text) {
+    Cell& cell = cells_[i];
+    isWhole_ = isWhole_ && text.size() == cell.text.size();
+    if (isWhole_) std::copy(text.begin(), text.end(), line_.begin() + cell.place);
+    cell.text = text;
+  }
+
+  const std::string& line() {
+    if (!isWhole_) join();
+    return line_;
+  }
+
+ private:
+  struct Cell {
+    std::string key;
+    std::string text;
+    std::ptrdiff_t place;  ///< of the text, in the line
+  };
+
+  void join() {
+    line_.clear();
+    for (Cell& each : cells_) {
+      line_ += each.key;
+      each.place = static_cast<std::ptrdiff_t>(line_.size());
+      line_ += each.text;
+    }
+    isWhole_ = true;
+  }
+
+  std::vector<Cell> cells_;
+  std::string line_;
+  bool isWhole_ = true;
+};
+
 class CsvWriter : public SampleWriter {
  public:
   explicit CsvWriter(const std::string& path) : file_(path) {}
 
   void begin(const std::vector<Signal>& signals, const std::string&) override {
     signals_ = signals;
-    cells_.resize(signals.size());
     file_.text() += "time_s,missed";
-    for (const Signal& each : signals) file_.text() += ',' + csvField(each.name);
+    for (const Signal& each : signals) {
+      file_.text() += ',' + csvField(each.name);
+      row_.add(",");
+    }
     file_.text() += '\n';
   }
 
   void add(const Poll& poll) override {
-    for (std::size_t i : poll.changed) cells_[i] = csvField(shown(signals_[i], poll.values[i]));
+    for (std::size_t i : poll.changed) set(i, poll.values[i]);
     appendSeconds(file_.text(), poll.nanoseconds);
     file_.text() += ',';
     file_.text() += std::to_string(poll.missed);
-    for (const std::string& cell : cells_) (file_.text() += ',') += cell;
+    file_.text() += row_.line();
     file_.text() += '\n';
     file_.spill();
   }
@@ -49,9 +98,16 @@ class CsvWriter : public SampleWriter {
   void end() override { file_.close(); }
 
  private:
+  void set(std::size_t i, const Bytes& value) {
+    cell_.clear();
+    appendShown(cell_, signals_[i], value);
+    row_.set(i, isShownInDigits(signals_[i]) ? cell_ : csvField(cell_));
+  }
+
   OutputFile file_;
   std::vector<Signal> signals_;
-  std::vector<std::string> cells_;
+  Row row_;
+  std::string cell_;
 };
 
 class JsonLinesWriter : public SampleWriter {
@@ -60,17 +116,16 @@ class JsonLinesWriter : public SampleWriter {
 
   void begin(const std::vector<Signal>& signals, const std::string&) override {
     signals_ = signals;
-    cells_.resize(signals.size());
-    for (const Signal& each : signals) keys_.push_back(',' + nlohmann::json(each.name).dump() + ':');
+    for (const Signal& each : signals) row_.add(',' + jsonText(each.name) + ':');
   }
 
   void add(const Poll& poll) override {
-    for (std::size_t i : poll.changed) cells_[i] = nlohmann::json(shown(signals_[i], poll.values[i])).dump();
+    for (std::size_t i : poll.changed) set(i, poll.values[i]);
     file_.text() += "{\"time_s\":";
     appendSeconds(file_.text(), poll.nanoseconds);
     file_.text() += ",\"missed\":";
     file_.text() += std::to_string(poll.missed);
-    for (std::size_t i = 0; i < cells_.size(); ++i) (file_.text() += keys_[i]) += cells_[i];
+    file_.text() += row_.line();
     file_.text() += "}\n";
     file_.spill();
   }
@@ -78,10 +133,17 @@ class JsonLinesWriter : public SampleWriter {
   void end() override { file_.close(); }
 
  private:
+  void set(std::size_t i, const Bytes& value) {
+    cell_ = '"';
+    appendShown(cell_, signals_[i], value);
+    cell_ += '"';
+    row_.set(i, isShownInDigits(signals_[i]) ? cell_ : jsonText(shown(signals_[i], value)));
+  }
+
   OutputFile file_;
   std::vector<Signal> signals_;
-  std::vector<std::string> keys_;
-  std::vector<std::string> cells_;
+  Row row_;
+  std::string cell_;
 };
 
 }  // namespace

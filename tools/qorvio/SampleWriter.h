@@ -16,8 +16,9 @@ struct Poll {
   std::uint64_t nanoseconds;         ///< since the recording began
   std::uint64_t missed;              ///< polls that should have been between this one and the one before
   const std::vector<Bytes>& values;  ///< one a signal
-  const std::vector<std::size_t>& changed;  ///< which signals differ from the poll before, ascending
-  const std::vector<bool>& moved;           ///< signals with activity since the poll before
+  const std::vector<std::size_t>& changed;  ///< the signals that differ from the poll before; at first all
+  const std::vector<unsigned char>& moved;  ///< 1 for a signal with activity since the poll before
+  const std::vector<std::size_t>& movedOtherwise;  ///< the signals whose `moved` differs from the poll before
 };
 
 /// Appends text to a file through a large buffer.

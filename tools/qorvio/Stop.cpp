@@ -1,6 +1,8 @@
 #include "Stop.h"
 
+#include <algorithm>
 #include <csignal>
+#include <thread>
 
 namespace tool {
 namespace {
@@ -31,6 +33,14 @@ Stop::~Stop() {
 
 bool Stop::asked() const {
   return stopAsked != 0;
+}
+
+// In slices: the library's sleep goes on after a signal.
+void Stop::sleepUntil(std::chrono::steady_clock::time_point time) const {
+  constexpr std::chrono::milliseconds slice(20);
+  for (auto now = std::chrono::steady_clock::now(); now < time && !asked();
+       now = std::chrono::steady_clock::now())
+    std::this_thread::sleep_until(std::min(now + slice, time));
 }
 
 }  // namespace tool

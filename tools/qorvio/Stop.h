@@ -1,6 +1,8 @@
 // Ctrl-C as a question that a loop can ask.
 #pragma once
 
+#include <chrono>
+
 namespace tool {
 
 /// From its construction to its end, SIGINT and SIGTERM end nothing by themselves.
@@ -13,6 +15,9 @@ class Stop {
 
   /// Whether one of them has come.
   bool asked() const;
+
+  /// Sleeps until then, or until a moment after one of them has come.
+  void sleepUntil(std::chrono::steady_clock::time_point time) const;
 };
 
 }  // namespace tool

@@ -77,6 +77,11 @@ Spelled spelled(std::string_view text, Radix radix) {
 }  // namespace
 
 void extract(const Signal& signal, const Bytes& portImage, Bytes& value) {
+  if (signal.width() == 1) {
+    value.resize(1);
+    value[0] = static_cast<unsigned char>(bitAt(portImage.data(), signal.bits[0]));
+    return;
+  }
   value.assign((signal.width() + 7) / 8, 0);
   for (unsigned i = 0; i < signal.width(); ++i)
     value[i / 8] =
@@ -100,14 +105,25 @@ void appendDigits(std::string& text, const Bytes& value, unsigned width, Radix r
   }
 }
 
-std::string shown(const Signal& signal, const Bytes& value, const Radix* radix) {
+void appendShown(std::string& text, const Signal& signal, const Bytes& value, const Radix* radix) {
   if (radix == nullptr) {
-    if (const std::string* name = enumeratedName(signal, value)) return *name;
-    if (signal.scale != 0) return scaledText(signal, value);
+    if (const std::string* name = enumeratedName(signal, value)) {
+      text += *name;
+      return;
+    }
+    if (signal.scale != 0) {
+      text += scaledText(signal, value);
+      return;
+    }
   }
   const Radix used = radix != nullptr ? *radix : signal.radix;
-  std::string text = used == Radix::hex ? "0x" : used == Radix::bin ? "0b" : "";
+  text += used == Radix::hex ? "0x" : used == Radix::bin ? "0b" : "";
   appendDigits(text, value, signal.width(), used);
+}
+
+std::string shown(const Signal& signal, const Bytes& value, const Radix* radix) {
+  std::string text;
+  appendShown(text, signal, value, radix);
   return text;
 }
 

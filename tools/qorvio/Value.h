@@ -30,6 +30,7 @@ void appendDigits(std::string& text, const Bytes& value, unsigned width, Radix r
 /// As people see it: the enumerated name if there is one, else scaled with its unit, else the digits with the prefix
 /// of the radix (0x, 0b, none). `radix` overrides the signal's own, enumeration and scale when it is not null.
 std::string shown(const Signal& signal, const Bytes& value, const Radix* radix = nullptr);
+void appendShown(std::string& text, const Signal& signal, const Bytes& value, const Radix* radix = nullptr);
 
 /// Reads a value: an enumerated name, 0x, 0b, a decimal number behind 0d or with a minus sign, or else digits in the
 /// signal's radix. Throws WrongUse for a text that is none of these, and for a value that is too wide, with its width.

@@ -1,5 +1,5 @@
 // Value change dumps: one variable a signal; one "moved" bit a signal, for activity between polls; a count of missed
-// polls.
+// polls, unknown (x) from the poll before them to the poll after.
 #include "SampleWriter.h"
 
 namespace tool {
@@ -18,7 +18,7 @@ class VcdWriter : public SampleWriter {
 
   void begin(const std::vector<Signal>& signals, const std::string& core) override {
     signals_ = signals;
-    shownMoved_.assign(signals.size(), false);
+    for (std::size_t i = 0; i <= 2 * signals.size(); ++i) ids_.push_back(idOf(i));
     std::string& text = file_.text();
     text += "$version qorvio $end\n$timescale 1 ns $end\n$scope module core_" + vcdName(core) + " $end\n";
     for (std::size_t i = 0; i < signals.size(); ++i) variable(signals[i].width(), 2 * i, signals[i].name);
@@ -28,14 +28,14 @@ class VcdWriter : public SampleWriter {
   }
 
   void add(const Poll& poll) override {
+    if (poll.missed != 0 && !isFirst_ && poll.nanoseconds > last_ + 1) missing();
     const std::size_t before = file_.text().size();
     file_.text() += '#';
     file_.text() += std::to_string(poll.nanoseconds);
     file_.text() += '\n';
     const std::size_t stamped = file_.text().size();
     for (std::size_t i : poll.changed) value(i, poll.values[i]);
-    for (std::size_t i = 0; i < signals_.size(); ++i)
-      if (isFirst_ || poll.moved[i] != shownMoved_[i]) moved(i, poll.moved[i]);
+    for (std::size_t i : isFirst_ ? poll.changed : poll.movedOtherwise) moved(i, poll.moved[i] != 0);
     if (isFirst_ || poll.missed != 0) missed(poll.missed);
     isFirst_ = false;
     last_ = poll.nanoseconds;
@@ -50,35 +50,42 @@ class VcdWriter : public SampleWriter {
   }
 
  private:
-  static void appendId(std::string& text, std::size_t number) {
+  static std::string idOf(std::size_t number) {
+    std::string id;
     do {
-      text += static_cast<char>('!' + number % 94);
+      id += static_cast<char>('!' + number % 94);
       number /= 94;
     } while (number-- != 0);
+    return id;
   }
 
   void variable(unsigned width, std::size_t number, const std::string& name) {
-    std::string& text = file_.text();
-    text += "$var wire " + std::to_string(width) + ' ';
-    appendId(text, number);
-    text += ' ' + vcdName(name) + " $end\n";
+    file_.text() +=
+        "$var wire " + std::to_string(width) + ' ' + ids_[number] + ' ' + vcdName(name) + " $end\n";
   }
+
+  void endValue(std::size_t number) { (file_.text() += ids_[number]) += '\n'; }
 
   void value(std::size_t i, const Bytes& value) {
     std::string& text = file_.text();
-    const bool isScalar = signals_[i].width() == 1;
-    if (!isScalar) text += 'b';
-    appendDigits(text, value, signals_[i].width(), Radix::bin);
-    if (!isScalar) text += ' ';
-    appendId(text, 2 * i);
-    text += '\n';
+    if (signals_[i].width() == 1) {
+      text += static_cast<char>('0' + value[0]);
+    } else {
+      text += 'b';
+      appendDigits(text, value, signals_[i].width(), Radix::bin);
+      text += ' ';
+    }
+    endValue(2 * i);
   }
 
   void moved(std::size_t i, bool isMoved) {
     file_.text() += isMoved ? '1' : '0';
-    appendId(file_.text(), 2 * i + 1);
-    file_.text() += '\n';
-    shownMoved_[i] = isMoved;
+    endValue(2 * i + 1);
+  }
+
+  void missing() {
+    file_.text() += '#' + std::to_string(last_ + 1) + "\nbx ";
+    endValue(2 * signals_.size());
   }
 
   void missed(std::uint64_t count) {
@@ -86,13 +93,12 @@ class VcdWriter : public SampleWriter {
     file_.text() += 'b';
     for (unsigned bit = 32; bit-- > 0;) file_.text() += static_cast<char>('0' + (missed_ >> bit & 1));
     file_.text() += ' ';
-    appendId(file_.text(), 2 * signals_.size());
-    file_.text() += '\n';
+    endValue(2 * signals_.size());
   }
 
   OutputFile file_;
   std::vector<Signal> signals_;
-  std::vector<bool> shownMoved_;
+  std::vector<std::string> ids_;
   std::uint64_t missed_ = 0;
   std::uint64_t last_ = 0;
   bool isFirst_ = true;

@@ -1,18 +1,15 @@
 #include <unistd.h>
 #include <chrono>
 #include <cstdio>
-#include <thread>
 
 #include "Commands.h"
 #include "Duration.h"
 #include "Errors.h"
-#include "Recorder.h"
-#include "Stop.h"
+#include "Recording.h"
 
 namespace tool {
 namespace {
 
-using Clock = std::chrono::steady_clock;
 using std::chrono::nanoseconds;
 
 struct RecordOptions {
@@ -21,12 +18,6 @@ struct RecordOptions {
   std::string time;
   std::string out;
   double rate = 0;
-};
-
-struct Limits {
-  std::uint64_t samples = 0;  // 0: as many as the time allows
-  nanoseconds time{0};        // 0: as long as the samples take
-  nanoseconds period{0};      // 0: at the full rate
 };
 
 Limits limitsOf(const RecordOptions& options) {
@@ -70,61 +61,24 @@ class Progress {
   nanoseconds drawn_{0};
 };
 
-struct Result {
-  std::uint64_t samples = 0;
-  std::uint64_t missed = 0;
-};
-
-// Polls in step with the period; one that comes later than the next is due leaves the polls between them missed.
-void runPolls(Recorder& recorder, const Limits& limits, bool showProgress, Result& result) {
-  const Stop stop;
-  Progress progress(showProgress, limits);
-  const Clock::time_point begin = Clock::now();
-  std::uint64_t due = 0;
-  while (!stop.asked() && (limits.samples == 0 || result.samples < limits.samples)) {
-    std::uint64_t missed = 0;
-    if (limits.period.count() != 0) {
-      const auto slot = static_cast<std::uint64_t>((Clock::now() - begin) / limits.period);
-      if (slot > due) missed = slot - due;
-      due += missed;
-      std::this_thread::sleep_until(begin + static_cast<std::int64_t>(due) * limits.period);
-      ++due;
-    }
-    if (limits.time.count() != 0 && Clock::now() - begin >= limits.time) return;
-    recorder.read();
-    const nanoseconds now = Clock::now() - begin;
-    recorder.write(static_cast<std::uint64_t>(now.count()), missed);
-    ++result.samples;
-    result.missed += missed;
-    progress.show(result.samples, now);
-  }
-}
-
-std::string summary(const Result& result, const std::string& path) {
-  return std::to_string(result.samples) + " samples in " + path +
-         (result.missed != 0 ? ", " + std::to_string(result.missed) + " polls missed" : "");
+Recorded recordWithProgress(CoreSession& core, const std::vector<Signal>& signals, const std::string& path,
+                            const Limits& limits, bool wanted) {
+  Progress progress(wanted, limits);
+  return recordTo(path, core, signals, limits,
+                  [&](const Recorded& recorded, nanoseconds now) { progress.show(recorded.samples, now); });
 }
 
 void record(Context& context, const RecordOptions& options) {
   const Limits limits = limitsOf(options);
   CoreSession& core = context.core();
   const std::vector<Signal> signals = context.signals().select(options.names, Direction::input);
-  const std::unique_ptr<SampleWriter> writer = sampleWriter(options.out);
-  Recorder recorder(core, signals, *writer);
   const Settings& settings = context.settings;
-  Result result;
-  try {
-    runPolls(recorder, limits, !settings.quiet, result);
-  } catch (const Failure& failure) {  // what was recorded until then is worth keeping
-    writer->end();
-    throw Failure(std::string(failure.what()) + "; kept " + summary(result, options.out));
-  }
-  writer->end();
+  const Recorded recorded = recordWithProgress(core, signals, options.out, limits, !settings.quiet);
   if (settings.json) {
-    std::printf("{\"samples\": %llu, \"missed\": %llu}\n", static_cast<unsigned long long>(result.samples),
-                static_cast<unsigned long long>(result.missed));
+    std::printf("{\"samples\": %llu, \"missed\": %llu}\n", static_cast<unsigned long long>(recorded.samples),
+                static_cast<unsigned long long>(recorded.missed));
   } else if (!settings.quiet) {
-    std::printf("%s\n", summary(result, options.out).c_str());
+    std::printf("%s\n", summary(recorded, options.out).c_str());
   }
 }
 

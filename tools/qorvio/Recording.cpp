@@ -1,0 +1,79 @@
+#include "Recording.h"
+
+#include <algorithm>
+
+#include "Errors.h"
+#include "Recorder.h"
+#include "Stop.h"
+
+namespace tool {
+namespace {
+
+using Clock = std::chrono::steady_clock;
+using std::chrono::nanoseconds;
+
+// The polls that are due, one a period. One that comes later than the next is due leaves those between them missed.
+class Schedule {
+ public:
+  explicit Schedule(const Limits& limits) : limits_(limits) {}
+
+  nanoseconds now() const { return Clock::now() - begin_; }
+
+  /// Waits for the next poll, and tells how many were missed before it.
+  std::uint64_t await(const Stop& stop) {
+    if (limits_.period.count() == 0) return 0;
+    const auto slot = static_cast<std::uint64_t>(now() / limits_.period);
+    const std::uint64_t missed = slot > next_ ? slot - next_ : 0;
+    next_ += missed;
+    const nanoseconds due = static_cast<std::int64_t>(next_) * limits_.period;
+    stop.sleepUntil(begin_ + (limits_.time.count() != 0 ? std::min(due, limits_.time) : due));
+    ++next_;
+    return missed;
+  }
+
+  bool isOver() const { return limits_.time.count() != 0 && now() >= limits_.time; }
+
+ private:
+  const Limits& limits_;
+  const Clock::time_point begin_ = Clock::now();
+  std::uint64_t next_ = 0;
+};
+
+void runPolls(Recorder& recorder, const Limits& limits, const OnSample& onSample, Recorded& recorded) {
+  const Stop stop;
+  Schedule schedule(limits);
+  while (limits.samples == 0 || recorded.samples < limits.samples) {
+    const std::uint64_t missed = schedule.await(stop);
+    if (stop.asked() || schedule.isOver()) return;
+    recorder.read();
+    const nanoseconds now = schedule.now();
+    recorder.write(static_cast<std::uint64_t>(now.count()), missed);
+    ++recorded.samples;
+    recorded.missed += missed;
+    if (onSample) onSample(recorded, now);
+  }
+}
+
+}  // namespace
+
+std::string summary(const Recorded& recorded, const std::string& path) {
+  return std::to_string(recorded.samples) + " samples in " + path +
+         (recorded.missed != 0 ? ", " + std::to_string(recorded.missed) + " polls missed" : "");
+}
+
+Recorded recordTo(const std::string& path, CoreSession& core, const std::vector<Signal>& signals,
+                  const Limits& limits, const OnSample& onSample) {
+  const std::unique_ptr<SampleWriter> writer = sampleWriter(path);
+  Recorder recorder(core, signals, *writer);
+  Recorded recorded;
+  try {
+    runPolls(recorder, limits, onSample, recorded);
+  } catch (const Failure& failure) {  // what was recorded until then is worth keeping
+    writer->end();
+    throw Failure(std::string(failure.what()) + "; kept " + summary(recorded, path));
+  }
+  writer->end();
+  return recorded;
+}
+
+}  // namespace tool
