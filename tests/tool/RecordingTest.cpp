@@ -1,0 +1,93 @@
+// Recordings over links that are lost or late: what was recorded stays, and says what is missing.
+#include "Recording.h"
+
+#include <gtest/gtest.h>
+#include <unistd.h>
+
+#include <filesystem>
+#include <fstream>
+#include <iterator>
+#include <regex>
+#include <thread>
+
+#include "Errors.h"
+#include "FaultyCable.h"
+#include "Sim.h"
+
+namespace {
+
+struct FileKind {
+  const char* ending;
+  const char* whole;   ///< five samples
+  const char* missed;  ///< how many polls are missed, in the base
+  int base;
+  bool isRunningSum;
+};
+
+constexpr FileKind kinds[] = {
+    {"vcd", R"([^]*\$enddefinitions \$end\n(#\d+\nb[01]{8} !\n(1"\nb0{32} #\n)?){5}#\d+\n)",
+     R"(\nbx #\n#\d+\n(?:b[01]{8} !\n)?(?:[01]"\n)?b([01]{32}) #)", 2, true},
+    {"csv", R"(time_s,missed,counter\n(\d+\.\d{9},0,0x[0-9A-F]{2}\n){5})", R"(,(\d+),0x)", 10, false},
+    {"jsonl", R"((\{"time_s":\d+\.\d{9},"missed":0,"counter":"0x[0-9A-F]{2}"\}\n){5})", R"("missed":(\d+))",
+     10, false},
+};
+
+/// A counter behind a link that fails by a script, recorded into a file of its own.
+class Recording : public testing::TestWithParam<FileKind> {
+ protected:
+  ~Recording() override { std::filesystem::remove(path_); }
+
+  tool::Recorded record(const tool::Limits& limits) {
+    const tool::Signal counter{"counter", tool::Port::asyncIn, {0, 1, 2, 3, 4, 5, 6, 7}};
+    return tool::recordTo(path_, core_, {counter}, limits);
+  }
+
+  std::string text() const {
+    std::ifstream file(path_);
+    return {std::istreambuf_iterator<char>(file), {}};
+  }
+
+  const std::string path_ = std::filesystem::temp_directory_path() /
+                            ("recording" + std::to_string(getpid()) + '.' + GetParam().ending);
+  qorsim::FaultyCable* const link_ = new qorsim::FaultyCable(qorsim::demoBoard().cable());
+  tool::Link session_{std::unique_ptr<QorRT::Qor_Cable>(link_)};
+  tool::CoreSession core_{session_, {1, 1, 0}, ""};
+};
+
+TEST_P(Recording, IsWholeUpToThePollThatLostTheLink) {
+  for (int poll = 0; poll < 5; ++poll) link_->next({});
+  link_->next(qorsim::failAt(1));
+  tool::Limits limits;
+  limits.samples = 100;
+  std::string said;
+  try {
+    record(limits);
+  } catch (const tool::Failure& failure) {
+    said = failure.what();
+  }
+  EXPECT_EQ(said, "device 1, user chain 1, core 0: the link failed at scan 1; kept 5 samples in " + path_);
+  EXPECT_TRUE(std::regex_match(text(), std::regex(GetParam().whole))) << text();
+}
+
+TEST_P(Recording, MarksThePollsThatItMissed) {
+  using std::chrono::milliseconds;
+  for (int poll = 0; poll < 3; ++poll) link_->next({});
+  link_->next({[](qorsim::PassingExchange&) { std::this_thread::sleep_for(milliseconds(11)); }});
+  tool::Limits limits;
+  limits.samples = 6;
+  limits.period = milliseconds(2);
+  const tool::Recorded recorded = record(limits);
+  EXPECT_EQ(recorded.samples, 6U);
+  EXPECT_GE(recorded.missed, 4U);
+  const std::string text = this->text();
+  const std::regex mark(GetParam().missed);
+  std::uint64_t told = 0;
+  for (std::sregex_iterator each(text.begin(), text.end(), mark); each != std::sregex_iterator(); ++each)
+    told = (GetParam().isRunningSum ? 0 : told) + std::stoul((*each)[1], nullptr, GetParam().base);
+  EXPECT_EQ(told, recorded.missed) << text;
+}
+
+INSTANTIATE_TEST_SUITE_P(Files, Recording, testing::ValuesIn(kinds),
+                         [](const auto& each) { return std::string(each.param.ending); });
+
+}  // namespace
