@@ -35,9 +35,9 @@ setup() {
 @test "play checks a whole table first, then drives it in bursts where it can" {
   { echo 'sync_out_data,sync_out_data[0]'; for i in {1..20}; do echo "$i,1"; done; } >steps.csv
   [ "$("$QORVIO" play steps.csv)" = "20 rows in 2 exchanges" ]
-  [ "$("$QORVIO" play steps.csv --rate 1000)" = "20 rows in 20 exchanges" ]
+  [[ "$("$QORVIO" play steps.csv --rate 1000)" = "20 rows in 20 exchanges, "*" late" ]]
   printf 'async_out_data\n1\n2\n' >levels.csv
-  [ "$("$QORVIO" --json play levels.csv)" = '{"rows": 2, "exchanges": 2}' ]
+  [ "$("$QORVIO" --json play levels.csv)" = '{"rows": 2, "exchanges": 2, "late": 0}' ]
   printf 'sync_out_data\n1\n2FF\n' >wide.csv
   run "$QORVIO" play wide.csv
   [ "$status" -eq 2 ]
@@ -45,4 +45,56 @@ setup() {
   printf 'leds\n1\n' >unknown.csv
   run "$QORVIO" play unknown.csv
   [ "$output" = "qorvio: unknown.csv:1: no output of that name: leds" ]
+}
+
+@test "play sends rows at their times, in a recording's own columns too" {
+  cat >bench.toml <<'TOML'
+[[signal]]
+name = "level"
+port = "async_in"
+bits = "7:0"
+[[signal]]
+name = "level"
+port = "async_out"
+bits = "7:0"
+TOML
+  "$QORVIO" --quiet --signals bench.toml record level --samples 5 --rate 50 --out level.csv
+  begin=$(date +%s%N)
+  run "$QORVIO" --signals bench.toml play level.csv
+  [[ $output == "5 rows in 5 exchanges, "*" late" ]]
+  [ $(($(date +%s%N) - begin)) -ge 80000000 ]
+  printf 'time_s,sync_out_data\n0,1\n0.3,2\n0.3,3\n' >twice.csv  # the third is due while the second is sent
+  [ "$("$QORVIO" --json play twice.csv)" = '{"rows": 3, "exchanges": 3, "late": 1}' ]
+  while IFS='|' read -r text said; do
+    printf "$text" >bad.csv
+    run "$QORVIO" play bad.csv
+    echo "$text: exit $status, says: $output"
+    [ "$status" -eq 2 ]
+    [ "$output" = "qorvio: bad.csv:$said" ]
+  done <<'CASES'
+time_s,sync_out_data\n0.2,1\n0.1,2\n|3: a time before that of the row above it: 0.1
+time_s,sync_out_data\nsoon,1\n|2: not a time in seconds: soon
+time_s,missed\n0,0\n|1: names no output
+time_s,missed,sync_out_data\n0\n|2: 0 values for 1 outputs
+CASES
+  run "$QORVIO" play twice.csv --rate 10
+  [ "$output" = "qorvio: the rows have times of their own and take no --rate: twice.csv" ]
+}
+
+catches_int() {  # catches_int PID
+  (((0x$(awk '/^SigCgt/ { print $2 }' "/proc/$1/status") & 2) != 0))
+}
+
+@test "Ctrl-C ends play between two rows" {
+  printf 'time_s,sync_out_data\n0,1\n3600,2\n' >long.csv
+  "$QORVIO" play long.csv >told &
+  local pid=$!
+  until [[ $(cat /proc/$pid/comm) == qorvio ]] && catches_int $pid; do sleep 0.05; done
+  for try in {1..50}; do
+    kill -INT $pid 2>/dev/null || break
+    sleep 0.1
+  done
+  kill -KILL $pid 2>/dev/null && return 1
+  wait $pid
+  [[ $(cat told) == [01]" rows in "[01]" exchanges, 0 late" ]]
 }
