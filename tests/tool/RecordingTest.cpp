@@ -16,6 +16,9 @@
 
 namespace {
 
+using std::chrono::milliseconds;
+using std::chrono::nanoseconds;
+
 struct FileKind {
   const char* ending;
   const char* whole;   ///< five samples
@@ -37,9 +40,14 @@ class Recording : public testing::TestWithParam<FileKind> {
  protected:
   ~Recording() override { std::filesystem::remove(path_); }
 
+  // Between two samples there was time for the polls that were missed between them.
   tool::Recorded record(const tool::Limits& limits) {
     const tool::Signal counter{"counter", tool::Port::asyncIn, {0, 1, 2, 3, 4, 5, 6, 7}};
-    return tool::recordTo(path_, core_, {counter}, limits);
+    return tool::recordTo(path_, core_, {counter}, limits, [&](const tool::Recorded& so, nanoseconds now) {
+      EXPECT_GE(now - last_, static_cast<std::int64_t>(so.missed - missed_) * limits.period);
+      last_ = now;
+      missed_ = so.missed;
+    });
   }
 
   std::string text() const {
@@ -52,6 +60,8 @@ class Recording : public testing::TestWithParam<FileKind> {
   qorsim::FaultyCable* const link_ = new qorsim::FaultyCable(qorsim::demoBoard().cable());
   tool::Link session_{std::unique_ptr<QorRT::Qor_Cable>(link_)};
   tool::CoreSession core_{session_, {1, 1, 0}, ""};
+  nanoseconds last_{0};
+  std::uint64_t missed_ = 0;
 };
 
 TEST_P(Recording, IsWholeUpToThePollThatLostTheLink) {
@@ -70,7 +80,6 @@ TEST_P(Recording, IsWholeUpToThePollThatLostTheLink) {
 }
 
 TEST_P(Recording, MarksThePollsThatItMissed) {
-  using std::chrono::milliseconds;
   for (int poll = 0; poll < 3; ++poll) link_->next({});
   link_->next({[](qorsim::PassingExchange&) { std::this_thread::sleep_for(milliseconds(11)); }});
   tool::Limits limits;

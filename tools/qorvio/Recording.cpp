@@ -12,28 +12,30 @@ namespace {
 using Clock = std::chrono::steady_clock;
 using std::chrono::nanoseconds;
 
-// The polls that are due, one a period. One that comes later than the next is due leaves those between them missed.
+// When a poll is due, and what it finds when its time has come.
 class Schedule {
  public:
   explicit Schedule(const Limits& limits) : limits_(limits) {}
 
-  nanoseconds now() const { return Clock::now() - begin_; }
+  struct Turn {
+    nanoseconds now;       ///< since the beginning
+    std::uint64_t missed;  ///< polls that were due since the one before, and are over
+  };
 
-  /// Waits for the next poll, and tells how many were missed before it.
-  std::uint64_t await(const Stop& stop) {
-    if (limits_.period.count() == 0) return 0;
-    const auto slot = static_cast<std::uint64_t>(now() / limits_.period);
-    const std::uint64_t missed = slot > next_ ? slot - next_ : 0;
-    next_ += missed;
+  Turn await(const Stop& stop) {
+    if (limits_.period.count() == 0) return {now(), 0};
     const nanoseconds due = static_cast<std::int64_t>(next_) * limits_.period;
     stop.sleepUntil(begin_ + (limits_.time.count() != 0 ? std::min(due, limits_.time) : due));
-    ++next_;
-    return missed;
+    const nanoseconds woken = now();
+    const auto slot = static_cast<std::uint64_t>(woken / limits_.period);
+    const std::uint64_t missed = slot > next_ ? slot - next_ : 0;
+    next_ += missed + 1;
+    return {woken, missed};
   }
 
-  bool isOver() const { return limits_.time.count() != 0 && now() >= limits_.time; }
-
  private:
+  nanoseconds now() const { return Clock::now() - begin_; }
+
   const Limits& limits_;
   const Clock::time_point begin_ = Clock::now();
   std::uint64_t next_ = 0;
@@ -43,10 +45,9 @@ void runPolls(Recorder& recorder, const Limits& limits, const OnSample& onSample
   const Stop stop;
   Schedule schedule(limits);
   while (limits.samples == 0 || recorded.samples < limits.samples) {
-    const std::uint64_t missed = schedule.await(stop);
-    if (stop.asked() || schedule.isOver()) return;
+    const auto [now, missed] = schedule.await(stop);
+    if (stop.asked() || (limits.time.count() != 0 && now >= limits.time)) return;
     recorder.read();
-    const nanoseconds now = schedule.now();
     recorder.write(static_cast<std::uint64_t>(now.count()), missed);
     ++recorded.samples;
     recorded.missed += missed;
