@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <charconv>
+#include <cmath>
 #include <fstream>
 
 #include "Errors.h"
@@ -38,7 +39,7 @@ nanoseconds timeOf(const std::string& text) {
   const auto [rest, error] = std::from_chars(text.data(), end, seconds);
   if (error != std::errc() || rest != end || !(seconds >= 0) || seconds > longest)
     throw WrongUse("not a time in seconds: " + text);
-  return nanoseconds(static_cast<std::int64_t>(seconds * 1e9 + 0.5));
+  return nanoseconds(std::llround(seconds * 1e9));
 }
 
 // Takes a script from the lines of its file.

@@ -58,8 +58,11 @@ void runPolls(Recorder& recorder, const Limits& limits, const OnSample& onSample
 }  // namespace
 
 std::string summary(const Recorded& recorded, const std::string& path) {
-  return std::to_string(recorded.samples) + " samples in " + path +
-         (recorded.missed != 0 ? ", " + std::to_string(recorded.missed) + " polls missed" : "");
+  std::string text = std::to_string(recorded.samples) + " samples in " + path;
+  if (recorded.missed != 0)
+    text +=
+        ", " + std::to_string(recorded.missed) + (recorded.missed == 1 ? " poll missed" : " polls missed");
+  return text;
 }
 
 Recorded recordTo(const std::string& path, CoreSession& core, const std::vector<Signal>& signals,
