@@ -79,7 +79,6 @@ void CoreSession::write(const std::vector<Assignment>& assignments) {
   link_.check(QorVIO_setPortBits(link_.session(), ref_, async.values.data(), async.mask.data(), async.count(),
                                  sync.values.data(), sync.mask.data(), sync.count()));
   for (const Assignment& each : assignments) memory_.set(each.signal, each.steps.back());
-  memory_.save();
 }
 
 Bytes CoreSession::lastWritten(const Signal& signal) const {

@@ -1,5 +1,6 @@
 #include "OutputMemory.h"
 
+#include <unistd.h>
 #include <cstdlib>
 #include <filesystem>
 #include <fstream>
@@ -32,8 +33,8 @@ std::string pathFor(const std::string& key) {
   return (folder / "qorvio" / (name + ".json")).string();
 }
 
-// The image that the file remembers; zeros when it does not fit the port.
-Bytes remembered(const nlohmann::json& file, const char* port, unsigned width) {
+// The image that the file holds; zeros when it does not fit the port.
+Bytes imageIn(const nlohmann::json& file, const char* port, unsigned width) {
   Bytes image((width + 7) / 8);
   const auto entry = file.find(port);
   if (entry == file.end() || !entry->is_string()) return image;
@@ -43,32 +44,57 @@ Bytes remembered(const nlohmann::json& file, const char* port, unsigned width) {
   return image;
 }
 
+std::string textOf(const Bytes& image) {
+  return hexText(image, static_cast<unsigned>(8 * image.size()));
+}
+
+void overlay(Bytes& image, const Bytes& bits, const Bytes& mask) {
+  for (std::size_t i = 0; i < image.size(); ++i)
+    image[i] = static_cast<unsigned char>((image[i] & ~mask[i]) | (bits[i] & mask[i]));
+}
+
 }  // namespace
 
+OutputMemory::Images::Images(const QORVIO_CORE_INFO& info)
+    : asyncOut((info.async_output_count + 7) / 8), syncOut((info.sync_output_count + 7) / 8) {}
+
 OutputMemory::OutputMemory(const std::string& key, const QORVIO_CORE_INFO& info)
-    : path_(pathFor(key)),
-      asyncOut_((info.async_output_count + 7) / 8),
-      syncOut_((info.sync_output_count + 7) / 8) {
-  if (path_.empty()) return;
-  std::ifstream file(path_);
-  const auto json = nlohmann::json::parse(file, nullptr, false);
-  if (!json.is_object()) return;
-  asyncOut_ = remembered(json, "async_out", info.async_output_count);
-  syncOut_ = remembered(json, "sync_out", info.sync_output_count);
+    : path_(pathFor(key)), info_(info), now_(remembered()), given_(info) {}
+
+OutputMemory::~OutputMemory() {
+  try {
+    if (isChanged_ && !path_.empty()) save();
+  } catch (const std::exception&) {
+    return;  // what the command did stands; only the next toggle starts from older values
+  }
 }
 
 void OutputMemory::set(const Signal& signal, const Bytes& value) {
-  Bytes& image = signal.port == Port::asyncOut ? asyncOut_ : syncOut_;
-  for (unsigned i = 0; i < signal.width(); ++i) setBit(image, signal.bits[i], bitAt(value.data(), i));
+  for (unsigned i = 0; i < signal.width(); ++i) {
+    setBit(now_.of(signal.port), signal.bits[i], bitAt(value.data(), i));
+    setBit(given_.of(signal.port), signal.bits[i], 1);
+  }
+  isChanged_ = true;
+}
+
+OutputMemory::Images OutputMemory::remembered() const {
+  Images images(info_);
+  std::ifstream file(path_);
+  const auto json = nlohmann::json::parse(file, nullptr, false);
+  if (!json.is_object()) return images;
+  images.asyncOut = imageIn(json, "async_out", info_.async_output_count);
+  images.syncOut = imageIn(json, "sync_out", info_.sync_output_count);
+  return images;
 }
 
 void OutputMemory::save() const {
-  if (path_.empty()) return;
-  const nlohmann::json json{{"async_out", hexText(asyncOut_, static_cast<unsigned>(8 * asyncOut_.size()))},
-                            {"sync_out", hexText(syncOut_, static_cast<unsigned>(8 * syncOut_.size()))}};
+  Images images = remembered();
+  overlay(images.asyncOut, now_.asyncOut, given_.asyncOut);
+  overlay(images.syncOut, now_.syncOut, given_.syncOut);
+  const nlohmann::json json{{"async_out", textOf(images.asyncOut)}, {"sync_out", textOf(images.syncOut)}};
   std::error_code failed;
   fs::create_directories(fs::path(path_).parent_path(), failed);
-  const std::string fresh = path_ + ".new";
+  const std::string fresh = path_ + "." + std::to_string(getpid());  // of this run alone
   bool written = false;
   {
     std::ofstream file(fresh);
@@ -76,6 +102,7 @@ void OutputMemory::save() const {
     written = static_cast<bool>(file.flush());
   }
   if (written) fs::rename(fresh, path_, failed);
+  if (!written || failed) fs::remove(fresh, failed);
 }
 
 }  // namespace tool

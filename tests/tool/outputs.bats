@@ -1,0 +1,45 @@
+# What stays of outputs when a command ends. Needs QORVIO_LOSSY, the tool on a board that goes down with exchange N.
+
+setup_file() { export BATS_TEST_TIMEOUT=30; }
+
+setup() {
+  cd "$BATS_TEST_TMPDIR" || exit 1
+  unset QORVIO_SIGNALS
+  export XDG_STATE_HOME=$PWD QORVIO_CORE=0.1.0 QORVIO_CABLE=lossy:6
+}
+
+remembers() {  # remembers ASYNC SYNC: what the file holds, which is the only one in its folder
+  cat qorvio/*
+  [ "$(cat qorvio/*)" = "{\"async_out\":\"$1\",\"sync_out\":\"$2\"}" ]
+}
+
+catches_interrupt() {  # catches_interrupt PID: within ten seconds
+  local try
+  for try in {1..100}; do
+    grep -q '^SigCgt:.*[2367abef]$' "/proc/$1/status" && return
+    sleep 0.1
+  done
+  return 1
+}
+
+@test "an interrupted press releases its output, and leaves alone what others gave meanwhile" {
+  "$QORVIO_LOSSY" write async_out_data=FF
+  "$QORVIO_LOSSY" --json press 'async_out_data[0]' --for 1h >told &
+  local pid=$!
+  catches_interrupt $pid
+  "$QORVIO_LOSSY" toggle 'async_out_data[3]'
+  remembers F7 00
+  kill -INT $pid
+  wait $pid
+  [ "$(tr -d ' \n' <told)" = '[{"name":"async_out_data[0]","width":1,"steps":["0"]}]' ]
+  remembers F6 00
+}
+
+@test "a command that fails remembers what it gave before" {
+  printf 'async_out_data,sync_out_data[0]\n'  >steps.csv
+  for row in {1..9}; do echo "$row,1"; done >>steps.csv
+  run "$QORVIO_LOSSY" play steps.csv
+  [ "$status" -eq 1 ]
+  [ "$output" = "qorvio: device 0, user chain 1, core 0: the link is down" ]
+  remembers 04 01
+}
