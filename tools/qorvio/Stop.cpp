@@ -7,40 +7,41 @@
 namespace tool {
 namespace {
 
+using Clock = std::chrono::steady_clock;
+
+constexpr std::array<int, 3> endings{SIGINT, SIGTERM, SIGHUP};
+
 volatile std::sig_atomic_t stopAsked = 0;
 
 void handle(int) {
   stopAsked = 1;
 }
 
-void setHandlers(void (*handler)(int)) {
-  struct sigaction action {};
-  action.sa_handler = handler;
-  sigaction(SIGINT, &action, nullptr);
-  sigaction(SIGTERM, &action, nullptr);
-}
-
 }  // namespace
 
 Stop::Stop() {
   stopAsked = 0;
-  setHandlers(handle);
+  struct sigaction action {};
+  action.sa_handler = handle;
+  for (std::size_t i = 0; i < endings.size(); ++i) {
+    sigaction(endings[i], nullptr, &before_[i]);
+    const bool staysIgnored = endings[i] == SIGHUP && before_[i].sa_handler == SIG_IGN;
+    if (!staysIgnored) sigaction(endings[i], &action, nullptr);
+  }
 }
 
 Stop::~Stop() {
-  setHandlers(SIG_DFL);
+  for (std::size_t i = 0; i < endings.size(); ++i) sigaction(endings[i], &before_[i], nullptr);
 }
 
 bool Stop::asked() const {
   return stopAsked != 0;
 }
 
-// In slices: the library's sleep goes on after a signal.
-void Stop::sleepUntil(std::chrono::steady_clock::time_point time) const {
-  constexpr std::chrono::milliseconds slice(20);
-  for (auto now = std::chrono::steady_clock::now(); now < time && !asked();
-       now = std::chrono::steady_clock::now())
-    std::this_thread::sleep_until(std::min(now + slice, time));
+// In short naps: a signal that comes between the question and the sleep would otherwise be slept through.
+void Stop::sleepUntil(Clock::time_point due) const {
+  while (!asked() && Clock::now() < due)
+    std::this_thread::sleep_until(std::min(due, Clock::now() + std::chrono::milliseconds(20)));
 }
 
 }  // namespace tool

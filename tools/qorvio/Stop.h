@@ -1,11 +1,14 @@
 // Ctrl-C as a question that a loop can ask.
 #pragma once
 
+#include <signal.h>
+#include <array>
 #include <chrono>
 
 namespace tool {
 
-/// From its construction to its end, SIGINT and SIGTERM end nothing by themselves.
+/// From its construction to its end, SIGINT and SIGTERM end nothing by themselves, nor does SIGHUP, which is left alone
+/// where it is ignored (nohup). Afterwards they do what they did before.
 class Stop {
  public:
   Stop();
@@ -16,8 +19,11 @@ class Stop {
   /// Whether one of them has come.
   bool asked() const;
 
-  /// Sleeps until then, or until a moment after one of them has come.
-  void sleepUntil(std::chrono::steady_clock::time_point time) const;
+  /// Sleeps until then, or until one of them comes.
+  void sleepUntil(std::chrono::steady_clock::time_point due) const;
+
+ private:
+  std::array<struct sigaction, 3> before_{};
 };
 
 }  // namespace tool

@@ -1,10 +1,10 @@
 // pulse, toggle, press: what one does to a bit at the bench.
 #include <chrono>
-#include <thread>
 
 #include "Assignments.h"
 #include "Commands.h"
 #include "Duration.h"
+#include "Stop.h"
 
 namespace tool {
 namespace {
@@ -30,8 +30,9 @@ void press(Context& context, const PressOptions& options) {
   const Signal signal = context.signals().find(options.name, Direction::output);
   Assignment down = toggle(context.core(), signal);  // asks for one bit
   down.steps = {{1}};
+  const Stop stop;  // whoever interrupts it finds the output released
   context.core().write({down});
-  std::this_thread::sleep_for(time);
+  stop.sleepUntil(std::chrono::steady_clock::now() + time);
   write(context, level(signal, {0}));
 }
 
@@ -71,7 +72,8 @@ void addPress(CLI::App& app, Context& context) {
       app.add_subcommand("press", "one output bit to 1, and after a while to 0, like a button");
   command->add_option("NAME", options->name, "the output bit")->required();
   command->add_option("--for", options->time, "how long, such as 100ms or 2s");
-  command->footer("Example:\n  qorvio press async_out_data[0] --for 1s");
+  command->footer(
+      "Ctrl-C releases it before its time.\n\nExample:\n  qorvio press async_out_data[0] --for 1s");
   command->callback([&context, options] { press(context, *options); });
 }
 
