@@ -8,6 +8,8 @@ setup() {
   export XDG_STATE_HOME=$PWD QORVIO_CORE=0.1.0 QORVIO_CABLE=lossy:6
 }
 
+teardown() { [ -z "$pid" ] || kill -KILL "$pid" 2>/dev/null || true; }
+
 remembers() {  # remembers ASYNC SYNC: what the file holds, which is the only one in its folder
   cat qorvio/*
   [ "$(cat qorvio/*)" = "{\"async_out\":\"$1\",\"sync_out\":\"$2\"}" ]
@@ -24,8 +26,8 @@ catches_interrupt() {  # catches_interrupt PID: within ten seconds
 
 @test "an interrupted press releases its output, and leaves alone what others gave meanwhile" {
   "$QORVIO_LOSSY" write async_out_data=FF
-  "$QORVIO_LOSSY" --json press 'async_out_data[0]' --for 1h >told &
-  local pid=$!
+  "$QORVIO_LOSSY" --json press 'async_out_data[0]' --for 1h >told 3>&- &
+  pid=$!
   catches_interrupt $pid
   "$QORVIO_LOSSY" toggle 'async_out_data[3]'
   remembers F7 00
@@ -36,7 +38,7 @@ catches_interrupt() {  # catches_interrupt PID: within ten seconds
 }
 
 @test "a command that fails remembers what it gave before" {
-  printf 'async_out_data,sync_out_data[0]\n'  >steps.csv
+  echo 'async_out_data,sync_out_data[0]' >steps.csv
   for row in {1..9}; do echo "$row,1"; done >>steps.csv
   run "$QORVIO_LOSSY" play steps.csv
   [ "$status" -eq 1 ]
