@@ -1,23 +1,20 @@
 #include "Activity.h"
 
 namespace tool {
-namespace {
 
-bool any(const Signal& signal, const Bytes& flags) {
+bool anyOf(const Signal& signal, const Bytes& portImage) {
   for (unsigned bit : signal.bits)
-    if (bitAt(flags.data(), bit) != 0) return true;
+    if (bitAt(portImage.data(), bit) != 0) return true;
   return false;
 }
 
-}  // namespace
-
 Activity activityOf(const Signal& signal, const Sample& sample) {
   Activity activity;
-  activity.up = any(signal, sample.up(signal.port));
-  activity.down = any(signal, sample.down(signal.port));
+  activity.up = anyOf(signal, sample.up(signal.port));
+  activity.down = anyOf(signal, sample.down(signal.port));
   if (signal.port == Port::syncIn) {
-    activity.syncUp = any(signal, sample.syncSyncUp);
-    activity.syncDown = any(signal, sample.syncSyncDown);
+    activity.syncUp = anyOf(signal, sample.syncSyncUp);
+    activity.syncDown = anyOf(signal, sample.syncSyncDown);
   }
   return activity;
 }

@@ -7,6 +7,9 @@
 
 namespace tool {
 
+/// Whether any of the signal's bits is set in an image of its port.
+bool anyOf(const Signal& signal, const Bytes& portImage);
+
 /// Whether any bit of the signal rose or fell since the read before.
 struct Activity {
   bool up = false, down = false;

@@ -43,21 +43,48 @@ std::size_t columns(const std::string& text) {
   return count;
 }
 
-std::string Table::text() const {
-  std::vector<std::size_t> widths;
-  for (const auto& row : rows_) {
-    widths.resize(std::max(widths.size(), row.size()));
-    for (std::size_t i = 0; i < row.size(); ++i) widths[i] = std::max(widths[i], columns(row[i]));
+void Table::add(std::vector<std::string> row) {
+  rows_.emplace_back();
+  lines_.emplace_back();
+  set(rows_.size() - 1, std::move(row));
+}
+
+void Table::set(std::size_t index, std::vector<std::string> row) {
+  widths_.resize(std::max(widths_.size(), row.size()));
+  for (std::size_t i = 0; i < row.size(); ++i) {
+    const std::size_t width = columns(row[i]);
+    hasGrown_ = hasGrown_ || width > widths_[i];
+    widths_[i] = std::max(widths_[i], width);
   }
+  rows_[index] = std::move(row);
+  stale_.push_back(index);
+}
+
+const std::vector<std::string>& Table::lines() {
+  if (hasGrown_) {
+    for (std::size_t i = 0; i < rows_.size(); ++i) lines_[i] = laidOut(rows_[i]);
+  } else {
+    for (std::size_t i : stale_) lines_[i] = laidOut(rows_[i]);
+  }
+  stale_.clear();
+  hasGrown_ = false;
+  return lines_;
+}
+
+std::string Table::text() {
   std::string text;
-  for (const auto& row : rows_) {
-    std::string line;
-    for (std::size_t i = 0; i < row.size(); ++i)
-      line += row[i] + std::string(widths[i] - columns(row[i]) + 2, ' ');
-    line.erase(line.find_last_not_of(' ') + 1);
-    text += line + '\n';
-  }
+  for (const std::string& line : lines()) text += line + '\n';
   return text;
+}
+
+std::string Table::laidOut(const std::vector<std::string>& row) const {
+  std::string line;
+  for (std::size_t i = 0; i < row.size(); ++i) {
+    line += row[i];
+    line.append(widths_[i] - columns(row[i]) + 2, ' ');
+  }
+  line.erase(line.find_last_not_of(' ') + 1);
+  return line;
 }
 
 std::string inked(Ink ink, const std::string& text) {

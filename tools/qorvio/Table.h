@@ -6,16 +6,30 @@
 
 namespace tool {
 
-/// Rows of cells; the first is the head. Columns are as wide as their widest cell, two blanks between, no blanks at the
-/// end of a line. Cells may hold UTF-8.
+/// Rows of cells; the first is the head. Columns are as wide as their widest cell so far, two blanks between, no blanks
+/// at the end of a line. Cells may hold UTF-8.
 class Table {
  public:
   explicit Table(std::vector<std::string> head) { add(std::move(head)); }
-  void add(std::vector<std::string> row) { rows_.push_back(std::move(row)); }
-  std::string text() const;
+  void add(std::vector<std::string> row);
+
+  /// Puts a row in the place of another; the head is row 0.
+  void set(std::size_t index, std::vector<std::string> row);
+
+  /// A line for each row. Lays out the rows that were set since the call before, and all when a column has grown.
+  const std::vector<std::string>& lines();
+
+  /// The lines, each with its end.
+  std::string text();
 
  private:
+  std::string laidOut(const std::vector<std::string>& row) const;
+
   std::vector<std::vector<std::string>> rows_;
+  std::vector<std::size_t> widths_;
+  std::vector<std::string> lines_;
+  std::vector<std::size_t> stale_;
+  bool hasGrown_ = false;
 };
 
 /// How many columns a terminal gives the text: one a UTF-8 character, none for an escape sequence.

@@ -3,15 +3,50 @@
 #include <poll.h>
 #include <sys/ioctl.h>
 #include <unistd.h>
-#include <algorithm>
+#include <cerrno>
+#include <csignal>
 #include <cstdio>
+#include <utility>
 
 namespace tool {
 namespace {
 
-unsigned short rowsOfTerminal() {
-  winsize size{};
-  return ioctl(STDOUT_FILENO, TIOCGWINSZ, &size) == 0 && size.ws_row != 0 ? size.ws_row : 24;
+using std::chrono::milliseconds;
+
+constexpr Key escape = '\033';
+
+volatile std::sig_atomic_t isResized = 0;
+
+void handleResize(int) {
+  isResized = 1;
+}
+
+Key nextByte(milliseconds wait) {
+  pollfd input{STDIN_FILENO, POLLIN, 0};
+  if (poll(&input, 1, static_cast<int>(wait.count())) <= 0) return noKey;
+  unsigned char byte = 0;
+  const ssize_t count = read(STDIN_FILENO, &byte, 1);
+  if (count == 1) return byte;
+  return count < 0 && errno == EINTR ? noKey : endOfKeys;
+}
+
+// What the terminal sends behind ESC for the keys that send more than a character.
+Key keyOf(const std::string& sequence) {
+  constexpr std::pair<const char*, Key> keys[] = {{"[A", keyUp},   {"OA", keyUp},      {"[B", keyDown},
+                                                  {"OB", keyDown}, {"[5~", keyPageUp}, {"[6~", keyPageDown}};
+  for (const auto& [text, key] : keys)
+    if (sequence == text) return key;
+  return noKey;
+}
+
+Key keyBehindEscape() {
+  constexpr milliseconds together(25);  // the bytes of one key come together
+  std::string sequence;
+  for (Key byte = nextByte(together); byte != noKey && byte != endOfKeys; byte = nextByte(together)) {
+    sequence += static_cast<char>(byte);
+    if (sequence.size() > 1 && byte >= '@' && byte <= '~') break;
+  }
+  return keyOf(sequence);
 }
 
 }  // namespace
@@ -20,36 +55,39 @@ Terminal::Terminal() {
   tcgetattr(STDIN_FILENO, &before_);
   termios raw = before_;
   raw.c_lflag &= ~static_cast<tcflag_t>(ICANON | ECHO);
+  raw.c_cc[VSUSP] = _POSIX_VDISABLE;  // the shell would get the terminal as it is
   tcsetattr(STDIN_FILENO, TCSANOW, &raw);
-  std::fputs("\033[?1049h\033[?25l\033[2J", stdout);
+  struct sigaction action {};
+  action.sa_handler = handleResize;
+  sigaction(SIGWINCH, &action, &resizeBefore_);
+  write("\033[?1049h\033[?25l\033[?7l\033[2J");
 }
 
 Terminal::~Terminal() {
-  std::fputs("\033[?25h\033[?1049l", stdout);
-  std::fflush(stdout);
+  write("\033[?7h\033[?25h\033[?1049l");
+  sigaction(SIGWINCH, &resizeBefore_, nullptr);
   tcsetattr(STDIN_FILENO, TCSANOW, &before_);
 }
 
-void Terminal::show(const std::vector<std::string>& lines) {
-  if (const unsigned short rows = rowsOfTerminal(); rows != rows_) {
-    std::fputs("\033[2J", stdout);
-    shown_.clear();
-    rows_ = rows;
-  }
-  for (std::size_t i = 0; i < rows_ && i < std::max(lines.size(), shown_.size()); ++i) {
-    const std::string line = i < lines.size() ? lines[i] : "";
-    if (i < shown_.size() && shown_[i] == line) continue;
-    std::printf("\033[%zu;1H%s\033[K", i + 1, line.c_str());
-  }
-  shown_ = lines;
-  std::fflush(stdout);
+std::size_t Terminal::rows() const {
+  winsize size{};
+  return ioctl(STDOUT_FILENO, TIOCGWINSZ, &size) == 0 && size.ws_row != 0 ? size.ws_row : 24;
 }
 
-char Terminal::key(std::chrono::milliseconds wait) {
-  pollfd input{STDIN_FILENO, POLLIN, 0};
-  char key = 0;
-  if (poll(&input, 1, static_cast<int>(wait.count())) <= 0 || read(STDIN_FILENO, &key, 1) != 1) return 0;
-  return key;
+bool Terminal::takeResized() {
+  if (isResized == 0) return false;
+  isResized = 0;
+  return true;
+}
+
+bool Terminal::write(const std::string& text) {
+  std::fputs(text.c_str(), stdout);
+  return std::fflush(stdout) == 0;
+}
+
+Key Terminal::key(milliseconds wait) {
+  const Key byte = nextByte(wait);
+  return byte == escape ? keyBehindEscape() : byte;
 }
 
 }  // namespace tool

@@ -1,15 +1,20 @@
-// A terminal that shows lines in place and hands out keys.
+// A terminal that is written to in place and hands out keys.
 #pragma once
 
+#include <signal.h>
 #include <termios.h>
 #include <chrono>
 #include <string>
-#include <vector>
 
 namespace tool {
 
-/// From its construction to its end the terminal shows a screen of its own, without echo; afterwards what it showed
-/// before.
+/// A character, or one of those below.
+using Key = int;
+constexpr Key noKey = 0, keyUp = 0x100, keyDown = 0x101, keyPageUp = 0x102, keyPageDown = 0x103,
+              endOfKeys = 0x104;
+
+/// From its construction to its end the terminal shows a screen of its own, without echo, cursor and line wrap;
+/// afterwards what it showed before.
 class Terminal {
  public:
   Terminal();
@@ -17,16 +22,21 @@ class Terminal {
   Terminal& operator=(const Terminal&) = delete;
   ~Terminal();
 
-  /// Shows the lines from the top, as many as there is room for. Only lines that changed are written.
-  void show(const std::vector<std::string>& lines);
+  /// How many rows it has, now.
+  std::size_t rows() const;
 
-  /// Waits so long for a key; 0 when none came.
-  char key(std::chrono::milliseconds wait);
+  /// Whether it was resized since the call before.
+  bool takeResized();
+
+  /// Writes text and escape sequences. False when the terminal takes no more.
+  bool write(const std::string& text);
+
+  /// Waits so long for a key, or until a signal comes: then and afterwards there is none.
+  Key key(std::chrono::milliseconds wait);
 
  private:
   termios before_{};
-  std::vector<std::string> shown_;
-  unsigned short rows_ = 0;
+  struct sigaction resizeBefore_ {};
 };
 
 }  // namespace tool

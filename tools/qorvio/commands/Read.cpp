@@ -1,9 +1,8 @@
 #include <cstdio>
 
-#include <nlohmann/json.hpp>
-
 #include "Activity.h"
 #include "Commands.h"
+#include "InputJson.h"
 #include "Table.h"
 
 namespace tool {
@@ -16,25 +15,7 @@ struct ReadOptions {
 
 void printJson(const std::vector<Signal>& signals, const Sample& sample, const Radix* radix) {
   nlohmann::ordered_json json = nlohmann::ordered_json::array();
-  Bytes value, up, down;
-  for (const Signal& each : signals) {
-    extract(each, sample.values(each.port), value);
-    extract(each, sample.up(each.port), up);
-    extract(each, sample.down(each.port), down);
-    nlohmann::ordered_json entry{{"name", each.name},
-                                 {"width", each.width()},
-                                 {"value", hexText(value, each.width())},
-                                 {"shown", shown(each, value, radix)},
-                                 {"activity_up", hexText(up, each.width())},
-                                 {"activity_down", hexText(down, each.width())}};
-    if (each.port == Port::syncIn) {
-      extract(each, sample.syncSyncUp, up);
-      extract(each, sample.syncSyncDown, down);
-      entry["sync_activity_up"] = hexText(up, each.width());
-      entry["sync_activity_down"] = hexText(down, each.width());
-    }
-    json.push_back(entry);
-  }
+  for (const Signal& each : signals) json.push_back(jsonOf(each, sample, radix));
   std::printf("%s\n", json.dump(2).c_str());
 }
 

@@ -1,14 +1,15 @@
 #include <unistd.h>
 #include <chrono>
 #include <cstdio>
-#include <sstream>
 
-#include "Activity.h"
 #include "Commands.h"
 #include "Errors.h"
+#include "InputJson.h"
+#include "InputWatch.h"
+#include "Screen.h"
 #include "Stop.h"
-#include "Table.h"
 #include "Terminal.h"
+#include "WatchTables.h"
 
 namespace tool {
 namespace {
@@ -22,145 +23,170 @@ struct WatchOptions {
   std::uint64_t frames = 0;
 };
 
-// What is watched, what it did, and which output the keys drive.
-class Watch {
+Clock::duration periodOf(const WatchOptions& options) {
+  if (!(options.rate >= 0.01) || options.rate > 1000)
+    throw WrongUse("a rate is 0.01 to 1000 frames a second: " + std::to_string(options.rate));
+  return std::chrono::duration_cast<Clock::duration>(std::chrono::duration<double>(1 / options.rate));
+}
+
+// When frames are due: at the rate, or later where the link is slower.
+class Frames {
  public:
-  Watch(CoreSession& core, const SignalTable& signals, const std::vector<std::string>& names)
-      : core_(core), inputs_(signals.select(names, Direction::input)), sample_(core.emptySample()) {
-    since_.resize(inputs_.size());
-    for (const Signal& each : signals.select({}, Direction::output)) addBits(signals, each);
+  Frames(Clock::duration period, std::uint64_t count) : period_(period), count_(count) {}
+
+  /// Whether another one is wanted after so many.
+  bool goesOn(std::uint64_t frames) const { return !stop_.asked() && (count_ == 0 || frames < count_); }
+  void begin() { due_ = std::max(due_ + period_, Clock::now()); }
+  bool isOver() const { return stop_.asked() || Clock::now() >= due_; }
+  void sleep() const { stop_.sleepUntil(due_); }
+
+  // Short enough for a signal that no wait saw.
+  milliseconds nap() const {
+    return std::clamp(std::chrono::ceil<milliseconds>(due_ - Clock::now()), milliseconds(0),
+                      milliseconds(50));
   }
 
-  void poll() {
-    core_.read(sample_);
-    ++frames_;
-    for (std::size_t i = 0; i < inputs_.size(); ++i) {
-      const Activity activity = activityOf(inputs_[i], sample_);
-      since_[i].up |= activity.up;
-      since_[i].down |= activity.down;
-    }
+ private:
+  const Stop stop_;
+  Clock::duration period_;
+  std::uint64_t count_;
+  Clock::time_point due_ = Clock::now();
+};
+
+// The tables on a terminal, and what the keys do to them.
+class LiveWatch {
+ public:
+  LiveWatch(InputWatch& watch, OutputTable outputs)
+      : watch_(watch), inputs_(watch), outputs_(std::move(outputs)) {}
+
+  std::string update(std::size_t rows) {
+    std::vector<std::string> foot = {"", "frame " + std::to_string(watch_.frames()) +
+                                             "   j k choose, space toggle, p pulse, c clear, q quit"};
+    if (!status_.empty()) foot.push_back(status_);
+    return screen_.update(rows, {&inputs_.lines(watch_), &between_, &outputs_.lines()}, std::move(foot));
   }
 
-  void press(char key) {
-    if (key == 0) return;
+  void press(Key key) {
     status_.clear();
-    if (key == 'j' && chosen_ + 1 < outputs_.size()) ++chosen_;
-    if (key == 'k' && chosen_ > 0) --chosen_;
-    if (key == 'c') since_.assign(inputs_.size(), {});
-    if ((key != ' ' && key != 'p') || outputs_.empty()) return;
     try {
-      const Signal& output = outputs_[chosen_];
-      core_.write({key == ' ' ? toggle(core_, output) : pulse(output, 0, 1)});
+      obey(key);
     } catch (const WrongUse& error) {
       status_ = error.what();
     }
   }
 
-  std::vector<std::string> lines(bool withKeys) const {
-    std::vector<std::string> lines = linesOf(inputTable());
-    if (!withKeys) return lines;
-    lines.emplace_back();
-    for (const std::string& line : linesOf(outputTable())) lines.push_back(line);
-    lines.emplace_back();
-    lines.push_back("frame " + std::to_string(frames_) +
-                    "   j k choose, space toggle, p pulse, c clear, q quit");
-    lines.push_back(status_);
-    return lines;
+  void redraw() { screen_.forget(); }
+
+  std::string shown() const {
+    std::string text;
+    for (const std::string& line : screen_.shown()) text += line + '\n';
+    return text.erase(text.find_last_not_of('\n') + 1) + '\n';
   }
 
  private:
-  // Keys drive single bits: the bits of wider outputs one by one.
-  void addBits(const SignalTable& signals, const Signal& output) {
-    if (output.width() == 1) return outputs_.push_back(output);
-    for (unsigned bit = 0; bit < output.width(); ++bit)
-      outputs_.push_back(signals.find(output.name + "[" + std::to_string(bit) + "]", Direction::output));
-  }
-
-  static std::vector<std::string> linesOf(const Table& table) {
-    std::istringstream text(table.text());
-    std::vector<std::string> lines;
-    for (std::string line; std::getline(text, line);) lines.push_back(line);
-    return lines;
-  }
-
-  Table inputTable() const {
-    Table table({"INPUT", "VALUE", "ACTIVITY", "SYNC", "SINCE START"});
-    Bytes value;
-    for (std::size_t i = 0; i < inputs_.size(); ++i) {
-      const Activity activity = activityOf(inputs_[i], sample_);
-      extract(inputs_[i], sample_.values(inputs_[i].port), value);
-      table.add({inputs_[i].name, shown(inputs_[i], value), arrow(activity.up, activity.down),
-                 inputs_[i].port == Port::syncIn ? arrow(activity.syncUp, activity.syncDown) : "",
-                 arrow(since_[i].up, since_[i].down)});
+  void obey(Key key) {
+    switch (key) {
+      case 'j':
+      case 'k':
+        key == 'j' ? outputs_.chooseNext() : outputs_.chooseBefore();
+        return screen_.reveal(watch_.inputs().size() + 2 + outputs_.chosenLine());
+      case ' ':
+        return outputs_.toggleChosen();
+      case 'p':
+        return outputs_.pulseChosen();
+      case 'c':
+        return watch_.clear();
+      case keyUp:
+      case keyDown:
+        return screen_.scroll(key == keyUp ? -1 : 1);
+      case keyPageUp:
+      case keyPageDown:
+        return screen_.scrollPages(key == keyPageUp ? -1 : 1);
+      default:
+        return;
     }
-    return table;
   }
 
-  Table outputTable() const {
-    Table table({"  OUTPUT", "LAST GIVEN"});
-    for (std::size_t i = 0; i < outputs_.size(); ++i)
-      table.add({(i == chosen_ ? "> " : "  ") + outputs_[i].name,
-                 shown(outputs_[i], core_.lastWritten(outputs_[i]))});
-    return table;
-  }
-
-  CoreSession& core_;
-  std::vector<Signal> inputs_;
-  std::vector<Signal> outputs_;
-  std::vector<Activity> since_;
-  Sample sample_;
+  InputWatch& watch_;
+  InputTable inputs_;
+  OutputTable outputs_;
+  const std::vector<std::string> between_{""};
   std::string status_;
-  std::size_t chosen_ = 0;
-  std::uint64_t frames_ = 0;
+  Screen screen_;
 };
 
-milliseconds until(Clock::time_point due) {
-  return std::max(milliseconds(0), std::chrono::duration_cast<milliseconds>(due - Clock::now()));
+// Shows the frame and what the keys make of it until the next one is due; false when that is not wanted.
+bool showWithKeys(LiveWatch& live, Terminal& terminal, const Frames& frames) {
+  do {
+    if (terminal.takeResized()) live.redraw();
+    if (!terminal.write(live.update(terminal.rows()))) return false;
+    const Key key = terminal.key(frames.nap());
+    if (key == 'q' || key == endOfKeys) return false;
+    if (key != noKey) live.press(key);
+  } while (!frames.isOver());
+  return true;
 }
 
-void runOnTerminal(Watch& watch, const WatchOptions& options, Clock::duration period) {
-  const Stop stop;
-  Terminal terminal;
-  Clock::time_point due = Clock::now();
-  for (std::uint64_t frame = 0; !stop.asked() && (options.frames == 0 || frame < options.frames); ++frame) {
-    watch.poll();
-    terminal.show(watch.lines(true));
-    due = std::max(due + period, Clock::now());
-    do {
-      const char key = terminal.key(until(due));
-      if (key == 'q') return;
-      watch.press(key);
-    } while (!stop.asked() && Clock::now() < due);
+void runOnTerminal(InputWatch& watch, OutputTable outputs, Frames& frames) {
+  LiveWatch live(watch, std::move(outputs));
+  try {
+    Terminal terminal;
+    while (frames.goesOn(watch.frames())) {
+      frames.begin();
+      watch.poll();
+      if (!showWithKeys(live, terminal, frames)) return;
+    }
+  } catch (const Failure&) {  // the screen is gone: leave the last frame where it can be seen
+    if (watch.frames() != 0) std::printf("%s", live.shown().c_str());
+    throw;
   }
 }
 
-void runPlain(Watch& watch, const WatchOptions& options, Clock::duration period) {
-  const Stop stop;
-  for (std::uint64_t frame = 0; !stop.asked() && (options.frames == 0 || frame < options.frames); ++frame) {
-    if (frame != 0)
-      usleep(static_cast<useconds_t>(std::chrono::duration_cast<std::chrono::microseconds>(period).count()));
+// Frames as text, one after another, until stdout takes no more.
+template <class Text>
+void print(InputWatch& watch, Frames& frames, Text text) {
+  while (frames.goesOn(watch.frames())) {
+    frames.begin();
     watch.poll();
-    for (const std::string& line : watch.lines(false)) std::printf("%s\n", line.c_str());
-    std::printf("\n");
-    std::fflush(stdout);
+    if (std::fputs(text().c_str(), stdout) < 0 || std::fflush(stdout) != 0) return;
+    if (frames.goesOn(watch.frames())) frames.sleep();
   }
+}
+
+void printTables(InputWatch& watch, Frames& frames) {
+  InputTable table(watch);
+  print(watch, frames, [&] {
+    std::string text;
+    for (const std::string& line : table.lines(watch)) text += line + '\n';
+    return text + '\n';
+  });
+}
+
+void printJson(InputWatch& watch, Frames& frames) {
+  std::vector<std::string> entries(watch.inputs().size());
+  const Clock::time_point begin = Clock::now();
+  print(watch, frames, [&] {
+    for (std::size_t i : watch.takeChanged()) {
+      nlohmann::ordered_json entry = jsonOf(watch.inputs()[i], watch.sample());
+      addActivity(entry, watch.inputs()[i], watch.sinceStart(), "_since_start");
+      entries[i] = entry.dump();
+    }
+    const auto time = std::chrono::duration_cast<std::chrono::microseconds>(Clock::now() - begin);
+    std::string text = "{\"frame\":" + std::to_string(watch.frames()) +
+                       ",\"time_s\":" + std::to_string(static_cast<double>(time.count()) / 1e6) +
+                       ",\"inputs\":[";
+    for (std::size_t i = 0; i < entries.size(); ++i) (text += i == 0 ? "" : ",") += entries[i];
+    return text + "]}\n";
+  });
 }
 
 void runWatch(Context& context, const WatchOptions& options) {
-  if (!(options.rate >= 0.01) || options.rate > 1000)
-    throw WrongUse("a rate is 0.01 to 1000 frames a second: " + std::to_string(options.rate));
-  const auto period =
-      std::chrono::duration_cast<Clock::duration>(std::chrono::duration<double>(1 / options.rate));
-  CoreSession& core = context.core();
-  Watch watch(core, context.signals(), options.names);
-  const bool onTerminal = isatty(STDIN_FILENO) != 0 && isatty(STDOUT_FILENO) != 0;
-  try {
-    (onTerminal ? runOnTerminal : runPlain)(watch, options, period);
-  } catch (const Failure&) {  // the screen is gone: leave the last values where they can be seen
-    if (onTerminal)
-      for (const std::string& line : watch.lines(false)) std::printf("%s\n", line.c_str());
-    throw;
-  }
+  const Clock::duration period = periodOf(options);
+  InputWatch watch(context.core(), context.signals().select(options.names, Direction::input));
+  Frames frames(period, options.frames);
+  if (context.settings.json) return printJson(watch, frames);
+  if (isatty(STDIN_FILENO) == 0 || isatty(STDOUT_FILENO) == 0) return printTables(watch, frames);
+  runOnTerminal(watch, OutputTable(context.core(), context.signals()), frames);
 }
 
 }  // namespace
@@ -172,8 +198,11 @@ void addWatch(CLI::App& app, Context& context) {
   command->add_option("--rate", options->rate, "frames a second");
   command->add_option("--frames", options->frames, "how many; without end when it is not given");
   command->footer(
-      "Keys: j k choose an output bit, space toggles it, p pulses it, c clears, q quits.\n\n"
-      "Example:\n  qorvio watch --rate 20");
+      "Keys: j k choose an output bit, space toggles it, p pulses it, c clears, arrows, PgUp and PgDn "
+      "scroll,\n"
+      "q quits. Without a terminal the table is printed frame after frame, with --json a line of JSON a "
+      "frame.\n\n"
+      "Example:\n  qorvio watch --rate 20\n  qorvio --json watch --frames 3 async_in_data");
   command->callback([&context, options] { runWatch(context, *options); });
 }
 

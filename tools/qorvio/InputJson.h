@@ -1,0 +1,19 @@
+// Inputs as the JSON of read and watch.
+#pragma once
+
+#include <string>
+
+#include <nlohmann/json.hpp>
+
+#include "CoreSession.h"
+
+namespace tool {
+
+/// Name, width, value and activity flags, in the order of the man page. `radix` as in shown().
+nlohmann::ordered_json jsonOf(const Signal& input, const Sample& sample, const Radix* radix = nullptr);
+
+/// Adds the activity flags under their names, each with `ending` behind it.
+void addActivity(nlohmann::ordered_json& entry, const Signal& input, const Sample& sample,
+                 const std::string& ending);
+
+}  // namespace tool
