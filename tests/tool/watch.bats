@@ -1,4 +1,5 @@
-# watch in a terminal, with keys sent and the screen read. Needs QORVIO, the tool; tmux.
+# watch in a terminal, with keys sent and the screen read. Needs QORVIO, the tool, and QORVIO_LOSSY, the tool on a board
+# that goes down with exchange N; tmux.
 
 setup() {
   cd "$BATS_TEST_TMPDIR" || exit 1
@@ -19,6 +20,8 @@ shows() {  # shows REGEX: within ten seconds, a line of the screen
   return 1
 }
 
+hides() { ! tmux -L "$server" capture-pane -p | grep -qE "$1"; }  # hides REGEX: in no line of the screen
+
 @test "keys toggle and pulse outputs, the table follows, and q leaves a clean terminal" {
   tmux -L "$server" -f /dev/null new-session -d -x 100 -y 50 "sh"
   tmux -L "$server" send-keys "'$QORVIO' watch --rate 20; echo left with \$?" Enter
@@ -33,7 +36,7 @@ shows() {  # shows REGEX: within ten seconds, a line of the screen
   tmux -L "$server" send-keys p
   shows '^sync_in_data +0x00 +· +· +↕'
   tmux -L "$server" send-keys q
-  shows '^left with 0'
+  shows 'left with 0'
   [ "$(tmux -L "$server" capture-pane -p | grep -c 'OUTPUT')" -eq 0 ]
 }
 
@@ -42,7 +45,51 @@ shows() {  # shows REGEX: within ten seconds, a line of the screen
   tmux -L "$server" send-keys "'$QORVIO' watch; echo left with \$?" Enter
   shows '^async_in_data'
   tmux -L "$server" send-keys C-c
-  shows '^left with 0'
+  shows 'left with 0'
   run "$QORVIO" --core 1.1.0 watch async_in_data --frames 2 --rate 100 </dev/null
   [ "${lines[3]}" = "async_in_data  0x0039  ↕               ↕" ]
+}
+
+@test "lines without room scroll into sight, and a resize redraws all" {
+  tmux -L "$server" -f /dev/null new-session -d -x 100 -y 12 "'$QORVIO' watch"
+  shows '^12 lines not shown, 0 above and 12 below'
+  hides 'sync_out_data\[7\]'
+  tmux -L "$server" send-keys PageDown Down
+  shows '^12 lines not shown, 10 above and 2 below'
+  hides INPUT
+  tmux -L "$server" send-keys Up PageUp j j j j j j
+  shows '^> async_out_data\[6\]'
+  shows '^12 lines not shown, 3 above and 9 below'
+  tmux -L "$server" resize-window -x 100 -y 30
+  shows '^INPUT'
+  shows '^  sync_out_data\[7\]'
+  hides 'not shown'
+}
+
+@test "a lost link leaves the last frame on a clean terminal, and ends with 1" {
+  tmux -L "$server" -f /dev/null new-session -d -x 100 -y 50 "sh"
+  tmux -L "$server" send-keys "'$QORVIO_LOSSY' --cable lossy:12 --core 0.1.0 watch --rate 50; echo left with \$?" Enter
+  shows 'left with 1'
+  shows '^async_in_data +0x00'
+  shows '^frame 10 '
+  shows '^qorvio: device 0, user chain 1, core 0: the link is down'
+  [ "$(tmux -L "$server" display -p '#{alternate_on} #{cursor_flag} #{wrap_flag}')" = "0 1 1" ]
+  tmux -L "$server" send-keys "clear; stty -a" Enter
+  shows '(^| )icanon'
+  shows '(^| )echo '
+}
+
+@test "as JSON a frame is a line, told until Ctrl-C or until the link is lost" {
+  run "$QORVIO_LOSSY" --cable lossy:6 --core 1.1.0 --json watch --rate 100 'sync_in_data[3:0]'
+  [ "$status" -eq 1 ]
+  [ "${#lines[@]}" -eq 5 ]
+  [[ ${lines[0]} == '{"frame":1,"time_s":'* ]]
+  [ "${lines[3]#*'"inputs":'}" = '[{"name":"sync_in_data[3:0]","width":4,"value":"9","shown":"0x9","activity_up":"F","activity_down":"F","sync_activity_up":"F","sync_activity_down":"F","activity_up_since_start":"F","activity_down_since_start":"F","sync_activity_up_since_start":"F","sync_activity_down_since_start":"F"}]}' ]
+  [ "${lines[4]}" = "qorvio: device 1, user chain 1, core 0: the link is down" ]
+  "$QORVIO" --json watch --rate 100 >told &
+  local pid=$!
+  until [ -s told ]; do sleep 0.05; done
+  kill -INT $pid
+  wait $pid
+  [[ $(tail -1 told) == '{"frame":'*']}' ]]
 }

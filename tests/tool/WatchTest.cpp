@@ -1,0 +1,108 @@
+// What watch formats and writes: only what changed.
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "InputWatch.h"
+#include "Screen.h"
+#include "SignalTable.h"
+#include "Table.h"
+
+namespace {
+
+using testing::ElementsAre;
+using testing::IsEmpty;
+using tool::Direction;
+using Lines = std::vector<std::string>;
+
+struct ScreenCase {
+  const char* what;
+  std::size_t rows;
+  Lines body;
+  Lines foot;
+  std::ptrdiff_t scrolled;
+  std::string written;
+};
+
+TEST(Screen, WritesTheLinesThatDiffer) {
+  const std::string changedTwo = "\033[2;1Htwo!\033[K";
+  const ScreenCase steps[] = {
+      {"all at first",
+       5,
+       {"one", "two"},
+       {"q"},
+       0,
+       "\033[2J\033[1;1Hone\033[K\033[2;1Htwo\033[K\033[3;1Hq\033[K"},
+      {"nothing", 5, {"one", "two"}, {"q"}, 0, ""},
+      {"one line", 5, {"one", "two!"}, {"q"}, 0, changedTwo},
+      {"fewer lines", 5, {"one"}, {"q"}, 0, "\033[2;1Hq\033[K\033[3;1H\033[K"},
+      {"as many as there is room for",
+       3,
+       {"1", "2", "3"},
+       {},
+       0,
+       "\033[2J\033[1;1H1\033[K\033[2;1H2\033[K\033[3;1H3\033[K"},
+      {"one more",
+       3,
+       {"1", "2", "3", "4"},
+       {},
+       0,
+       "\033[3;1H2 lines not shown, 0 above and 2 below: arrows, PgUp, PgDn scroll\033[K"},
+      {"scrolled too far",
+       3,
+       {"1", "2", "3", "4"},
+       {},
+       9,
+       "\033[1;1H3\033[K\033[2;1H4\033[K\033[3;1H2 lines not shown, 2 above and 0 below: arrows, PgUp, PgDn "
+       "scroll\033[K"},
+      {"hardly any room", 2, {"1", "2", "3"}, {"q"}, -9, "\033[2J\033[1;1H1\033[K\033[2;1Hq\033[K"},
+  };
+  tool::Screen screen;
+  for (const ScreenCase& step : steps) {
+    screen.scroll(step.scrolled);
+    EXPECT_EQ(screen.update(step.rows, {&step.body}, step.foot), step.written) << step.what;
+  }
+}
+
+TEST(Table, LaysOutAgainWhatWasSetOrAllWhenAColumnGrows) {
+  tool::Table table({"A", "B"});
+  table.add({"x", "1"});
+  table.add({"y", "2"});
+  EXPECT_THAT(table.lines(), ElementsAre("A  B", "x  1", "y  2"));
+  table.set(2, {"y", "3"});
+  EXPECT_THAT(table.lines(), ElementsAre("A  B", "x  1", "y  3"));
+  table.set(1, {"long", "1"});
+  EXPECT_THAT(table.lines(), ElementsAre("A     B", "long  1", "y     3"));
+  table.set(1, {"x", "1"});
+  EXPECT_THAT(table.lines(), ElementsAre("A     B", "x     1", "y     3"));
+}
+
+// The demo board loops the outputs of its first core back.
+TEST(InputWatch, NamesTheInputsThatLookDifferent) {
+  tool::Link link(tool::openCable("sim:"));
+  tool::CoreSession core(link, {0, 1, 0}, "");
+  tool::SignalTable signals;
+  signals.addWholePorts(core.info());
+  const auto write = [&](const char* output, unsigned char value) {
+    core.write({tool::level(signals.find(output, Direction::output), {value})});
+  };
+  tool::InputWatch watch(core, {signals.find("async_in_data[0]", Direction::input),
+                                signals.find("async_in_data[1]", Direction::input),
+                                signals.find("sync_in_data", Direction::input)});
+  watch.poll();
+  EXPECT_THAT(watch.takeChanged(), ElementsAre(0, 1, 2));
+  watch.poll();
+  EXPECT_THAT(watch.takeChanged(), IsEmpty());
+  write("async_out_data[1]", 1);
+  watch.poll();
+  EXPECT_THAT(watch.takeChanged(), ElementsAre(1));
+  write("sync_out_data", 0x80);
+  watch.poll();  // the activity of the bit before is over
+  EXPECT_THAT(watch.takeChanged(), ElementsAre(1, 2));
+  EXPECT_EQ(watch.sinceStart().asyncUp[0], 2);
+  EXPECT_EQ(watch.sinceStart().syncUp[0], 0x80);
+  watch.clear();
+  EXPECT_EQ(watch.sinceStart().asyncUp[0], 0);
+  EXPECT_THAT(watch.takeChanged(), ElementsAre(0, 1, 2));
+}
+
+}  // namespace
