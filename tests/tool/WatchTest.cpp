@@ -98,6 +98,10 @@ TEST(InputWatch, NamesTheInputsThatLookDifferent) {
   write("sync_out_data", 0x80);
   watch.poll();  // the activity of the bit before is over
   EXPECT_THAT(watch.takeChanged(), ElementsAre(1, 2));
+  watch.poll();
+  EXPECT_THAT(watch.takeChanged(), ElementsAre(2));
+  watch.poll();
+  EXPECT_THAT(watch.takeChanged(), IsEmpty());
   EXPECT_EQ(watch.sinceStart().asyncUp[0], 2);
   EXPECT_EQ(watch.sinceStart().syncUp[0], 0x80);
   watch.clear();

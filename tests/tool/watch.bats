@@ -1,6 +1,8 @@
 # watch in a terminal, with keys sent and the screen read. Needs QORVIO, the tool, and QORVIO_LOSSY, the tool on a board
 # that goes down with exchange N; tmux.
 
+setup_file() { export BATS_TEST_TIMEOUT=60; }
+
 setup() {
   cd "$BATS_TEST_TMPDIR" || exit 1
   unset QORVIO_CABLE QORVIO_CORE QORVIO_SIGNALS
@@ -8,7 +10,10 @@ setup() {
   server=qorvio-$$-$BATS_TEST_NUMBER
 }
 
-teardown() { tmux -L "$server" kill-server 2>/dev/null || true; }
+teardown() {
+  tmux -L "$server" kill-server 2>/dev/null || true
+  [ -z "$pid" ] || kill -KILL "$pid" 2>/dev/null || true
+}
 
 shows() {  # shows REGEX: within ten seconds, a line of the screen
   local try
@@ -86,8 +91,8 @@ hides() { ! tmux -L "$server" capture-pane -p | grep -qE "$1"; }  # hides REGEX:
   [[ ${lines[0]} == '{"frame":1,"time_s":'* ]]
   [ "${lines[3]#*'"inputs":'}" = '[{"name":"sync_in_data[3:0]","width":4,"value":"9","shown":"0x9","activity_up":"F","activity_down":"F","sync_activity_up":"F","sync_activity_down":"F","activity_up_since_start":"F","activity_down_since_start":"F","sync_activity_up_since_start":"F","sync_activity_down_since_start":"F"}]}' ]
   [ "${lines[4]}" = "qorvio: device 1, user chain 1, core 0: the link is down" ]
-  "$QORVIO" --json watch --rate 100 >told &
-  local pid=$!
+  "$QORVIO" --json watch --rate 100 >told 3>&- &
+  pid=$!
   until [ -s told ]; do sleep 0.05; done
   kill -INT $pid
   wait $pid
