@@ -62,8 +62,10 @@ OpenOcdCable::~OpenOcdCable() {
   }
 }
 
+// A server of our own that has failed may have lost its adapter for good: the next one starts afresh.
 void OpenOcdCable::disconnect() noexcept {
   stream_.reset();
+  server_.reset();
 }
 
 std::vector<WireDevice> OpenOcdCable::connect() {
@@ -76,7 +78,7 @@ std::vector<WireDevice> OpenOcdCable::connect() {
 
 std::unique_ptr<TcpStream> OpenOcdCable::reach() {
   if (url_.config.empty()) return std::make_unique<TcpStream>(url_.endpoint, url_.timeout);
-  if (!server_ || !server_->runs()) server_ = std::make_unique<OpenOcdServer>(url_.config);
+  server_ = std::make_unique<OpenOcdServer>(url_.config);
   return server_->connect(url_.timeout);
 }
 

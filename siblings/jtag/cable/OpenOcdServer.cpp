@@ -18,7 +18,7 @@ namespace {
 
 using std::chrono::milliseconds, std::chrono::steady_clock;
 
-constexpr milliseconds glance{20}, farewell{2000};
+constexpr milliseconds glance{20}, farewell{500};
 
 [[noreturn]] void fail(const std::string& what, int error) {
   throw std::runtime_error(what + ": " + std::generic_category().message(error));

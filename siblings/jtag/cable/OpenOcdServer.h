@@ -18,7 +18,7 @@ namespace QorRT {
 class QOR_API OpenOcdServer {
  public:
   /// Throws runtime_error when no server can be started. What is wrong with the configuration file shows when
-  /// the server ends; see awaitPort().
+  /// the server ends; see connect().
   explicit OpenOcdServer(const std::string& configFile);
   ~OpenOcdServer();
   OpenOcdServer(const OpenOcdServer&) = delete;
@@ -28,10 +28,8 @@ class QOR_API OpenOcdServer {
   /// server's log, when it ends instead, or when `patience` passes first.
   std::unique_ptr<TcpStream> connect(TcpStream::Seconds patience);
 
-  /// Whether it still runs.
-  bool runs();
-
  private:
+  bool runs();
   std::string tclPort() const;
   std::string errors() const;
   std::vector<std::string> logLines() const;

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <charconv>
+#include <regex>
 #include <sstream>
 #include <stdexcept>
 
@@ -60,14 +61,20 @@ std::string anyOf(const std::vector<unsigned>& idcodes) {
   return text;
 }
 
+// The server names what it finds behind the TAPs of its configuration "auto0.tap" and so on.
+bool isUnnamed(const OpenOcdTap& tap) {
+  return tap.expected.empty() && std::regex_match(tap.name, std::regex(R"(auto\d+\.tap)"));
+}
+
 void requireAnswer(const OpenOcdTap& tap) {
   const auto& expected = tap.expected;
   if (!expected.empty() && std::find(expected.begin(), expected.end(), tap.idcode) == expected.end())
     throw std::runtime_error("the TAP " + tap.name + " has the IDCODE " + idcodeText(tap.idcode) + ", not " +
                              anyOf(expected));
-  if (tap.irLength == 0)
-    throw std::runtime_error("the server has found a TAP that its configuration does not name: " + tap.name +
-                             ", IDCODE " + idcodeText(tap.idcode));
+  if (isUnnamed(tap))
+    throw std::runtime_error(
+        "the chain has a device that the server's configuration does not name: " + tap.name + ", IDCODE " +
+        idcodeText(tap.idcode) + ", an IR of " + std::to_string(tap.irLength) + " bits by its capture");
 }
 
 void requirePlace(const std::vector<OpenOcdTap>& taps, std::size_t place, const std::string& name) {
@@ -105,6 +112,12 @@ unsigned digitValue(char digit) {
 [[noreturn]] void failAt(std::string_view word, std::size_t bitCount) {
   throw std::runtime_error("the server answered \"" + std::string(word.substr(0, 80)) + "\" where " +
                            std::to_string(bitCount) + " bits were due");
+}
+
+// What the server says of a failure, which may be nothing.
+std::string detail(const std::string& said) {
+  const std::size_t first = said.find_first_not_of(blanks);
+  return first == said.npos ? "" : ": " + said.substr(first, 200);
 }
 
 // Digits to the end of a byte or no further than the bits go; no bit above them is set.
@@ -162,11 +175,14 @@ void appendStep(std::string& commands, const std::vector<OpenOcdTap>& taps,
 }
 
 std::string batchOf(const std::string& commands) {
-  return "if {[catch {set r ok\n" + commands + "set r} m]} {set m \"failed: $m\"}; set m";
+  return "if {[catch {set r ok\n" + commands + "set r} m]} {set m \"failed $m\"}; set m";
 }
 
 CaptureReader::CaptureReader(std::string answer) : answer_(std::move(answer)) {
-  if (word() != "ok") throw std::runtime_error("the server answered \"" + answer_.substr(0, 200) + "\"");
+  const std::string_view first = word();
+  if (first == "failed")
+    throw std::runtime_error("the server could not run the scans" + detail(answer_.substr(place_)));
+  if (first != "ok") throw std::runtime_error("the server answered \"" + answer_.substr(0, 200) + "\"");
 }
 
 std::vector<unsigned char> CaptureReader::next(std::size_t bitCount) {

@@ -16,14 +16,14 @@ struct OpenOcdTap {
   std::string name;
   unsigned idcode = 0;             ///< as the server read it when it started; 0 for none
   std::vector<unsigned> expected;  ///< any of them will do; empty for any
-  unsigned irLength = 0;           ///< bits; 0 for a TAP that the server's configuration does not know
+  unsigned irLength = 0;           ///< bits
 };
 
 /// The enabled TAPs in the server's table of its scan chain, the one nearest to TDO first. Throws runtime_error
 /// for a table that is none.
 QOR_API std::vector<OpenOcdTap> tapsIn(const std::string& table);
 
-/// Throws runtime_error when a TAP answers with an unexpected IDCODE or is not configured, or when the board
+/// Throws runtime_error when a TAP answers with an unexpected IDCODE or is not of the configuration, or when the board
 /// file names another TAP at its place.
 QOR_API void requireTaps(const std::vector<OpenOcdTap>& taps, const std::vector<DeviceEntry>& board);
 

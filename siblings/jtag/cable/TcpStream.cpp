@@ -11,6 +11,7 @@
 #include <algorithm>
 #include <array>
 #include <cerrno>
+#include <cmath>
 #include <stdexcept>
 #include <system_error>
 #include <utility>
@@ -26,11 +27,11 @@ bool wouldBlock(int error) {
   return error == EAGAIN || error == EWOULDBLOCK || error == EINTR;
 }
 
+// With one decimal, rounded up.
 std::string secondsText(TcpStream::Seconds seconds) {
-  std::string text = std::to_string(seconds.count());
-  text.erase(text.find_last_not_of('0') + 1);
-  if (text.back() == '.') text.pop_back();
-  return text + " s";
+  const long tenths = std::lround(std::ceil(seconds.count() * 10));
+  const std::string decimal = tenths % 10 == 0 ? "" : "." + std::to_string(tenths % 10);
+  return std::to_string(tenths / 10) + decimal + " s";
 }
 
 struct Addresses {

@@ -1,0 +1,272 @@
+// What can happen between a host and a real chain: each fault ends in a message that says what was seen, with the
+// target lock free, and the session works again when the link does. By a remote_bitbang cable, and through OpenOCD.
+#include <signal.h>
+#include <sys/wait.h>
+
+#include <atomic>
+#include <chrono>
+#include <cstdlib>
+#include <fstream>
+#include <optional>
+#include <regex>
+#include <thread>
+
+#include "BitbangServer.h"
+#include "Board.h"
+#include "SimPins.h"
+
+namespace {
+
+enum class Fault { none, tdoLow, tdoHigh, flip, withhold, die };
+
+/// The wires of the demo board, with a fault on them.
+class FaultyPins : public qorsim::Pins {
+ public:
+  void write(bool tck, bool tms, bool tdi) override {
+    if (fault == Fault::die && --countdown <= 0) throw std::runtime_error("the simulation ends here");
+    board_->write(tck, tms, tdi);
+  }
+  bool tdo() override {
+    while (fault == Fault::withhold) std::this_thread::sleep_for(std::chrono::milliseconds(5));
+    const bool flipped = fault == Fault::flip && --countdown == 0;
+    return fault == Fault::tdoHigh || (fault != Fault::tdoLow && board_->tdo() != flipped);
+  }
+  void setTrst(bool asserted) override { board_->setTrst(asserted); }
+
+  /// What happens from now on; for `die` and `flip`, after so many steps.
+  void set(Fault next, int steps = 0) {
+    countdown = steps;
+    fault = next;
+  }
+
+ private:
+  std::unique_ptr<qorsim::Pins> board_ = qorsim::demoBoard().pins();
+  std::atomic<Fault> fault{Fault::none};
+  std::atomic<int> countdown{0};
+};
+
+/// The demo board behind a server, which can die and come back at the same port.
+class ServedBoard {
+ public:
+  ServedBoard() { start(); }
+  ~ServedBoard() { stop(); }
+
+  void start() {
+    stopped_ = false;
+    server_.emplace(pins, port_);
+    port_ = server_->port();
+    thread_ = std::thread([this] {
+      try {
+        server_->serve([this] { return stopped_.load(); });
+      } catch (const std::runtime_error&) {  // a fault that ends it
+        server_.reset();
+      }
+    });
+  }
+  void stop() {
+    pins.set(Fault::none);
+    stopped_ = true;
+    if (thread_.joinable()) thread_.join();
+    server_.reset();
+  }
+  void restart() {
+    stop();
+    start();
+  }
+
+  std::string port() const { return std::to_string(port_); }
+
+  FaultyPins pins;
+
+ private:
+  std::uint16_t port_ = 0;
+  std::atomic<bool> stopped_{false};
+  std::optional<qorsim::BitbangServer> server_;
+  std::thread thread_;
+};
+
+struct Case {
+  const char* name;
+  Fault fault;
+  int steps;
+  const char* byBitbang;  // what is said of it
+  const char* byOpenOcd;
+};
+
+void PrintTo(const Case& each, std::ostream* out) {
+  *out << each.name;
+}
+
+const Case cases[] = {
+    {"TdoStuckAt0", Fault::tdoLow, 0, "no debug hub answers, TDO is all zeros",
+     "no debug hub answers, TDO is all zeros"},
+    {"TdoStuckAt1", Fault::tdoHigh, 0, "no debug hub answers, TDO is all ones",
+     "no debug hub answers, TDO is all ones"},
+    {"OneBitFlipped", Fault::flip, 60, "the CRC of the answer does not hold over 80 data bits",
+     "the CRC of the answer does not hold over 80 data bits"},
+    {"ReplyWithheld", Fault::withhold, 0, "HOST:PORT gave 0 of 147 answers, then nothing for 0.5 s",
+     "HOST:PORT did not answer within 0.6 s"},
+    {"SimulationKilled", Fault::die, 150, "HOST:PORT closed the connection after 0 of 147 answers",
+     "HOST:PORT closed the connection before it answered"},
+};
+
+// With the place of the server in words.
+std::vector<std::string> placeless(std::vector<std::string> messages) {
+  for (std::string& message : messages)
+    message = std::regex_replace(message, std::regex(R"(127\.0\.0\.1:\d+)"), "HOST:PORT");
+  return messages;
+}
+
+class WireFault : public testing::TestWithParam<Case> {
+ protected:
+  void tryOn(const std::string& url, const std::string& said) {
+    Board board(url);
+    VioCore core(board, {0, 1, 0});
+    core.write({{"async_out_data", "5A"}});
+    core.read();
+    served.pins.set(GetParam().fault, GetParam().steps);
+    TextMap values, *map = &values;
+    EXPECT_EQ(QorVIO_readValues(board.session, core.ref, &map), failed);
+    EXPECT_THAT(placeless(board.takeMessages()), ElementsAre("100 device 0, user chain 1, core 0: " + said));
+    EXPECT_TRUE(values.empty());
+    { QorRT::QorJtagTargetLock free(board.session, 0); }
+    served.pins.set(Fault::none);
+    if (GetParam().fault == Fault::die) served.restart();
+    core.write({{"async_out_data", "A7"}});
+    EXPECT_EQ(core.read()["async_in_data"], "A7");
+  }
+
+  ServedBoard served;
+};
+
+TEST_P(WireFault, IsToldByABitbangCable) {
+  tryOn("rbb:127.0.0.1:" + served.port() + "?timeout=0.5", GetParam().byBitbang);
+}
+
+TEST_P(WireFault, IsToldThroughOpenOcd) {
+  setenv("QORVIO_BOARD_PORT", served.port().c_str(), 1);
+  tryOn("openocd:?config=" QORVIO_SOURCE_DIR "/rtl/bench/openocd.cfg&timeout=0.5", GetParam().byOpenOcd);
+}
+
+INSTANTIATE_TEST_SUITE_P(Wire, WireFault, testing::ValuesIn(cases),
+                         [](const auto& each) { return std::string(each.param.name); });
+
+/// An OpenOCD server of somebody else in front of a served board, always at the same port.
+class OpenOcd {
+ public:
+  explicit OpenOcd(const std::string& boardPort) : boardPort_(boardPort) {
+    const auto unused = qorsim::demoBoard().pins();
+    port_ = std::to_string(qorsim::BitbangServer(*unused, 0).port());
+    start();
+  }
+  ~OpenOcd() { kill(SIGKILL); }
+
+  std::string url() const { return "openocd:127.0.0.1:" + port_ + "?timeout=0.5"; }
+
+  void start() {
+    process_ = fork();
+    if (process_ == 0) {
+      setenv("QORVIO_BOARD_PORT", boardPort_.c_str(), 1);
+      const std::string ports =
+          "bindto 127.0.0.1; telnet_port disabled; gdb_port disabled; tcl_port " + port_;
+      execlp("openocd", "openocd", "-l", "/dev/null", "-f", QORVIO_SOURCE_DIR "/rtl/bench/openocd.cfg", "-c",
+             ports.c_str(), nullptr);
+      _exit(127);
+    }
+    for (int tries = 0; tries < 200 && !answers(); ++tries)
+      std::this_thread::sleep_for(std::chrono::milliseconds(25));
+  }
+  void kill(int with) {
+    ::kill(process_, with);
+    if (with == SIGKILL) waitpid(process_, nullptr, 0);
+  }
+
+ private:
+  bool answers() const {
+    try {
+      return QorRT::openCable(url().c_str()) != nullptr;
+    } catch (const std::runtime_error&) {
+      return false;
+    }
+  }
+
+  std::string boardPort_, port_;
+  pid_t process_ = -1;
+};
+
+TEST(OpenOcdServer, MayHangOrDieAndComeBackWithinASession) {
+  ServedBoard served;
+  OpenOcd server(served.port());
+  Board board(server.url());
+  VioCore core(board, {0, 1, 0});
+  core.write({{"async_out_data", "00"}});
+  core.read();
+  core.write({{"async_out_data", "5A"}});
+  TextMap values, *map = &values;
+  const auto said = [&] {
+    EXPECT_EQ(QorVIO_readValues(board.session, core.ref, &map), failed);
+    return placeless(board.takeMessages());
+  };
+  const std::string where = "100 device 0, user chain 1, core 0: HOST:PORT ";
+  server.kill(SIGSTOP);
+  EXPECT_THAT(said(), ElementsAre(where + "did not answer within 0.6 s"));
+  server.kill(SIGCONT);
+  values = core.read();
+  EXPECT_EQ(values["async_in_data.activity_up"], "5A");  // even if the hanging read was carried out after all
+  server.kill(SIGKILL);
+  EXPECT_THAT(said(), ElementsAre(where + "closed the connection before it answered"));
+  EXPECT_THAT(said(), ElementsAre(where + "cannot be reached: Connection refused"));
+  server.start();
+  core.write({{"async_out_data", "A7"}});
+  EXPECT_EQ(core.read()["async_in_data"], "A7");
+}
+
+// What a cable says that cannot be opened.
+std::string refusal(const std::string& url) {
+  try {
+    QorRT::openCable(url.c_str());
+  } catch (const std::exception& error) {
+    return placeless({error.what()}).front();
+  }
+  return "nothing";
+}
+
+std::string written(const std::string& name, const std::string& text) {
+  const std::string path = testing::TempDir() + name;
+  std::ofstream(path) << text;
+  return path;
+}
+
+TEST(OpenOcdServer, IsHeldAgainstTheChainAndTheBoardFile) {
+  ServedBoard served;
+  setenv("QORVIO_BOARD_PORT", served.port().c_str(), 1);
+  const std::string good = QORVIO_SOURCE_DIR "/rtl/bench/openocd.cfg";
+  const std::string adapter =
+      "adapter driver remote_bitbang\nremote_bitbang host 127.0.0.1\nremote_bitbang port " + served.port() +
+      "\ntransport select jtag\njtag newtap fpga tap -irlen 6 -expected-id 0x0A5F1093\n";
+  const std::string cpld = "jtag newtap cpld tap -irlen 8 -expected-id 0x";
+  const std::pair<std::string, std::string> refused[] = {
+      {"?config=missing.cfg",
+       "openocd has ended; it says: couldn't read file \"missing.cfg\": No such file or directory"},
+      {"?config=" + written("extra.cfg", adapter),
+       "the chain has a device that the server's configuration does not name: auto0.tap, IDCODE 1234567B, an "
+       "IR "
+       "of 8 bits by its capture"},
+      {"?config=" + written("other.cfg", adapter + cpld + "1234567D"),
+       "the TAP cpld.tap has the IDCODE 1234567B, not 1234567D"},
+      {"?config=" + good + "&board=" + written("tap.toml", "[[device]]\ntap = \"asic.tap\"\n[[device]]\n"),
+       "the server has the TAPs fpga.tap, cpld.tap, the one nearest to TDO first; the board file names "
+       "asic.tap "
+       "as device 0"},
+      {"?config=" + good + "&board=" + written("one.toml", "[[device]]\n"),
+       "the chain has 2 devices, the board file says 1"},
+      {"127.0.0.1:1", "HOST:PORT cannot be reached: Connection refused"},
+      {"?timeout=1",
+       "the cable URL \"openocd:?timeout=1\" must name a server, HOST:PORT, or a configuration to start one, "
+       "?config=FILE"},
+  };
+  for (const auto& [rest, said] : refused) EXPECT_EQ(refusal("openocd:" + rest), said);
+  EXPECT_EQ(refusal("openocd:?config=" + good), "nothing");
+}
+
+}  // namespace
