@@ -18,8 +18,10 @@ class PinsCable : public QorRT::Qor_Cable {
 
   const std::vector<QorRT::Qor_Device>& devices() const override { return devices_; }
 
- private:
+ protected:
   void run(std::vector<QorRT::Qor_Scan>& scans) override;
+
+ private:
   std::vector<unsigned char> play(const QorRT::TckSequence& sequence);
 
   std::vector<QorRT::Qor_Device> devices_;

@@ -25,16 +25,17 @@ struct Distances {
   Distances() {
     for (unsigned from = 0; from < states; ++from)
       for (unsigned to = 0; to < states; ++to) length[from][to] = from == to ? 0 : 99;
-    for (unsigned round = 0; round < states; ++round)
+    for (unsigned round = 0; round < states; ++round) {
       for (unsigned from = 0; from < states; ++from)
         for (const bool tms : {false, true})
           relax(from, static_cast<unsigned>(nextState(TapState(from), tms)));
+    }
   }
   void relax(unsigned from, unsigned by) {
     for (unsigned to = 0; to < states; ++to)
       length[from][to] = std::min(length[from][to], length[by][to] + 1);
   }
-  unsigned length[states][states];
+  unsigned length[states][states] = {};
 };
 
 TEST(TapStates, AreReachedFromEachOtherByTheShortestWalk) {

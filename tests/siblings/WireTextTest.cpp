@@ -177,9 +177,9 @@ TEST(Batches, AreOneCommandWithScansInFields) {
   std::string field;
   for (int i = 0; i < 32; ++i) field += "a5";
   const std::string fields = "drscan b.tap 256 0x" + field + " 4 0x09";
-  EXPECT_EQ(QorRT::batchOf(commands), "if {[catch {set r ok\nirscan b.tap 255\n" + fields +
-                                          "\nruntest 8\nappend r { } [" + fields +
-                                          "]\nset r} m]} {set m \"failed $m\"}; set m");
+  EXPECT_EQ(QorRT::procedureOf("p", commands), "proc p {} {if {[catch {set r ok\nirscan b.tap 255\n" +
+                                                   fields + "\nruntest 8\nappend r { } [" + fields +
+                                                   "]\nset r} m]} {set m \"failed $m\"}; set m}");
 }
 
 std::string read(const std::string& answer, std::size_t bitCount) {

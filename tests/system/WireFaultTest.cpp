@@ -232,7 +232,7 @@ std::string refusal(const std::string& url) {
 }
 
 std::string written(const std::string& name, const std::string& text) {
-  const std::string path = testing::TempDir() + name;
+  std::string path = testing::TempDir() + name;
   std::ofstream(path) << text;
   return path;
 }

@@ -106,10 +106,11 @@ void BitbangCable::append(TckSequence& sequence, const Qor_Scan& scan) const {
 std::string BitbangCable::send(const TckSequence& sequence) {
   std::string answers = stream_->exchange(charactersOf(sequence), sequence.captureCount() + 1);
   const std::size_t odd = answers.find_first_not_of("01");
-  if (odd != answers.npos)
+  if (odd != answers.npos) {
     throw std::runtime_error(url_.endpoint.text() + " answered with the byte " +
                              std::to_string(static_cast<unsigned char>(answers[odd])) +
                              " where 0 or 1 was due");
+  }
   answers.pop_back();
   return answers;
 }

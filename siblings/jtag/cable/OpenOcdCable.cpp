@@ -1,6 +1,7 @@
 #include "OpenOcdCable.h"
 
 #include <algorithm>
+#include <random>
 #include <stdexcept>
 #include <utility>
 
@@ -51,13 +52,14 @@ std::unique_ptr<Qor_Cable> openOpenOcdCable(const std::string& rest) {
   return std::make_unique<OpenOcdCable>(std::move(url));
 }
 
-OpenOcdCable::OpenOcdCable(WireUrl url) : url_(std::move(url)) {
+OpenOcdCable::OpenOcdCable(WireUrl url)
+    : url_(std::move(url)), procedure_("qor_" + std::to_string(std::random_device()())) {
   open();
 }
 
 OpenOcdCable::~OpenOcdCable() {
   try {
-    if (stream_ && !server_ && !logLevel_.empty()) ask("debug_level " + logLevel_);
+    if (stream_ && !server_) ask("catch {rename " + procedure_ + " {}}; debug_level " + logLevel_);
   } catch (const std::exception&) {  // the server has gone first
   }
 }
@@ -66,6 +68,7 @@ OpenOcdCable::~OpenOcdCable() {
 void OpenOcdCable::disconnect() noexcept {
   stream_.reset();
   server_.reset();
+  known_.clear();
 }
 
 std::vector<WireDevice> OpenOcdCable::connect() {
@@ -101,13 +104,20 @@ void OpenOcdCable::exchange(std::vector<Qor_Scan>& scans) {
     appendStep(commands, taps_, wireDevices(), *scan);
     tcks += tcksOf(*scan);
     if (commands.size() < longestCommand && scan + 1 != scans.end()) continue;
-    CaptureReader captures(ask(batchOf(commands), tcks));
+    CaptureReader captures(ask(commandFor(commands), tcks));
     for (; first != scan + 1; ++first)
       if (first->capture) first->in = captures.next(first->bitCount);
     captures.finish();
     commands.clear();
     tcks = 0;
   }
+}
+
+// A server parses a procedure once: who polls sends the same queue again and again.
+std::string OpenOcdCable::commandFor(const std::string& commands) {
+  if (commands == known_) return procedure_;
+  known_ = commands;
+  return procedureOf(procedure_, commands) + "\n" + procedure_;
 }
 
 std::string OpenOcdCable::ask(const std::string& command, std::size_t tcks) {

@@ -27,14 +27,17 @@ class QOR_API OpenOcdCable : public WireCable {
   void exchange(std::vector<Qor_Scan>& scans) override;
   void disconnect() noexcept override;
   std::unique_ptr<TcpStream> reach();
+  std::string commandFor(const std::string& commands);
   std::string ask(const std::string& command, std::size_t tcks = 0);
   void silenceLog();
 
   WireUrl url_;
   std::unique_ptr<OpenOcdServer> server_;  // null for one that is not ours
   std::unique_ptr<TcpStream> stream_;      // null without a connection
-  std::string logLevel_;                   // what the log is set back to; empty when it is not known
+  std::string logLevel_;                   // what the log is set back to
   std::vector<OpenOcdTap> taps_;
+  std::string procedure_;  // its name: nobody else's on this server
+  std::string known_;      // what it does there; empty when it is not there
 };
 
 }  // namespace QorRT

@@ -28,9 +28,11 @@ class QOR_API OpenOcdServer {
   /// server's log, when it ends instead, or when `patience` passes first.
   std::unique_ptr<TcpStream> connect(TcpStream::Seconds patience);
 
+  /// The port of connect(); empty as long as the server does not listen.
+  std::string tclPort() const;
+
  private:
   bool runs();
-  std::string tclPort() const;
   std::string errors() const;
   std::vector<std::string> logLines() const;
 

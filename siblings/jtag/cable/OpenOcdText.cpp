@@ -71,10 +71,11 @@ void requireAnswer(const OpenOcdTap& tap) {
   if (!expected.empty() && std::find(expected.begin(), expected.end(), tap.idcode) == expected.end())
     throw std::runtime_error("the TAP " + tap.name + " has the IDCODE " + idcodeText(tap.idcode) + ", not " +
                              anyOf(expected));
-  if (isUnnamed(tap))
+  if (isUnnamed(tap)) {
     throw std::runtime_error(
         "the chain has a device that the server's configuration does not name: " + tap.name + ", IDCODE " +
         idcodeText(tap.idcode) + ", an IR of " + std::to_string(tap.irLength) + " bits by its capture");
+  }
 }
 
 void requirePlace(const std::vector<OpenOcdTap>& taps, std::size_t place, const std::string& name) {
@@ -174,8 +175,9 @@ void appendStep(std::string& commands, const std::vector<OpenOcdTap>& taps,
   }
 }
 
-std::string batchOf(const std::string& commands) {
-  return "if {[catch {set r ok\n" + commands + "set r} m]} {set m \"failed $m\"}; set m";
+std::string procedureOf(const std::string& name, const std::string& commands) {
+  return "proc " + name + " {} {if {[catch {set r ok\n" + commands +
+         "set r} m]} {set m \"failed $m\"}; set m}";
 }
 
 CaptureReader::CaptureReader(std::string answer) : answer_(std::move(answer)) {

@@ -31,10 +31,10 @@ QOR_API void requireTaps(const std::vector<OpenOcdTap>& taps, const std::vector<
 QOR_API void appendStep(std::string& commands, const std::vector<OpenOcdTap>& taps,
                         const std::vector<WireDevice>& devices, const Qor_Scan& scan);
 
-/// Puts commands of appendStep() into one command that answers "ok" and every capture, or what failed.
-QOR_API std::string batchOf(const std::string& commands);
+/// Puts commands of appendStep() into a procedure that answers "ok" and every capture, or what failed.
+QOR_API std::string procedureOf(const std::string& name, const std::string& commands);
 
-/// The captures in an answer to a batch, taken in order. Throws runtime_error for whatever is no such answer.
+/// The captures in the answer of such a procedure, taken in order. Throws runtime_error for whatever is no such answer.
 class QOR_API CaptureReader {
  public:
   explicit CaptureReader(std::string answer);

@@ -56,10 +56,11 @@ constexpr std::array<TomlKey<std::vector<DeviceEntry>>, 2> boardKeys{{
 }
 
 unsigned irLengthOf(std::size_t index, const Qor_Device& found, const DeviceEntry& entry) {
-  if (found.irLength == 0 && !entry.irLength)
+  if (found.irLength == 0 && !entry.irLength) {
     throw std::runtime_error("the IR length of device " + std::to_string(index) + ", IDCODE " +
                              idcodeText(found.idcode) +
                              ", cannot be told from its capture; a board file can say it");
+  }
   if (found.irLength != 0 && entry.irLength && *entry.irLength != found.irLength)
     contradict(index, "has an IR of " + std::to_string(found.irLength) + " bits",
                std::to_string(*entry.irLength));
@@ -71,11 +72,13 @@ bool fits(std::uint64_t opcode, unsigned irLength) {
 }
 
 void requireOpcodes(std::size_t index, const WireDevice& device) {
-  for (const std::uint64_t opcode : device.userOpcodes)
-    if (opcode != noOpcode && !fits(opcode, device.head.irLength))
+  for (const std::uint64_t opcode : device.userOpcodes) {
+    if (opcode != noOpcode && !fits(opcode, device.head.irLength)) {
       throw std::runtime_error("device " + std::to_string(index) + " has an IR of " +
                                std::to_string(device.head.irLength) + " bits, too short for the opcode " +
                                std::to_string(opcode) + " of a user register");
+    }
+  }
 }
 
 void dropOpcodesBeyondIr(WireDevice& device) {
