@@ -8,6 +8,16 @@
 
 namespace qorrtl {
 
+/// A whole period of the design clock, with something to do after its rising edge.
+template <class Model, class Action>
+void tick(Model& model, Action afterEdge) {
+  model.clk = 1;
+  model.eval();
+  afterEdge();
+  model.clk = 0;
+  model.eval();
+}
+
 /// `Model` has the ports tck, tms, tdi, tdo, clk and run_test_idle. Its design clock ticks once for every TCK that
 /// stays in Run-Test/Idle, as that of the simulated board does.
 template <class Model>
@@ -28,7 +38,12 @@ class RtlPins : public qorsim::Pins {
     model_.tdi = tdi;
     model_.tck = tck;
     model_.eval();
-    if (ticks) tick();
+    if (!ticks) return;
+    tick(model_, [this] {
+      if (!afterEdge_) return;
+      afterEdge_(model_);
+      model_.eval();
+    });
   }
 
   bool tdo() override { return model_.tdo != 0; }
@@ -43,17 +58,6 @@ class RtlPins : public qorsim::Pins {
   }
 
  private:
-  void tick() {
-    model_.clk = 1;
-    model_.eval();
-    if (afterEdge_) {
-      afterEdge_(model_);
-      model_.eval();
-    }
-    model_.clk = 0;
-    model_.eval();
-  }
-
   Model model_;
   std::function<void(Model&)> afterEdge_;
 };
