@@ -241,13 +241,16 @@ TEST(OpenOcdServer, IsHeldAgainstTheChainAndTheBoardFile) {
   ServedBoard served;
   setenv("QORVIO_BOARD_PORT", served.port().c_str(), 1);
   const std::string good = QORVIO_SOURCE_DIR "/rtl/bench/openocd.cfg";
+  const std::string taps = "transport select jtag\njtag newtap fpga tap -irlen 6 -expected-id 0x0A5F1093\n";
   const std::string adapter =
       "adapter driver remote_bitbang\nremote_bitbang host 127.0.0.1\nremote_bitbang port " + served.port() +
-      "\ntransport select jtag\njtag newtap fpga tap -irlen 6 -expected-id 0x0A5F1093\n";
+      "\n" + taps;
   const std::string cpld = "jtag newtap cpld tap -irlen 8 -expected-id 0x";
   const std::pair<std::string, std::string> refused[] = {
       {"?config=missing.cfg",
        "openocd has ended; it says: couldn't read file \"missing.cfg\": No such file or directory"},
+      {"?config=" + written("nobody.cfg", "adapter driver remote_bitbang\nremote_bitbang port 1\n" + taps),
+       "openocd has ended; it says: Failed to connect: Connection refused"},
       {"?config=" + written("extra.cfg", adapter),
        "the chain has a device that the server's configuration does not name: auto0.tap, IDCODE 1234567B, an "
        "IR "

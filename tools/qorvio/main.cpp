@@ -38,7 +38,9 @@ int runCommand(CLI::App& app, int argc, char** argv) {
 }
 
 void addSettings(CLI::App& app, tool::Settings& settings) {
-  app.add_option("--cable", settings.cable, "the board: sim: or sim:BOARD.toml (QORVIO_CABLE)")
+  app.add_option("--cable", settings.cable,
+                 "the board: sim:, sim:BOARD.toml, rbb:HOST:PORT, openocd:HOST:PORT or openocd:?config=FILE "
+                 "(QORVIO_CABLE)")
       ->type_name("URL");
   app.add_option("--core", settings.core, "the core, else the first VIO core (QORVIO_CORE)")
       ->type_name("DEVICE.CHAIN.INDEX");

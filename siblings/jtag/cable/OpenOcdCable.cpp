@@ -73,8 +73,13 @@ void OpenOcdCable::disconnect() noexcept {
 
 std::vector<WireDevice> OpenOcdCable::connect() {
   stream_ = reach();
-  silenceLog();
-  taps_ = tapsIn(ask("capture scan_chain"));
+  try {
+    silenceLog();
+    taps_ = tapsIn(ask("capture scan_chain"));
+  } catch (const std::runtime_error&) {
+    if (server_) server_->requireRunning();
+    throw;
+  }
   requireTaps(taps_, url_.board);
   return describedDevices(headsOf(taps_), url_.board);
 }

@@ -18,7 +18,7 @@ namespace {
 
 using std::chrono::milliseconds, std::chrono::steady_clock;
 
-constexpr milliseconds glance{20}, farewell{500};
+constexpr milliseconds glance{20}, lastWords{200}, farewell{500};
 
 [[noreturn]] void fail(const std::string& what, int error) {
   throw std::runtime_error(what + ": " + std::generic_category().message(error));
@@ -79,6 +79,13 @@ std::unique_ptr<TcpStream> OpenOcdServer::connect(TcpStream::Seconds patience) {
     std::this_thread::sleep_for(glance);
   }
   throw std::runtime_error("openocd has ended; it says: " + errors());
+}
+
+// It closes its connections a moment before it ends.
+void OpenOcdServer::requireRunning() {
+  const auto end = steady_clock::now() + lastWords;
+  while (runs() && steady_clock::now() < end) std::this_thread::sleep_for(glance);
+  if (!runs()) throw std::runtime_error("openocd has ended; it says: " + errors());
 }
 
 bool OpenOcdServer::runs() {

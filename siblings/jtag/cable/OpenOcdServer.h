@@ -28,6 +28,9 @@ class QOR_API OpenOcdServer {
   /// server's log, when it ends instead, or when `patience` passes first.
   std::unique_ptr<TcpStream> connect(TcpStream::Seconds patience);
 
+  /// After a broken connection: throws, as connect() does, when the server has ended or ends now.
+  void requireRunning();
+
   /// The port of connect(); empty as long as the server does not listen.
   std::string tclPort() const;
 

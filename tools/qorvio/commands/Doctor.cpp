@@ -107,7 +107,7 @@ std::string loop(CoreSession& core) {
 
 std::vector<Check> checksOf(Context& context, std::unique_ptr<QorRT::Qor_Cable>& cable, bool mayWrite) {
   std::vector<Check> checks{
-      {"cable", "is the adapter plugged in, its server running, the address right?",
+      {"cable", "is the address right, the server running, the adapter plugged in, the board powered?",
        [&] {
          cable = openCable(context.settings.cable);
          return context.settings.cable;
