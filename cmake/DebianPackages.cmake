@@ -36,6 +36,8 @@ This package holds the headers, and what CMake and pkg-config need.")
 set(CPACK_DEBIAN_QORVIO_PACKAGE_NAME qorvio)
 set(CPACK_DEBIAN_QORVIO_PACKAGE_SECTION electronics)
 set(CPACK_DEBIAN_QORVIO_PACKAGE_SHLIBDEPS ON)
+# A cable starts or reaches one, when its URL says so.
+set(CPACK_DEBIAN_LIBQORVIO_PACKAGE_SUGGESTS "openocd")
 set(CPACK_DEBIAN_QORVIO_PACKAGE_DEPENDS "libqorvio (= ${PROJECT_VERSION}-${release})")
 set(CPACK_COMPONENT_QORVIO_DESCRIPTION "${about}
 
