@@ -20,8 +20,11 @@
 /// lock may be held meanwhile, so a handler makes no call that takes one. What it throws goes no further.
 using QorJtag_MessageHandler = std::function<void(unsigned type, const char* text)>;
 
-/// Opens a session on the cable that the URL names, such as "sim:" or "sim:board.toml". Returns its handle.
-/// Throws, and opens nothing, when the URL is malformed or of an unknown kind, or its cable cannot be opened.
+/// Opens a session on the cable that the URL names: "sim:", "sim:BOARD.toml", "rbb:HOST:PORT",
+/// "openocd:HOST:PORT" or "openocd:?config=FILE"; behind the last three may stand "?board=FILE" and
+/// "timeout=SECONDS", with "&" between. Returns its handle. Throws, and opens nothing, when the URL is malformed
+/// or of an unknown kind, or its cable cannot be opened. Of a server, every wait is bounded; a connection that
+/// breaks fails one call, and the next call opens it anew.
 extern "C" QOR_API unsigned QorJtag_session_open(const char* cableUrl);
 
 namespace QorRT {
