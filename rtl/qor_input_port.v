@@ -13,9 +13,10 @@ module qor_input_port #(
     input  wire             sync_settled,
     input  wire             async_settled,
     input  wire             take,
-    input  wire             merge,
     input  wire [WIDTH-1:0] pins,
-    output reg  [WIDTH-1:0] value,
+
+    // What a take delivers, beside the activity that it is to keep.
+    output wire [WIDTH-1:0] value,
     output wire [WIDTH-1:0] up,
     output wire [WIDTH-1:0] down,
     output wire [WIDTH-1:0] clocked_up,   // as clk samples it
@@ -23,25 +24,19 @@ module qor_input_port #(
 );
 
   reg  [WIDTH-1:0] now = 0, earlier = 0;
-  wire [WIDTH-1:0] kept = {WIDTH{merge}};
   wire [WIDTH-1:0] rise = now & ~earlier, fall = ~now & earlier;
 
-  reg [WIDTH-1:0] live_up = 0, live_down = 0, told_up = 0, told_down = 0;
-  assign clocked_up = told_up;
-  assign clocked_down = told_down;
+  reg  [WIDTH-1:0] live_up = 0, live_down = 0;
 
-  initial value = 0;
   always @(posedge clk) earlier <= now;
 
   generate
     if (SYNCHRONOUS != 0) begin : direct
       always @(posedge clk) now <= pins;
-      always @(posedge clk) if (take) value <= earlier;
     end else begin : synchronised
       // Crossing to clk: two flip-flops, of which only the second is used. Bits of a port may arrive a clock apart.
       reg [WIDTH-1:0] first = 0;
       always @(posedge clk) {now, first} <= {first, pins};
-      always @(posedge clk) if (take) value <= now;
     end
 
     // Activity as the design clock samples it. A change in the clock of a take is not lost: it is either delivered
@@ -55,11 +50,9 @@ module qor_input_port #(
           live_up <= rise | live_up & {WIDTH{~take}};
           live_down <= fall | live_down & {WIDTH{~take}};
         end
-      always @(posedge clk)
-        if (take) begin
-          told_up <= live_up | told_up & kept;
-          told_down <= live_down | told_down & kept;
-        end
+      assign value = earlier;
+      assign clocked_up = live_up;
+      assign clocked_down = live_down;
     end else begin : at_once
       always @(posedge clk)
         if (!async_settled | take) begin
@@ -69,11 +62,9 @@ module qor_input_port #(
           live_up <= live_up | rise;
           live_down <= live_down | fall;
         end
-      always @(posedge clk)
-        if (take) begin
-          told_up <= live_up | rise | told_up & kept;
-          told_down <= live_down | fall | told_down & kept;
-        end
+      assign value = now;
+      assign clocked_up = live_up | rise;
+      assign clocked_down = live_down | fall;
     end
 
     if (EDGE_CAPTURE != 0) begin : edges
@@ -83,8 +74,8 @@ module qor_input_port #(
       // before the take, whose flag tells it. So there is nothing to clear. An edge on its way to clk during a take
       // that tells an earlier one changes nothing either; if it lasts, the sampled activity tells it next time.
       wire [WIDTH-1:0] rose, fell;
-      reg  [WIDTH-1:0] rose_first = 0, rose_now = 0, rose_seen = 0, told_rise = 0;
-      reg  [WIDTH-1:0] fell_first = 0, fell_now = 0, fell_seen = 0, told_fall = 0;
+      reg  [WIDTH-1:0] rose_first = 0, rose_now = 0, rose_seen = 0;
+      reg  [WIDTH-1:0] fell_first = 0, fell_now = 0, fell_seen = 0;
       genvar           i;
       for (i = 0; i < WIDTH; i = i + 1) begin : pin
         reg rise_step = 1'b0, fall_step = 1'b0;
@@ -100,16 +91,12 @@ module qor_input_port #(
           rose_seen <= rose_now;
           fell_seen <= fell_now;
         end
-        if (take) begin
-          told_rise <= rose_now ^ rose_seen | told_rise & kept;
-          told_fall <= fell_now ^ fell_seen | told_fall & kept;
-        end
       end
-      assign up = told_up | told_rise;
-      assign down = told_down | told_fall;
+      assign up = clocked_up | rose_now ^ rose_seen;
+      assign down = clocked_down | fell_now ^ fell_seen;
     end else begin : no_edges
-      assign up = told_up;
-      assign down = told_down;
+      assign up = clocked_up;
+      assign down = clocked_down;
     end
   endgenerate
 

@@ -45,11 +45,15 @@ module qor_outputs #(
       assign async_out = 1'b0;
     end else begin : async
       reg [ASYNC-1:0] values = 0;
-      integer         i;
       always @(posedge tck)
-        for (i = 0; i < ASYNC; i = i + 1)
-          if (write & payload.digits[BITS-1-ASYNC_MASK_AT-i]) values[i] <= payload.digits[BITS-1-i];
+        if (write)
+          values <= written(values, payload.digits[BITS-1-:ASYNC], payload.digits[BITS-1-ASYNC_MASK_AT-:ASYNC]);
       assign async_out = values;
+
+      function [ASYNC-1:0] written(input [ASYNC-1:0] old, input [ASYNC-1:0] digits, input [ASYNC-1:0] mask);
+        integer i;
+        for (i = 0; i < ASYNC; i = i + 1) written[i] = mask[ASYNC-1-i] ? digits[ASYNC-1-i] : old[i];
+      endfunction
     end
 
     if (SYNC == 0) begin : without_sync
@@ -57,18 +61,6 @@ module qor_outputs #(
       assign pending = 1'b0;
       assign sync_out = 1'b0;
     end else begin : sync
-      // Step-major: bit step * SYNC + output. The first SYNC bits are out.
-      reg  [STEPS*SYNC-1:0] trains = 0;
-      reg  [STEPS*SYNC-1:0] staged;
-      reg  [SYNC-1:0]       mask;
-      integer               i, step;
-      always @*
-        for (i = 0; i < SYNC; i = i + 1) begin
-          mask[i] = payload.digits[BITS-1-SYNC_MASK_AT-i];
-          for (step = 0; step < STEPS; step = step + 1)
-            staged[step*SYNC+i] = payload.digits[BITS-1-TRAINS_AT-STEPS*i-step];
-        end
-
       // A step of `request` asks, and the same step of `answer` tells that the trains were taken. Crossing to clk
       // and back: one bit each, two flip-flops before it is used, so that it may change at any time.
       reg  request = 1'b0;
@@ -80,14 +72,20 @@ module qor_outputs #(
       always @(posedge tck) begin
         {at_tck, to_tck} <= {to_tck, answer};
         if (capturing) blocked <= pending;
-        if (write & |mask) request <= ~request;
+        if (write) request <= request ^ |payload.digits[BITS-1-SYNC_MASK_AT-:SYNC];
       end
 
-      wire [STEPS*SYNC-1:0] replaced = {STEPS{mask & {SYNC{start}}}};
-      wire [STEPS*SYNC-1:0] shifted = {trains[STEPS*SYNC-1-:SYNC], trains[STEPS*SYNC-1:SYNC]};
+      // Step-major: bit step * SYNC + output. The first SYNC bits are out.
+      reg [STEPS*SYNC-1:0] trains = 0;
+      integer              i, step;
       always @(posedge clk) begin
         {answer, at_clk, to_clk} <= {at_clk, to_clk, request};
-        trains <= staged & replaced | shifted & ~replaced;
+        trains <= {trains[STEPS*SYNC-1-:SYNC], trains[STEPS*SYNC-1:SYNC]};
+        if (start)
+          for (i = 0; i < SYNC; i = i + 1)
+            if (payload.digits[BITS-1-SYNC_MASK_AT-i])
+              for (step = 0; step < STEPS; step = step + 1)
+                trains[step*SYNC+i] <= payload.digits[BITS-1-TRAINS_AT-STEPS*i-step];
       end
       assign sync_out = trains[SYNC-1:0];
     end

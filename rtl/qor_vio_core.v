@@ -58,7 +58,7 @@ module qor_vio_core #(
   wire refuses = is_write & ~rejects & write_blocked | is_acknowledge & ~result_seen;
   wire does = obey & ~rejects & ~refuses;
 
-  wire [RECORD_BITS == 0 ? 0 : RECORD_BITS-1 : 0] records;
+  reg [RECORD_BITS == 0 ? 0 : RECORD_BITS-1 : 0] records = 0;  // the delivery register, on clk
 
   qor_core_link #(
       .INDEX(INDEX), .STATUS_WORD(STATUS_WORD), .RECORD_BITS(RECORD_BITS)
@@ -86,45 +86,62 @@ module qor_vio_core #(
       .clk(clk), .take(take), .merge(merge), .sync_settled(sync_settled), .async_settled(async_settled)
   );
 
-  // The record of input 0 is the last to be delivered: digit k of the records is bit RECORD_BITS-1-k.
+  // The record of input 0 is the last to be delivered: digit k of the records is bit RECORD_BITS-1-k. Activity that
+  // was delivered before stays if it is to be merged.
   generate
-    genvar i;
     if (RECORD_BITS == 0) begin : without_records
       wire unused = &{1'b0, take, merge, sync_settled, async_settled};
-      assign records = 1'b0;
     end
 
     if (ASYNC_IN == 0) begin : without_async_in
       wire unused = async_in;
     end else begin : async_port
+      localparam TOP = RECORD_BITS - 1;
       wire [ASYNC_IN-1:0] value, up, down, unused_up, unused_down;
+      integer             i;
       qor_input_port #(
           .WIDTH(ASYNC_IN), .SYNCHRONOUS(0), .EDGE_CAPTURE(EDGE_CAPTURE)
       ) port (
-          .clk(clk), .sync_settled(sync_settled), .async_settled(async_settled), .take(take), .merge(merge),
+          .clk(clk), .sync_settled(sync_settled), .async_settled(async_settled), .take(take),
           .pins(async_in), .value(value), .up(up), .down(down),
           .clocked_up(unused_up), .clocked_down(unused_down)
       );
-      for (i = 0; i < ASYNC_IN; i = i + 1) begin : input_bit
-        assign records[RECORD_BITS-1-ASYNC_RECORD*i-:ASYNC_RECORD] = {value[i], up[i], down[i], 1'b0};
-      end
+      always @(posedge clk)
+        if (take)
+          for (i = 0; i < ASYNC_IN; i = i + 1)
+            records[TOP-ASYNC_RECORD*i-:ASYNC_RECORD] <= {
+              value[i],
+              up[i] | merge & records[TOP-ASYNC_RECORD*i-1],
+              down[i] | merge & records[TOP-ASYNC_RECORD*i-2],
+              1'b0
+            };
     end
 
     if (SYNC_IN == 0) begin : without_sync_in
       wire unused = sync_in;
     end else begin : sync_port
+      // Without edge capture the activity that clk samples is all there is: the same flip-flops.
+      localparam TOP = SYNC_RECORD * SYNC_IN - 1, CLOCKED = EDGE_CAPTURE != 0 ? 3 : 1;
       wire [SYNC_IN-1:0] value, up, down, clocked_up, clocked_down;
+      integer            i;
       qor_input_port #(
           .WIDTH(SYNC_IN), .SYNCHRONOUS(1), .EDGE_CAPTURE(EDGE_CAPTURE)
       ) port (
-          .clk(clk), .sync_settled(sync_settled), .async_settled(async_settled), .take(take), .merge(merge),
+          .clk(clk), .sync_settled(sync_settled), .async_settled(async_settled), .take(take),
           .pins(sync_in), .value(value), .up(up), .down(down),
           .clocked_up(clocked_up), .clocked_down(clocked_down)
       );
-      for (i = 0; i < SYNC_IN; i = i + 1) begin : input_bit
-        assign records[SYNC_RECORD*(SYNC_IN-i)-1-:SYNC_RECORD] =
-            {value[i], up[i], down[i], clocked_up[i], clocked_down[i], 1'b0};
-      end
+      always @(posedge clk)
+        if (take)
+          for (i = 0; i < SYNC_IN; i = i + 1)
+            records[TOP-SYNC_RECORD*i-:SYNC_RECORD] <= {
+              value[i],
+              up[i] | merge & records[TOP-SYNC_RECORD*i-1],
+              down[i] | merge & records[TOP-SYNC_RECORD*i-2],
+              clocked_up[i] | merge & records[TOP-SYNC_RECORD*i-CLOCKED],
+              clocked_down[i] | merge & records[TOP-SYNC_RECORD*i-CLOCKED-1],
+              1'b0
+            };
     end
   endgenerate
 
