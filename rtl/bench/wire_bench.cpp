@@ -21,6 +21,7 @@
 #include "RtlPins.h"
 #include "Sim.h"
 #include "Vwire256.h"
+#include "Vwire4096.h"
 #include "Vwire64.h"
 #include "Vwire8.h"
 
@@ -232,6 +233,7 @@ class WireReporter : public benchmark::ConsoleReporter {
 QOR_POLLS(8);
 QOR_POLLS(64);
 QOR_POLLS(256);
+QOR_POLLS(4096);
 
 }  // namespace
 
