@@ -47,8 +47,8 @@ module qor_input_port #(
           live_up <= 0;
           live_down <= 0;
         end else begin
-          live_up <= rise | live_up & {WIDTH{~take}};
-          live_down <= fall | live_down & {WIDTH{~take}};
+          live_up <= take ? rise : rise | live_up;
+          live_down <= take ? fall : fall | live_down;
         end
       assign value = earlier;
       assign clocked_up = live_up;

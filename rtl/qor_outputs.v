@@ -34,11 +34,11 @@ module qor_outputs #(
       // Crossing to clk: trains and their mask are taken from here by the design clock. They stand still from the
       // request to its answer, since a scan that begins in between is blocked from shifting.
       reg [BITS-1:0] digits = 0;
-      if (BITS == 1) begin : one
-        always @(posedge tck) if (shifting & ~blocked) digits <= payload_bit;
-      end else begin : many
-        always @(posedge tck) if (shifting & ~blocked) digits <= {payload_bit, digits[BITS-1:1]};
-      end
+      always @(posedge tck)
+        if (shifting & ~blocked) begin
+          digits <= digits >> 1;
+          digits[BITS-1] <= payload_bit;
+        end
     end
 
     if (ASYNC == 0) begin : without_async
@@ -80,7 +80,7 @@ module qor_outputs #(
       integer              i, step;
       always @(posedge clk) begin
         {answer, at_clk, to_clk} <= {at_clk, to_clk, request};
-        trains <= {trains[STEPS*SYNC-1-:SYNC], trains[STEPS*SYNC-1:SYNC]};
+        trains[(STEPS-1)*SYNC-1:0] <= trains[STEPS*SYNC-1:SYNC];  // the last step stays
         if (start)
           for (i = 0; i < SYNC; i = i + 1)
             if (payload.digits[BITS-1-SYNC_MASK_AT-i])
