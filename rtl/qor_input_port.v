@@ -1,4 +1,4 @@
-// One input port of a VIO core: samples its pins, collects activity on them, and keeps what is delivered.
+// One input port of a VIO core: samples its pins, collects activity on them, and tells both to a take.
 //
 // A take at clock edge n delivers the values that the pins had after edge n - 3, and all activity up to then. This
 // holds for both kinds of port, so that a snapshot shows one moment.
