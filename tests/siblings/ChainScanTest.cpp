@@ -13,7 +13,7 @@ TEST(ChainScan, irScanUsesAsManyBitsAsTheIrHas) {
   EXPECT_EQ(scan.bits, (Bytes{0x2F, 0xFC, 0x07}));
   EXPECT_EQ(scan.bitCount, 19u);
   EXPECT_EQ(chainIrScan({{0, "a", 4}}, 0, 0x123).bits, Bytes{0x03});
-  EXPECT_EQ(chainIrScan({{0, "a", 66}}, 0, ~0ull).bits, (Bytes{255, 255, 255, 255, 255, 255, 255, 255, 0}));
+  EXPECT_EQ(chainIrScan({{0, "a", 66}}, 0, ~0ull).bits, (Bytes{255, 255, 255, 255, 255, 255, 255, 255, 3}));
 }
 
 TEST(ChainScan, drScanPutsOnesAroundTheDevicesBitsAndCaptureTakesThemOut) {

@@ -48,7 +48,7 @@ std::string chainSeen(const std::string& idcodes, const std::string& irs) {
   std::string text;
   const std::string thrown = thrownBy([&] {
     std::vector<Qor_Device> devices = QorRT::idcodesIn(behind(idcodes, QorRT::idcodeProbe().bitCount));
-    QorRT::readIrLengths(devices, behind(irs + "0", QorRT::irProbe().bitCount));
+    EXPECT_EQ(QorRT::readIrLengths(devices, behind(irs + "0", QorRT::irProbe().bitCount)), irs.size());
     for (const Qor_Device& device : devices)
       text += QorRT::idcodeText(device.idcode) + "/" + std::to_string(device.irLength) + " ";
   });
@@ -62,7 +62,7 @@ TEST(Probes, TellWhatStandsOnAChainOrHowTdoIsStuck) {
                       "1000"
                       "10000000"),
             "0A5F1093/6 00000000/4 1234567B/8 ");
-  EXPECT_EQ(chainSeen(fpga, "101001"), "0A5F1093/6 ");
+  EXPECT_EQ(chainSeen(fpga, "110011"), "0A5F1093/6 ");
   EXPECT_EQ(chainSeen(fpga + cpld,
                       "101000"
                       "1000"),
@@ -125,6 +125,8 @@ const char* const header =
 const std::string fpgaRow = " 0 fpga.tap               Y     0x0a5f1093 0x0a5f1093     6 0x01  0x03\n";
 const std::string cpldRow = " 1 cpld.tap               Y     0x1234567b 0x1234567a     8 0x01  0x03\n";
 const std::string alsoRow = "                                           0x1234567b\n";
+const std::string versionRow = " 1 cpld.tap               Y     0x5234567b 0x*234567b     8 0x01  0x03\n";
+const std::string anyRow = "                                           0x00000000\n";
 const std::string offRow = " 2 dap.tap                N     0x00000000 0x00000000     4 0x01  0x03\n";
 const std::string autoRow = " 2 auto0.tap              Y     0x4ba00477 0x00000000     4 0x00  0x00\n";
 
@@ -144,6 +146,8 @@ std::string tapsSeen(const std::string& table, const std::vector<std::string>& n
 TEST(TapTables, AreReadRowByRowAndHeldAgainstTheBoard) {
   const std::string both = header + fpgaRow + cpldRow + alsoRow;
   EXPECT_EQ(tapsSeen(both + offRow, {"fpga.tap", ""}), "fpga.tap/0A5F1093/6 cpld.tap/1234567B/8 ");
+  EXPECT_EQ(tapsSeen(header + versionRow), "cpld.tap/5234567B/8 ");
+  EXPECT_EQ(tapsSeen(header + cpldRow + anyRow), "cpld.tap/1234567B/8 ");
   EXPECT_EQ(tapsSeen(header + fpgaRow + cpldRow),
             "runtime: the TAP cpld.tap has the IDCODE 1234567B, not 1234567A");
   EXPECT_EQ(tapsSeen(header + fpgaRow + autoRow),
@@ -177,9 +181,10 @@ TEST(Batches, AreOneCommandWithScansInFields) {
   std::string field;
   for (int i = 0; i < 32; ++i) field += "a5";
   const std::string fields = "drscan b.tap 256 0x" + field + " 4 0x09";
-  EXPECT_EQ(QorRT::procedureOf("p", commands), "proc p {} {if {[catch {set r ok\nirscan b.tap 255\n" +
-                                                   fields + "\nruntest 8\nappend r { } [" + fields +
-                                                   "]\nset r} m]} {set m \"failed $m\"}; set m}");
+  EXPECT_EQ(QorRT::procedureOf("p", "2", commands),
+            "proc p {} {debug_level -3\nif {[catch {set r ok\nirscan b.tap 255\n" + fields +
+                "\nruntest 8\nappend r { } [" + fields +
+                "]\nset r} m]} {set m \"failed $m\"}\ndebug_level 2\nset m}");
 }
 
 std::string read(const std::string& answer, std::size_t bitCount) {
@@ -199,7 +204,7 @@ TEST(Captures, AreReadStrictly) {
   EXPECT_EQ(read("ok " + field + "\n 05\n", 259), "5" + field);
   const std::pair<const char*, const char*> bad[] = {
       {"failed invalid command name", "the server could not run the scans: invalid command name"},
-      {"failed ", "the server could not run the scans"},
+      {"failed ", "the server could not run the scans: has it lost its adapter?"},
       {"", "the server answered \"\""},
       {"ok", "the server answered \"\" where 12 bits were due"},
       {"ok b3", "the server answered \"b3\" where 12 bits were due"},

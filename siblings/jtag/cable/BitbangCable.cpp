@@ -72,8 +72,10 @@ std::vector<WireDevice> BitbangCable::connect() {
   std::vector<Qor_Device> found = idcodesIn(packed(send(idcodes)));
   TckSequence irs;
   irs.scanIr(irProbe(), true);
-  readIrLengths(found, packed(send(irs)));
-  return describedDevices(found, url_.board);
+  const std::size_t irBits = readIrLengths(found, packed(send(irs)));
+  std::vector<WireDevice> devices = describedDevices(found, url_.board);
+  requireIrBits(devices, irBits);
+  return devices;
 }
 
 void BitbangCable::exchange(std::vector<Qor_Scan>& scans) {
@@ -104,7 +106,8 @@ void BitbangCable::append(TckSequence& sequence, const Qor_Scan& scan) const {
 
 // The answers to the captures, without the one that says that all has run.
 std::string BitbangCable::send(const TckSequence& sequence) {
-  std::string answers = stream_->exchange(charactersOf(sequence), sequence.captureCount() + 1);
+  std::string answers =
+      stream_->exchange(charactersOf(sequence), sequence.captureCount() + 1, timeOf(sequence.tcks().size()));
   const std::size_t odd = answers.find_first_not_of("01");
   if (odd != answers.npos) {
     throw std::runtime_error(url_.endpoint.text() + " answered with the byte " +

@@ -67,7 +67,7 @@ ChainScan irProbe() {
   return probe;
 }
 
-void readIrLengths(std::vector<Qor_Device>& devices, const Bytes& captured) {
+std::size_t readIrLengths(std::vector<Qor_Device>& devices, const Bytes& captured) {
   const std::ptrdiff_t total = lastZero(captured);
   if (total <= 0 || total > static_cast<std::ptrdiff_t>(mostIrBits) || !bitAt(captured, 0))
     throw std::runtime_error(
@@ -75,11 +75,12 @@ void readIrLengths(std::vector<Qor_Device>& devices, const Bytes& captured) {
   std::vector<std::size_t> starts;
   for (std::size_t i = 0; i + 1 < static_cast<std::size_t>(total); ++i)
     if (bitAt(captured, i) && !bitAt(captured, i + 1)) starts.push_back(i);
-  if (devices.size() == 1) starts.resize(1);
+  if (devices.size() == 1) starts = {0};
   const bool clear = starts.size() == devices.size() && starts.front() == 0;
   starts.push_back(static_cast<std::size_t>(total));
   for (std::size_t i = 0; i < devices.size(); ++i)
     devices[i].irLength = clear ? static_cast<unsigned>(starts[i + 1] - starts[i]) : 0;
+  return static_cast<std::size_t>(total);
 }
 
 }  // namespace QorRT

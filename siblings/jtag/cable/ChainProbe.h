@@ -26,7 +26,9 @@ QOR_API std::vector<Qor_Device> idcodesIn(const std::vector<unsigned char>& capt
 QOR_API ChainScan irProbe();
 
 /// Sets the IR lengths from its capture, where each device shows a 1 and then a 0 first. When that can be read
-/// in several ways, all are left at 0. Throws runtime_error when the capture is no row of IRs.
-QOR_API void readIrLengths(std::vector<Qor_Device>& devices, const std::vector<unsigned char>& captured);
+/// in several ways, all are left at 0. Returns the bits of all IRs together. Throws runtime_error when the capture
+/// is no row of IRs.
+QOR_API std::size_t readIrLengths(std::vector<Qor_Device>& devices,
+                                  const std::vector<unsigned char>& captured);
 
 }  // namespace QorRT

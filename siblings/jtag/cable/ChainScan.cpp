@@ -41,7 +41,7 @@ ChainScan chainIrScan(const std::vector<Qor_Device>& devices, unsigned device, s
   }
   ChainScan scan = allOnes(total);
   for (std::size_t i = 0; i < devices[device].irLength; ++i)
-    putBits(scan.bits, first + i, i < 64 ? static_cast<unsigned>(opcode >> i & 1) : 0, 1);
+    putBits(scan.bits, first + i, static_cast<unsigned>(opcode >> std::min<std::size_t>(i, 63) & 1), 1);
   return scan;
 }
 

@@ -25,7 +25,7 @@ struct ChainScan {
 };
 
 /// The IR scan that gives one device an opcode (the low bits of `opcode`, as many as its IR has; an IR longer
-/// than 64 bits gets zeros above them) and all others BYPASS, which is all ones.
+/// than 64 bits gets the highest of them above) and all others BYPASS, which is all ones.
 QOR_API ChainScan chainIrScan(const std::vector<Qor_Device>& devices, unsigned device, std::uint64_t opcode);
 
 /// The DR scan whose last `bitCount` bits in the device's register are `out`, with all other devices in

@@ -15,9 +15,6 @@ constexpr char endOfText = 0x1A;
 // A command of several megabytes is never answered.
 constexpr std::size_t longestCommand = 1 << 20;
 
-// Slower adapters than this, in TCKs a second, are not waited for.
-constexpr double slowestTck = 20000;
-
 std::size_t tcksOf(const Qor_Scan& scan) {
   return scan.kind == Qor_Scan::Kind::idle ? scan.cycles : scan.bitCount + 32;
 }
@@ -59,7 +56,7 @@ OpenOcdCable::OpenOcdCable(WireUrl url)
 
 OpenOcdCable::~OpenOcdCable() {
   try {
-    if (stream_ && !server_) ask("catch {rename " + procedure_ + " {}}; debug_level " + logLevel_);
+    if (stream_ && !server_) ask("catch {rename " + procedure_ + " {}}");
   } catch (const std::exception&) {  // the server has gone first
   }
 }
@@ -74,7 +71,7 @@ void OpenOcdCable::disconnect() noexcept {
 std::vector<WireDevice> OpenOcdCable::connect() {
   stream_ = reach();
   try {
-    silenceLog();
+    readLogLevel();
     taps_ = tapsIn(ask("capture scan_chain"));
   } catch (const std::runtime_error&) {
     if (server_) server_->requireRunning();
@@ -90,14 +87,11 @@ std::unique_ptr<TcpStream> OpenOcdCable::reach() {
   return server_->connect(url_.timeout);
 }
 
-// The level is asked for once: after a lost connection it is what this cable has set.
-void OpenOcdCable::silenceLog() {
-  if (logLevel_.empty()) {
-    const std::string answer = ask("debug_level");
-    const std::size_t digits = std::min(answer.find_first_of("-0123456789"), answer.size());
-    logLevel_ = answer.substr(digits, answer.find_first_not_of("-0123456789", digits) - digits);
-  }
-  ask("debug_level -3");
+void OpenOcdCable::readLogLevel() {
+  constexpr const char* digits = "-0123456789";
+  const std::string answer = ask("debug_level");
+  const std::size_t first = std::min(answer.find_first_of(digits), answer.size());
+  logLevel_ = answer.substr(first, answer.find_first_not_of(digits, first) - first);
 }
 
 void OpenOcdCable::exchange(std::vector<Qor_Scan>& scans) {
@@ -122,12 +116,11 @@ void OpenOcdCable::exchange(std::vector<Qor_Scan>& scans) {
 std::string OpenOcdCable::commandFor(const std::string& commands) {
   if (commands == known_) return procedure_;
   known_ = commands;
-  return procedureOf(procedure_, commands) + "\n" + procedure_;
+  return procedureOf(procedure_, logLevel_, commands) + "\n" + procedure_;
 }
 
 std::string OpenOcdCable::ask(const std::string& command, std::size_t tcks) {
-  return stream_->ask(command + endOfText, endOfText,
-                      TcpStream::Seconds(static_cast<double>(tcks) / slowestTck));
+  return stream_->ask(command + endOfText, endOfText, timeOf(tcks));
 }
 
 }  // namespace QorRT

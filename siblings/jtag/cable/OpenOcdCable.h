@@ -14,7 +14,6 @@
 namespace QorRT {
 
 /// A queue is one command, so that nobody else's come between; only one far above a megabyte goes in several.
-/// The server's log is silenced while the cable is connected: it would hold every scan.
 class QOR_API OpenOcdCable : public WireCable {
  public:
   /// The server at the endpoint of the URL, or one of our own for its configuration file. Throws runtime_error
@@ -29,12 +28,12 @@ class QOR_API OpenOcdCable : public WireCable {
   std::unique_ptr<TcpStream> reach();
   std::string commandFor(const std::string& commands);
   std::string ask(const std::string& command, std::size_t tcks = 0);
-  void silenceLog();
+  void readLogLevel();
 
   WireUrl url_;
   std::unique_ptr<OpenOcdServer> server_;  // null for one that is not ours
   std::unique_ptr<TcpStream> stream_;      // null without a connection
-  std::string logLevel_;                   // what the log is set back to
+  std::string logLevel_;                   // of the server's log, between our commands
   std::vector<OpenOcdTap> taps_;
   std::string procedure_;  // its name: nobody else's on this server
   std::string known_;      // what it does there; empty when it is not there

@@ -6,6 +6,7 @@
 #include <sys/wait.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <array>
 #include <cerrno>
 #include <chrono>
@@ -18,18 +19,54 @@ namespace {
 
 using std::chrono::milliseconds, std::chrono::steady_clock;
 
-constexpr milliseconds glance{20}, lastWords{200}, farewell{500};
+constexpr milliseconds glance{20}, startUp{10000}, lastWords{200}, farewell{1500};
 
 [[noreturn]] void fail(const std::string& what, int error) {
   throw std::runtime_error(what + ": " + std::generic_category().message(error));
 }
 
-struct SpawnActions {
-  SpawnActions() { posix_spawn_file_actions_init(&actions); }
-  ~SpawnActions() { posix_spawn_file_actions_destroy(&actions); }
-  SpawnActions(const SpawnActions&) = delete;
-  SpawnActions& operator=(const SpawnActions&) = delete;
-  posix_spawn_file_actions_t actions{};
+// Runs openocd with its arguments until it ends, or until nobody holds the other end of the pipe at 3 any more: so
+// that it ends with its host, however that ends.
+constexpr const char* keeper = R"(
+trap "" INT QUIT
+openocd "$@" 3<&- &
+server=$!
+{ read -r _; kill $server; sleep 0.5; kill -9 $server; } <&3 >/dev/null 2>&1 &
+watch=$!
+wait $server
+kill -9 $watch
+)";
+
+/// What the new process gets instead of what its host has: files, signals.
+class SpawnSettings {
+ public:
+  SpawnSettings(int log, int pipe) {
+    posix_spawn_file_actions_init(&files_);
+    posix_spawn_file_actions_addopen(&files_, STDIN_FILENO, "/dev/null", O_RDONLY, 0);
+    posix_spawn_file_actions_adddup2(&files_, log, STDOUT_FILENO);
+    posix_spawn_file_actions_adddup2(&files_, log, STDERR_FILENO);
+    posix_spawn_file_actions_adddup2(&files_, pipe, 3);
+    posix_spawnattr_init(&attributes_);
+    sigset_t none, all;
+    sigemptyset(&none);
+    sigfillset(&all);
+    posix_spawnattr_setsigmask(&attributes_, &none);
+    posix_spawnattr_setsigdefault(&attributes_, &all);
+    posix_spawnattr_setflags(&attributes_, POSIX_SPAWN_SETSIGMASK | POSIX_SPAWN_SETSIGDEF);
+  }
+  ~SpawnSettings() {
+    posix_spawnattr_destroy(&attributes_);
+    posix_spawn_file_actions_destroy(&files_);
+  }
+  SpawnSettings(const SpawnSettings&) = delete;
+  SpawnSettings& operator=(const SpawnSettings&) = delete;
+
+  const posix_spawn_file_actions_t* files() const { return &files_; }
+  const posix_spawnattr_t* attributes() const { return &attributes_; }
+
+ private:
+  posix_spawn_file_actions_t files_{};
+  posix_spawnattr_t attributes_{};
 };
 
 // Quoted for Tcl, whatever the name is.
@@ -42,36 +79,41 @@ std::string quoted(const std::string& text) {
   return result + '"';
 }
 
+// The arguments as the system wants them.
+template <std::size_t count>
+int spawnShell(pid_t& process, const SpawnSettings& settings, std::array<std::string, count> arguments) {
+  std::array<char*, count + 1> pointers{};
+  std::transform(arguments.begin(), arguments.end(), pointers.begin(),
+                 [](std::string& each) { return each.data(); });
+  return posix_spawn(&process, "/bin/sh", settings.files(), settings.attributes(), pointers.data(), environ);
+}
+
 }  // namespace
 
 OpenOcdServer::OpenOcdServer(const std::string& configFile) : log_(std::tmpfile()) {
   if (!log_) fail("no temporary file", errno);
   fcntl(fileno(log_.get()), F_SETFL, O_APPEND);  // the server shares our place in it
-  std::string source = "source " + quoted(configFile);
-  std::string ports = "bindto 127.0.0.1; telnet_port disabled; gdb_port disabled; tcl_port 0";
-  std::string name = "openocd", command = "-c";
-  const std::array<char*, 6> arguments{name.data(),    command.data(), source.data(),
-                                       command.data(), ports.data(),   nullptr};
-  SpawnActions spawn;
-  posix_spawn_file_actions_addopen(&spawn.actions, STDIN_FILENO, "/dev/null", O_RDONLY, 0);
-  posix_spawn_file_actions_adddup2(&spawn.actions, fileno(log_.get()), STDOUT_FILENO);
-  posix_spawn_file_actions_adddup2(&spawn.actions, fileno(log_.get()), STDERR_FILENO);
-  const int error = posix_spawnp(&process_, name.c_str(), &spawn.actions, nullptr, arguments.data(), environ);
-  if (error != 0) fail("openocd cannot be started", error);
+  std::array<int, 2> ends{};
+  if (pipe2(ends.data(), O_CLOEXEC) != 0) fail("no pipe", errno);
+  const std::string ports = "bindto 127.0.0.1; telnet_port disabled; gdb_port disabled; tcl_port 0";
+  const SpawnSettings settings(fileno(log_.get()), ends[0]);
+  const int error = spawnShell<8>(
+      process_, settings, {"sh", "-c", keeper, "openocd", "-c", ports, "-c", "source " + quoted(configFile)});
+  close(ends[0]);
+  lifeline_ = ends[1];
+  if (error == 0) return;
+  close(lifeline_);
+  fail("openocd cannot be started", error);
 }
 
 OpenOcdServer::~OpenOcdServer() {
-  if (!runs()) return;
-  kill(process_, SIGTERM);
+  close(lifeline_);
   const auto end = steady_clock::now() + farewell;
   while (runs() && steady_clock::now() < end) std::this_thread::sleep_for(glance);
-  if (process_ < 0) return;
-  kill(process_, SIGKILL);
-  waitpid(process_, nullptr, 0);
 }
 
 std::unique_ptr<TcpStream> OpenOcdServer::connect(TcpStream::Seconds patience) {
-  const auto end = steady_clock::now() + std::chrono::duration_cast<steady_clock::duration>(patience);
+  const auto end = steady_clock::now() + startUp;
   while (runs()) {
     if (const std::string port = tclPort(); !port.empty())
       return std::make_unique<TcpStream>(Endpoint{"127.0.0.1", port}, patience);
@@ -88,8 +130,9 @@ void OpenOcdServer::requireRunning() {
   if (!runs()) throw std::runtime_error("openocd has ended; it says: " + errors());
 }
 
+// A host that ignores SIGCHLD has nobody to wait for: that tells the same.
 bool OpenOcdServer::runs() {
-  if (process_ >= 0 && waitpid(process_, nullptr, WNOHANG) == process_) process_ = -1;
+  if (process_ >= 0 && waitpid(process_, nullptr, WNOHANG) != 0) process_ = -1;
   return process_ >= 0;
 }
 

@@ -13,8 +13,8 @@
 
 namespace QorRT {
 
-/// Runs from its construction to its destruction, with its Tcl port on a free loopback port and its other ports
-/// closed.
+/// Runs from its construction to its destruction, or to the end of this process, whichever way it ends. Its Tcl port
+/// is a free loopback port, its other ports are closed, unless the configuration sets them.
 class QOR_API OpenOcdServer {
  public:
   /// Throws runtime_error when no server can be started. What is wrong with the configuration file shows when
@@ -25,7 +25,7 @@ class QOR_API OpenOcdServer {
   OpenOcdServer& operator=(const OpenOcdServer&) = delete;
 
   /// A connection to its Tcl port, as soon as it takes one. Throws runtime_error, with the last errors of the
-  /// server's log, when it ends instead, or when `patience` passes first.
+  /// server's log, when it ends instead, or when it takes too long. `patience` is the connection's.
   std::unique_ptr<TcpStream> connect(TcpStream::Seconds patience);
 
   /// After a broken connection: throws, as connect() does, when the server has ended or ends now.
@@ -44,7 +44,8 @@ class QOR_API OpenOcdServer {
   };
 
   std::unique_ptr<std::FILE, CloseFile> log_;  // has no name, and goes with us
-  pid_t process_ = -1;
+  int lifeline_ = -1;   // of a pipe: the server ends when it is closed, by us or by our end
+  pid_t process_ = -1;  // of the shell that keeps the server; -1 when it has ended
 };
 
 }  // namespace QorRT

@@ -43,10 +43,16 @@ bool isRow(const std::vector<std::string>& words) {
   return words.size() == rowWords && (words[2] == "Y" || words[2] == "N");
 }
 
+// "0x0a5f1093", or "0x*a5f1093" when the version does not matter; 0 stands for any.
+ExpectedIdcode expectedOf(const std::string& text) {
+  const bool anyVersion = text.rfind("0x*", 0) == 0;
+  const unsigned idcode = number(anyVersion ? "0x0" + text.substr(3) : text, 16);
+  const unsigned mask = anyVersion ? 0x0FFFFFFF : 0xFFFFFFFF;
+  return {idcode, idcode == 0 ? 0 : mask};
+}
+
 OpenOcdTap tapOf(const std::vector<std::string>& row) {
-  OpenOcdTap tap{row[1], number(row[3], 16), {}, number(row[5], 10)};
-  if (const unsigned expected = number(row[4], 16); expected != 0) tap.expected.push_back(expected);
-  return tap;
+  return {row[1], number(row[3], 16), {expectedOf(row[4])}, number(row[5], 10)};
 }
 
 std::string namesOf(const std::vector<OpenOcdTap>& taps) {
@@ -55,22 +61,31 @@ std::string namesOf(const std::vector<OpenOcdTap>& taps) {
   return names;
 }
 
-std::string anyOf(const std::vector<unsigned>& idcodes) {
+std::string anyOf(const std::vector<ExpectedIdcode>& expected) {
   std::string text;
-  for (const unsigned idcode : idcodes) text.append(text.empty() ? "" : " or ").append(idcodeText(idcode));
+  for (const ExpectedIdcode& each : expected) {
+    const std::string digits = idcodeText(each.idcode);
+    text += text.empty() ? "" : " or ";
+    text += each.mask == 0xFFFFFFFF ? digits : "*" + digits.substr(1);
+  }
   return text;
+}
+
+bool isExpected(const OpenOcdTap& tap) {
+  return std::any_of(tap.expected.begin(), tap.expected.end(), [&](const ExpectedIdcode& each) {
+    return ((tap.idcode ^ each.idcode) & each.mask) == 0;
+  });
 }
 
 // The server names what it finds behind the TAPs of its configuration "auto0.tap" and so on.
 bool isUnnamed(const OpenOcdTap& tap) {
-  return tap.expected.empty() && std::regex_match(tap.name, std::regex(R"(auto\d+\.tap)"));
+  return tap.expected.front().mask == 0 && std::regex_match(tap.name, std::regex(R"(auto\d+\.tap)"));
 }
 
 void requireAnswer(const OpenOcdTap& tap) {
-  const auto& expected = tap.expected;
-  if (!expected.empty() && std::find(expected.begin(), expected.end(), tap.idcode) == expected.end())
+  if (!isExpected(tap))
     throw std::runtime_error("the TAP " + tap.name + " has the IDCODE " + idcodeText(tap.idcode) + ", not " +
-                             anyOf(expected));
+                             anyOf(tap.expected));
   if (isUnnamed(tap)) {
     throw std::runtime_error(
         "the chain has a device that the server's configuration does not name: " + tap.name + ", IDCODE " +
@@ -118,7 +133,7 @@ unsigned digitValue(char digit) {
 // What the server says of a failure, which may be nothing.
 std::string detail(const std::string& said) {
   const std::size_t first = said.find_first_not_of(blanks);
-  return first == said.npos ? "" : ": " + said.substr(first, 200);
+  return ": " + (first == said.npos ? "has it lost its adapter?" : said.substr(first, 200));
 }
 
 // Digits to the end of a byte or no further than the bits go; no bit above them is set.
@@ -144,7 +159,7 @@ std::vector<OpenOcdTap> tapsIn(const std::string& table) {
       enabled = words[2] == "Y";
       if (enabled) taps.push_back(tapOf(words));
     } else if (words.size() == 1 && words[0].rfind("0x", 0) == 0 && enabled) {
-      taps.back().expected.push_back(number(words[0], 16));  // one more that will do
+      taps.back().expected.push_back(expectedOf(words[0]));  // one more that will do
     }
   }
   if (taps.empty()) throw std::runtime_error("the server has no TAP on its scan chain");
@@ -175,9 +190,9 @@ void appendStep(std::string& commands, const std::vector<OpenOcdTap>& taps,
   }
 }
 
-std::string procedureOf(const std::string& name, const std::string& commands) {
-  return "proc " + name + " {} {if {[catch {set r ok\n" + commands +
-         "set r} m]} {set m \"failed $m\"}; set m}";
+std::string procedureOf(const std::string& name, const std::string& logLevel, const std::string& commands) {
+  return "proc " + name + " {} {debug_level -3\nif {[catch {set r ok\n" + commands +
+         "set r} m]} {set m \"failed $m\"}\ndebug_level " + logLevel + "\nset m}";
 }
 
 CaptureReader::CaptureReader(std::string answer) : answer_(std::move(answer)) {

@@ -11,12 +11,18 @@
 
 namespace QorRT {
 
+/// An IDCODE that the server's configuration names; bits that the mask leaves out may be anything.
+struct ExpectedIdcode {
+  unsigned idcode = 0;
+  unsigned mask = 0;
+};
+
 /// One TAP of the server's chain.
 struct OpenOcdTap {
   std::string name;
-  unsigned idcode = 0;             ///< as the server read it when it started; 0 for none
-  std::vector<unsigned> expected;  ///< any of them will do; empty for any
-  unsigned irLength = 0;           ///< bits
+  unsigned idcode = 0;                   ///< as the server read it when it started; 0 for none
+  std::vector<ExpectedIdcode> expected;  ///< one of them will do
+  unsigned irLength = 0;                 ///< bits
 };
 
 /// The enabled TAPs in the server's table of its scan chain, the one nearest to TDO first. Throws runtime_error
@@ -31,8 +37,10 @@ QOR_API void requireTaps(const std::vector<OpenOcdTap>& taps, const std::vector<
 QOR_API void appendStep(std::string& commands, const std::vector<OpenOcdTap>& taps,
                         const std::vector<WireDevice>& devices, const Qor_Scan& scan);
 
-/// Puts commands of appendStep() into a procedure that answers "ok" and every capture, or what failed.
-QOR_API std::string procedureOf(const std::string& name, const std::string& commands);
+/// Puts commands of appendStep() into a procedure that answers "ok" and every capture, or what failed. The server's
+/// log, which would hold every scan, is silent meanwhile, and then has `logLevel` again.
+QOR_API std::string procedureOf(const std::string& name, const std::string& logLevel,
+                                const std::string& commands);
 
 /// The captures in the answer of such a procedure, taken in order. Throws runtime_error for whatever is no such answer.
 class QOR_API CaptureReader {

@@ -99,14 +99,14 @@ TcpStream::~TcpStream() {
   close(socket_);
 }
 
-std::string TcpStream::exchange(std::string_view out, std::size_t count) {
+std::string TcpStream::exchange(std::string_view out, std::size_t count, Seconds extra) {
   std::string in;
   while (!out.empty() || in.size() < count) {
     short ready = 0;
     const auto events = static_cast<short>(out.empty() ? POLLIN : POLLIN | POLLOUT);
-    if (!waitFor(socket_, events, patience_, ready))
+    if (!waitFor(socket_, events, patience_ + extra, ready))
       fail("gave " + std::to_string(in.size()) + " of " + std::to_string(count) +
-           " answers, then nothing for " + secondsText(patience_));
+           " answers, then nothing for " + secondsText(patience_ + extra));
     if ((ready & POLLOUT) != 0) out.remove_prefix(sendSome(out));
     if ((ready & ~POLLOUT) != 0 && !receiveSome(in))
       fail("closed the connection after " + std::to_string(in.size()) + " of " + std::to_string(count) +

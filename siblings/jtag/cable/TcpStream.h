@@ -30,8 +30,9 @@ class QOR_API TcpStream {
   TcpStream(const TcpStream&) = delete;
   TcpStream& operator=(const TcpStream&) = delete;
 
-  /// Sends `out` and meanwhile receives until `count` bytes have come; more than that is a failure.
-  std::string exchange(std::string_view out, std::size_t count);
+  /// Sends `out` and meanwhile receives until `count` bytes have come; more than that is a failure. `extra` is
+  /// added to the patience.
+  std::string exchange(std::string_view out, std::size_t count, Seconds extra = Seconds(0));
 
   /// Sends `out`, then receives up to the first `end`, which is not returned; `extra` is added to the patience.
   /// Anything behind it is a failure.

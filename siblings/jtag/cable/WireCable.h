@@ -7,12 +7,13 @@
 
 #include "QorExport.h"
 #include "Qor_Cable.h"
+#include "TcpStream.h"
 #include "WireDevice.h"
 
 namespace QorRT {
 
 /// A failure ends the connection; the next queue connects first, and fails when another chain stands there than
-/// when the cable was opened.
+/// when the cable was opened (as far as its server has looked since).
 class QOR_API WireCable : public Qor_Cable {
  public:
   const std::vector<Qor_Device>& devices() const override { return heads_; }
@@ -20,6 +21,11 @@ class QOR_API WireCable : public Qor_Cable {
  protected:
   /// For the constructor of a cable that can connect.
   void open();
+
+  /// How long so many TCKs may take, on the slowest adapter that is waited for.
+  static TcpStream::Seconds timeOf(std::size_t tcks) {
+    return TcpStream::Seconds(static_cast<double>(tcks) / 20000);
+  }
 
   /// What stands on the chain, with the opcodes of its user registers.
   const std::vector<WireDevice>& wireDevices() const { return devices_; }

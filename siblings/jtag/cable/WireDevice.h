@@ -39,6 +39,9 @@ QOR_API std::vector<DeviceEntry> boardDevicesOf(const std::string& text, const s
 QOR_API std::vector<WireDevice> describedDevices(const std::vector<Qor_Device>& found,
                                                  const std::vector<DeviceEntry>& entries);
 
+/// Throws runtime_error when the IR lengths do not add up to what the chain has.
+QOR_API void requireIrBits(const std::vector<WireDevice>& devices, std::size_t bitCount);
+
 /// "0A5F1093".
 QOR_API std::string idcodeText(unsigned idcode);
 
