@@ -101,6 +101,10 @@ CORE   TYPE    VERSION  ASYNC OUT  SYNC OUT  ASYNC IN  SYNC IN
   fails 2 "a pulse must begin and end within 16 steps, the last of them low: steps 10 to 15" \
     pulse 'sync_out_data[5]' --at 10 --width 6
   fails 2 "not a core address DEVICE.CHAIN.INDEX: 0.1" --core 0.1 info
+  fails 2 "too short a time to record: --for 0.0001us" record --for 0.0001us --out short.csv
+  fails 2 "a rate is 0.001 to 1000000000 a second: nan" record --samples 1 --rate nan --out never.csv
+  fails 2 "a rate is 0.001 to 1000000000 a second: 1e-12" play never.csv --rate 1e-12
+  fails 2 "a rate is 0.01 to 1000 a second: 2000" watch --rate 2000
   fails 2 "no such command: frob" frob
   signals_file
   sed -i 's/"async_in"/"asynk_in"/' bench.toml

@@ -1,6 +1,7 @@
 #include "Duration.h"
 
 #include <charconv>
+#include <cstdio>
 #include <string_view>
 #include <utility>
 
@@ -20,6 +21,13 @@ std::chrono::nanoseconds parseDuration(const std::string& text) {
     return std::chrono::nanoseconds(static_cast<std::int64_t>(number * nanoseconds));
   }
   throw WrongUse("not a time such as 100ms, 10s or 2m: " + text);
+}
+
+std::chrono::nanoseconds periodOf(double rate, double fewest, double most) {
+  if (rate >= fewest && rate <= most) return std::chrono::nanoseconds(static_cast<std::int64_t>(1e9 / rate));
+  char text[100];
+  std::snprintf(text, sizeof text, "a rate is %.10g to %.10g a second: %g", fewest, most, rate);
+  throw WrongUse(text);
 }
 
 }  // namespace tool

@@ -3,6 +3,7 @@
 #include <cstdio>
 
 #include "Commands.h"
+#include "Duration.h"
 #include "Errors.h"
 #include "PlayScript.h"
 #include "Stop.h"
@@ -29,8 +30,7 @@ struct Played {
 // When a row is due, from the start on; 0 when it is to be sent as soon as the cable is free.
 class Timing {
  public:
-  Timing(const PlayScript& script, double rate)
-      : script_(script), period_(rate == 0 ? 0 : static_cast<std::int64_t>(1e9 / rate)) {}
+  Timing(const PlayScript& script, nanoseconds period) : script_(script), period_(period) {}
 
   bool isAsap() const { return !script_.hasTimes() && period_.count() == 0; }
   nanoseconds due(std::size_t row) const {
@@ -90,12 +90,11 @@ void print(const Played& played, bool isTimed, bool asJson) {
 }
 
 void play(Context& context, const PlayOptions& options) {
-  if (options.rate < 0 || options.rate > 1e9)
-    throw WrongUse("not a rate in hertz: " + std::to_string(options.rate));
+  const nanoseconds period = options.rate == 0 ? nanoseconds(0) : periodOf(options.rate, 0.001, 1e9);
   const PlayScript script = readPlayScript(options.file, context.signals());
   if (script.hasTimes() && options.rate != 0)
     throw WrongUse("the rows have times of their own and take no --rate: " + options.file);
-  const Timing timing(script, options.rate);
+  const Timing timing(script, period);
   const Played played = playRows(context.core(), script, timing);
   if (context.settings.json || !context.settings.quiet)
     print(played, !timing.isAsap(), context.settings.json);

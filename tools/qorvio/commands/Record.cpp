@@ -23,12 +23,12 @@ struct RecordOptions {
 Limits limitsOf(const RecordOptions& options) {
   if ((options.samples != 0) == !options.time.empty())
     throw WrongUse("one of --samples and --for says how much to record: record " + options.out);
-  if (options.rate < 0 || options.rate > 1e9)
-    throw WrongUse("not a rate in hertz: " + std::to_string(options.rate));
   Limits limits;
   limits.samples = options.samples;
   if (!options.time.empty()) limits.time = parseDuration(options.time);
-  if (options.rate != 0) limits.period = nanoseconds(static_cast<std::int64_t>(1e9 / options.rate));
+  if (limits.samples == 0 && limits.time.count() == 0)  // which would be no limit
+    throw WrongUse("too short a time to record: --for " + options.time);
+  if (options.rate != 0) limits.period = periodOf(options.rate, 0.001, 1e9);
   return limits;
 }
 

@@ -3,6 +3,7 @@
 #include <cstdio>
 
 #include "Commands.h"
+#include "Duration.h"
 #include "Errors.h"
 #include "InputJson.h"
 #include "InputWatch.h"
@@ -22,12 +23,6 @@ struct WatchOptions {
   double rate = 10;
   std::uint64_t frames = 0;
 };
-
-Clock::duration periodOf(const WatchOptions& options) {
-  if (!(options.rate >= 0.01) || options.rate > 1000)
-    throw WrongUse("a rate is 0.01 to 1000 frames a second: " + std::to_string(options.rate));
-  return std::chrono::duration_cast<Clock::duration>(std::chrono::duration<double>(1 / options.rate));
-}
 
 // When frames are due: at the rate, or later where the link is slower.
 class Frames {
@@ -181,7 +176,7 @@ void printJson(InputWatch& watch, Frames& frames) {
 }
 
 void runWatch(Context& context, const WatchOptions& options) {
-  const Clock::duration period = periodOf(options);
+  const Clock::duration period = periodOf(options.rate, 0.01, 1000);
   InputWatch watch(context.core(), context.signals().select(options.names, Direction::input));
   Frames frames(period, options.frames);
   if (context.settings.json) return printJson(watch, frames);
