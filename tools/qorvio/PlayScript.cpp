@@ -60,6 +60,7 @@ class Reader {
                       given = fields.size() - std::min(firstValue_, fields.size());
     if (given != wanted)
       throw WrongUse(std::to_string(given) + " values for " + std::to_string(wanted) + " outputs");
+    if (firstValue_ == 2 && areEmpty(fields)) return;  // the end of a recording that missed its last polls
     if (isTimed_) readTime(fields.front());
     std::vector<Bytes> row;
     row.reserve(wanted);
@@ -69,6 +70,11 @@ class Reader {
   }
 
  private:
+  bool areEmpty(const Fields& fields) const {
+    return std::all_of(fields.begin() + static_cast<std::ptrdiff_t>(firstValue_), fields.end(),
+                       [](const std::string& field) { return field.empty(); });
+  }
+
   Fields valuesOf(const Fields& fields) const {
     return {fields.begin() + static_cast<std::ptrdiff_t>(firstValue_), fields.end()};
   }

@@ -87,17 +87,27 @@ class CsvWriter : public SampleWriter {
 
   void add(const Poll& poll) override {
     for (std::size_t i : poll.changed) set(i, poll.values[i]);
-    appendSeconds(file_.text(), poll.nanoseconds);
-    file_.text() += ',';
-    file_.text() += std::to_string(poll.missed);
+    appendPlace(poll.nanoseconds, poll.missed);
     file_.text() += row_.line();
     file_.text() += '\n';
     file_.spill();
   }
 
+  // A line whose cells are empty.
+  void addMissed(std::uint64_t nanoseconds, std::uint64_t missed) override {
+    appendPlace(nanoseconds, missed);
+    file_.text().append(signals_.size(), ',') += '\n';
+  }
+
   void end() override { file_.close(); }
 
  private:
+  void appendPlace(std::uint64_t nanoseconds, std::uint64_t missed) {
+    appendSeconds(file_.text(), nanoseconds);
+    file_.text() += ',';
+    file_.text() += std::to_string(missed);
+  }
+
   void set(std::size_t i, const Bytes& value) {
     cell_.clear();
     appendShown(cell_, signals_[i], value);
@@ -121,18 +131,27 @@ class JsonLinesWriter : public SampleWriter {
 
   void add(const Poll& poll) override {
     for (std::size_t i : poll.changed) set(i, poll.values[i]);
-    file_.text() += "{\"time_s\":";
-    appendSeconds(file_.text(), poll.nanoseconds);
-    file_.text() += ",\"missed\":";
-    file_.text() += std::to_string(poll.missed);
+    appendPlace(poll.nanoseconds, poll.missed);
     file_.text() += row_.line();
     file_.text() += "}\n";
     file_.spill();
   }
 
+  void addMissed(std::uint64_t nanoseconds, std::uint64_t missed) override {
+    appendPlace(nanoseconds, missed);
+    file_.text() += "}\n";
+  }
+
   void end() override { file_.close(); }
 
  private:
+  void appendPlace(std::uint64_t nanoseconds, std::uint64_t missed) {
+    file_.text() += "{\"time_s\":";
+    appendSeconds(file_.text(), nanoseconds);
+    file_.text() += ",\"missed\":";
+    file_.text() += std::to_string(missed);
+  }
+
   void set(std::size_t i, const Bytes& value) {
     cell_ = '"';
     appendShown(cell_, signals_[i], value);

@@ -53,6 +53,8 @@ class SampleWriter {
   virtual ~SampleWriter() = default;
   virtual void begin(const std::vector<Signal>& signals, const std::string& core) = 0;
   virtual void add(const Poll& poll) = 0;
+  /// Polls that should have been between the last one and this time, the end of the recording; at least one.
+  virtual void addMissed(std::uint64_t nanoseconds, std::uint64_t missed) = 0;
   virtual void end() = 0;
 };
 

@@ -44,6 +44,13 @@ class VcdWriter : public SampleWriter {
     file_.spill();
   }
 
+  void addMissed(std::uint64_t nanoseconds, std::uint64_t count) override {
+    if (!isFirst_ && nanoseconds > last_ + 1) missing();
+    file_.text() += '#' + std::to_string(nanoseconds) + '\n';
+    missed(count);
+    last_ = nanoseconds;
+  }
+
   void end() override {
     file_.text() += "#" + std::to_string(last_ + 1) + "\n";
     file_.close();
