@@ -1,5 +1,7 @@
 # doctor and play, as typed. Needs QORVIO, the tool.
 
+load processes
+
 setup() {
   cd "$BATS_TEST_TMPDIR" || exit 1
   unset QORVIO_CABLE QORVIO_CORE QORVIO_SIGNALS
@@ -82,20 +84,12 @@ CASES
   [ "$output" = "qorvio: the rows have times of their own and take no --rate: twice.csv" ]
 }
 
-catches_int() {  # catches_int PID
-  (((0x$(awk '/^SigCgt/ { print $2 }' "/proc/$1/status") & 2) != 0))
-}
-
 @test "Ctrl-C ends play between two rows" {
   printf 'time_s,sync_out_data\n0,1\n3600,2\n' >long.csv
-  "$QORVIO" play long.csv >told &
-  local pid=$!
-  until [[ $(cat /proc/$pid/comm) == qorvio ]] && catches_int $pid; do sleep 0.05; done
-  for try in {1..50}; do
-    kill -INT $pid 2>/dev/null || break
-    sleep 0.1
-  done
-  kill -KILL $pid 2>/dev/null && return 1
+  "$QORVIO" play long.csv >told 3>&- &
+  pid=$!
+  catches_interrupt
+  kill -INT $pid
   wait $pid
   [[ $(cat told) == [01]" rows in "[01]" exchanges, 0 late" ]]
 }

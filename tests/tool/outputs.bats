@@ -1,6 +1,6 @@
-# What stays of outputs when a command ends. Needs QORVIO_LOSSY, the tool on a board that goes down with exchange N.
+# What stays of outputs when a command ends. Needs QORVIO_LOSSY, the tool on a board that goes down after N exchanges.
 
-setup_file() { export BATS_TEST_TIMEOUT=30; }
+load processes
 
 setup() {
   cd "$BATS_TEST_TMPDIR" || exit 1
@@ -8,27 +8,16 @@ setup() {
   export XDG_STATE_HOME=$PWD QORVIO_CORE=0.1.0 QORVIO_CABLE=lossy:6
 }
 
-teardown() { [ -z "$pid" ] || kill -KILL "$pid" 2>/dev/null || true; }
-
 remembers() {  # remembers ASYNC SYNC: what the file holds, which is the only one in its folder
   cat qorvio/*
   [ "$(cat qorvio/*)" = "{\"async_out\":\"$1\",\"sync_out\":\"$2\"}" ]
-}
-
-catches_interrupt() {  # catches_interrupt PID: within ten seconds
-  local try
-  for try in {1..100}; do
-    grep -q '^SigCgt:.*[2367abef]$' "/proc/$1/status" && return
-    sleep 0.1
-  done
-  return 1
 }
 
 @test "an interrupted press releases its output, and leaves alone what others gave meanwhile" {
   "$QORVIO_LOSSY" write async_out_data=FF
   "$QORVIO_LOSSY" --json press 'async_out_data[0]' --for 1h >told 3>&- &
   pid=$!
-  catches_interrupt $pid
+  catches_interrupt
   "$QORVIO_LOSSY" toggle 'async_out_data[3]'
   remembers F7 00
   kill -INT $pid

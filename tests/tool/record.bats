@@ -1,5 +1,7 @@
 # Recordings, read back by programs that are not ours. Needs QORVIO, the tool; vcd2fst and fst2vcd.
 
+load processes
+
 setup() {
   cd "$BATS_TEST_TMPDIR" || exit 1
   unset QORVIO_CABLE QORVIO_CORE QORVIO_SIGNALS
@@ -45,9 +47,9 @@ counted() {
 }
 
 @test "Ctrl-C ends a recording whose file is whole" {
-  "$QORVIO" --core 1.1.0 record --for 1h --rate 100 --out long.csv >told &
-  local pid=$!
-  until [ -e long.csv ]; do sleep 0.05; done
+  "$QORVIO" --core 1.1.0 record --for 1h --rate 100 --out long.csv >told 3>&- &
+  pid=$!
+  catches_interrupt
   sleep 0.3
   kill -INT $pid
   wait $pid

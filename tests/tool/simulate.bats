@@ -1,16 +1,16 @@
 # A simulated board for a program that is not ours. Needs QORVIO, the tool; openocd, jq.
 
+load processes
+
 setup() {
   cd "$BATS_TEST_TMPDIR" || exit 1
   unset QORVIO_CABLE QORVIO_CORE QORVIO_SIGNALS
 }
 
-teardown() { [ -z "${pid:-}" ] || kill "$pid"; }
-
 serve() {  # serve ARGUMENTS: starts the board, and waits until it tells where
-  "$QORVIO" simulate "$@" >told 2>wrong &
+  "$QORVIO" simulate "$@" >told 2>wrong 3>&- &
   pid=$!
-  until [ -s told ]; do kill -0 $pid && sleep 0.05; done
+  tells told
 }
 
 scan() {  # scan PORT COMMAND...: what OpenOCD prints
