@@ -24,37 +24,38 @@ struct ScreenCase {
 };
 
 TEST(Screen, WritesTheLinesThatDiffer) {
-  const std::string changedTwo = "\033[2;1Htwo!\033[K";
+  const std::string changedTwo = "\033[2;1H\033[Ktwo!";
   const ScreenCase steps[] = {
       {"all at first",
        5,
        {"one", "two"},
        {"q"},
        0,
-       "\033[2J\033[1;1Hone\033[K\033[2;1Htwo\033[K\033[3;1Hq\033[K"},
+       "\033[2J\033[1;1H\033[Kone\033[2;1H\033[Ktwo\033[3;1H\033[Kq"},
       {"nothing", 5, {"one", "two"}, {"q"}, 0, ""},
       {"one line", 5, {"one", "two!"}, {"q"}, 0, changedTwo},
-      {"fewer lines", 5, {"one"}, {"q"}, 0, "\033[2;1Hq\033[K\033[3;1H\033[K"},
+      {"fewer lines", 5, {"one"}, {"q"}, 0, "\033[2;1H\033[Kq\033[3;1H\033[K"},
       {"as many as there is room for",
        3,
        {"1", "2", "3"},
        {},
        0,
-       "\033[2J\033[1;1H1\033[K\033[2;1H2\033[K\033[3;1H3\033[K"},
+       "\033[2J\033[1;1H\033[K1\033[2;1H\033[K2\033[3;1H\033[K3"},
       {"one more",
        3,
        {"1", "2", "3", "4"},
        {},
        0,
-       "\033[3;1H2 lines not shown, 0 above and 2 below: arrows, PgUp, PgDn scroll\033[K"},
+       "\033[3;1H\033[K2 lines not shown, 0 above and 2 below: arrows, PgUp, PgDn scroll"},
       {"scrolled too far",
        3,
        {"1", "2", "3", "4"},
        {},
        9,
-       "\033[1;1H3\033[K\033[2;1H4\033[K\033[3;1H2 lines not shown, 2 above and 0 below: arrows, PgUp, PgDn "
-       "scroll\033[K"},
-      {"hardly any room", 2, {"1", "2", "3"}, {"q"}, -9, "\033[2J\033[1;1H1\033[K\033[2;1Hq\033[K"},
+       "\033[1;1H\033[K3\033[2;1H\033[K4\033[3;1H\033[K2 lines not shown, 2 above and 0 below: arrows, PgUp, "
+       "PgDn "
+       "scroll"},
+      {"hardly any room", 2, {"1", "2", "3"}, {"q"}, -9, "\033[2J\033[1;1H\033[K1\033[2;1H\033[Kq"},
   };
   tool::Screen screen;
   for (const ScreenCase& step : steps) {

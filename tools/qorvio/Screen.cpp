@@ -46,7 +46,8 @@ std::string Screen::update(std::size_t rows, const Parts& body, std::vector<std:
   shown_.resize(std::max(lines.size(), shown_.size()));
   lines.resize(shown_.size());
   for (std::size_t i = 0; i < lines.size(); ++i)
-    if (lines[i] != shown_[i]) text += "\033[" + std::to_string(i + 1) + ";1H" + lines[i] + "\033[K";
+    // Erased first: behind a line that fills the width, the cursor still stands on its last character.
+    if (lines[i] != shown_[i]) text += "\033[" + std::to_string(i + 1) + ";1H\033[K" + lines[i];
   shown_ = std::move(lines);
   return text;
 }
