@@ -1,7 +1,7 @@
 # watch in a terminal, with keys sent and the screen read. Needs QORVIO, the tool, and QORVIO_LOSSY, the tool on a board
-# that goes down with exchange N; tmux.
+# that goes down after N exchanges; tmux.
 
-setup_file() { export BATS_TEST_TIMEOUT=60; }
+load processes
 
 setup() {
   cd "$BATS_TEST_TMPDIR" || exit 1
@@ -40,7 +40,7 @@ hides() { ! tmux -L "$server" capture-pane -p | grep -qE "$1"; }  # hides REGEX:
   for i in {1..7}; do tmux -L "$server" send-keys j; done
   tmux -L "$server" send-keys p
   shows '^sync_in_data +0x00 +· +· +↕'
-  tmux -L "$server" send-keys q
+  tmux -L "$server" send-keys 'C-\' C-z q
   shows 'left with 0'
   [ "$(tmux -L "$server" capture-pane -p | grep -c 'OUTPUT')" -eq 0 ]
 }
@@ -93,8 +93,17 @@ hides() { ! tmux -L "$server" capture-pane -p | grep -qE "$1"; }  # hides REGEX:
   [ "${lines[4]}" = "qorvio: device 1, user chain 1, core 0: the link is down" ]
   "$QORVIO" --json watch --rate 100 >told 3>&- &
   pid=$!
-  until [ -s told ]; do sleep 0.05; done
+  tells told
   kill -INT $pid
   wait $pid
   [[ $(tail -1 told) == '{"frame":'*']}' ]]
+  mkfifo full
+  exec {unread}<>full
+  head -c 65536 /dev/zero >&$unread  # all that a pipe holds
+  "$QORVIO" --json watch >&$unread 3>&- &
+  pid=$!
+  catches_interrupt
+  sleep 0.3
+  kill -INT $pid
+  wait $pid
 }

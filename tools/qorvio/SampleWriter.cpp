@@ -1,6 +1,9 @@
 #include "SampleWriter.h"
 
+#include <unistd.h>
+#include <algorithm>
 #include <cerrno>
+#include <string_view>
 #include <system_error>
 
 #include "Errors.h"
@@ -14,9 +17,11 @@ OutputFile::OutputFile(const std::string& path)
 }
 
 void OutputFile::write() {
-  if (std::fwrite(text_.data(), 1, text_.size(), file_.get()) != text_.size() ||
-      std::fflush(file_.get()) != 0)
-    fail();
+  for (std::string_view rest = text_; !rest.empty();) {
+    const ssize_t count = ::write(fileno(file_.get()), rest.data(), rest.size());
+    if (count < 0 && errno != EINTR) fail();
+    rest.remove_prefix(static_cast<std::size_t>(std::max<ssize_t>(0, count)));
+  }
   text_.clear();
 }
 

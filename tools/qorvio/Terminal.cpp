@@ -5,7 +5,8 @@
 #include <unistd.h>
 #include <cerrno>
 #include <csignal>
-#include <cstdio>
+#include <exception>
+#include <string>
 #include <utility>
 
 namespace tool {
@@ -51,22 +52,29 @@ Key keyBehindEscape() {
 
 }  // namespace
 
-Terminal::Terminal() {
+Terminal::Terminal(const Stop& stop) : stop_(stop) {
+  write("\033[?1049h\033[?25l\033[?7l\033[2J");  // first: a terminal that takes it not is left as it is
   tcgetattr(STDIN_FILENO, &before_);
   termios raw = before_;
   raw.c_lflag &= ~static_cast<tcflag_t>(ICANON | ECHO);
-  raw.c_cc[VSUSP] = _POSIX_VDISABLE;  // the shell would get the terminal as it is
+  // With either, the shell would get the terminal as it is.
+  raw.c_cc[VSUSP] = _POSIX_VDISABLE;
+  raw.c_cc[VQUIT] = _POSIX_VDISABLE;
   tcsetattr(STDIN_FILENO, TCSANOW, &raw);
   struct sigaction action {};
   action.sa_handler = handleResize;
+  action.sa_flags = SA_RESTART;
   sigaction(SIGWINCH, &action, &resizeBefore_);
-  write("\033[?1049h\033[?25l\033[?7l\033[2J");
 }
 
 Terminal::~Terminal() {
-  write("\033[?7h\033[?25h\033[?1049l");
   sigaction(SIGWINCH, &resizeBefore_, nullptr);
   tcsetattr(STDIN_FILENO, TCSANOW, &before_);
+  try {
+    write("\033[?7h\033[?25h\033[?1049l");
+  } catch (const std::exception&) {
+    return;  // a terminal that is gone has nothing to show
+  }
 }
 
 std::size_t Terminal::rows() const {
@@ -78,11 +86,6 @@ bool Terminal::takeResized() {
   if (isResized == 0) return false;
   isResized = 0;
   return true;
-}
-
-bool Terminal::write(const std::string& text) {
-  std::fputs(text.c_str(), stdout);
-  return std::fflush(stdout) == 0;
 }
 
 Key Terminal::key(milliseconds wait) {

@@ -4,7 +4,9 @@
 #include <signal.h>
 #include <termios.h>
 #include <chrono>
-#include <string>
+#include <string_view>
+
+#include "Output.h"
 
 namespace tool {
 
@@ -17,7 +19,7 @@ constexpr Key noKey = 0, keyUp = 0x100, keyDown = 0x101, keyPageUp = 0x102, keyP
 /// afterwards what it showed before.
 class Terminal {
  public:
-  Terminal();
+  explicit Terminal(const Stop& stop);
   Terminal(const Terminal&) = delete;
   Terminal& operator=(const Terminal&) = delete;
   ~Terminal();
@@ -28,13 +30,14 @@ class Terminal {
   /// Whether it was resized since the call before.
   bool takeResized();
 
-  /// Writes text and escape sequences. False when the terminal takes no more.
-  bool write(const std::string& text);
+  /// Writes text and escape sequences. False when a Stop was asked for and the terminal takes no more.
+  bool write(std::string_view text) { return writeOutput(text, stop_); }
 
   /// Waits so long for a key, or until a signal comes: then and afterwards there is none.
   Key key(std::chrono::milliseconds wait);
 
  private:
+  const Stop& stop_;
   termios before_{};
   struct sigaction resizeBefore_ {};
 };

@@ -7,6 +7,7 @@
 #include "Errors.h"
 #include "InputJson.h"
 #include "InputWatch.h"
+#include "Output.h"
 #include "Screen.h"
 #include "Stop.h"
 #include "Terminal.h"
@@ -34,6 +35,7 @@ class Frames {
   void begin() { due_ = std::max(due_ + period_, Clock::now()); }
   bool isOver() const { return stop_.asked() || Clock::now() >= due_; }
   void sleep() const { stop_.sleepUntil(due_); }
+  const Stop& stop() const { return stop_; }
 
   // Short enough for a signal that no wait saw.
   milliseconds nap() const {
@@ -110,14 +112,21 @@ class LiveWatch {
   Screen screen_;
 };
 
+// On a link that is slower than the rate, keys are to be obeyed as fast as they come, and frames still to be seen.
+constexpr int keysAtOnce = 16;
+
 // Shows the frame and what the keys make of it until the next one is due; false when that is not wanted.
 bool showWithKeys(LiveWatch& live, Terminal& terminal, const Frames& frames) {
   do {
     if (terminal.takeResized()) live.redraw();
     if (!terminal.write(live.update(terminal.rows()))) return false;
-    const Key key = terminal.key(frames.nap());
-    if (key == 'q' || key == endOfKeys) return false;
-    if (key != noKey) live.press(key);
+    milliseconds wait = frames.nap();
+    for (int i = 0; i < keysAtOnce; ++i, wait = milliseconds(0)) {
+      const Key key = terminal.key(wait);
+      if (key == noKey) break;
+      if (key == 'q' || key == endOfKeys) return false;
+      live.press(key);
+    }
   } while (!frames.isOver());
   return true;
 }
@@ -125,7 +134,7 @@ bool showWithKeys(LiveWatch& live, Terminal& terminal, const Frames& frames) {
 void runOnTerminal(InputWatch& watch, OutputTable outputs, Frames& frames) {
   LiveWatch live(watch, std::move(outputs));
   try {
-    Terminal terminal;
+    Terminal terminal(frames.stop());
     while (frames.goesOn(watch.frames())) {
       frames.begin();
       watch.poll();
@@ -137,13 +146,13 @@ void runOnTerminal(InputWatch& watch, OutputTable outputs, Frames& frames) {
   }
 }
 
-// Frames as text, one after another, until stdout takes no more.
+// Frames as text, one after another.
 template <class Text>
 void print(InputWatch& watch, Frames& frames, Text text) {
   while (frames.goesOn(watch.frames())) {
     frames.begin();
     watch.poll();
-    if (std::fputs(text().c_str(), stdout) < 0 || std::fflush(stdout) != 0) return;
+    if (!writeOutput(text(), frames.stop())) return;
     if (frames.goesOn(watch.frames())) frames.sleep();
   }
 }
