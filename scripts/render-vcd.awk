@@ -1,6 +1,8 @@
-# The drawing of render-vcd: reads a value change dump, writes SVG. Variables: signals, from, to, as its options.
+# The drawing of render-vcd: reads a value change dump, writes SVG. The environment holds its options: signals, from, to; and
+# dump, the name of the file.
 
 BEGIN {
+  signals = ENVIRON["signals"]; from = ENVIRON["from"]; to = ENVIRON["to"]
   width = 960; margin = 16; laneHeight = 22; laneGap = 12; letter = 7.3
   seconds["s"] = 1; seconds["ms"] = 1e-3; seconds["us"] = 1e-6; seconds["ns"] = 1e-9; seconds["ps"] = 1e-12; seconds["fs"] = 1e-15
   step = 1e-9  # seconds; a dump without a timescale is in nanoseconds
@@ -10,7 +12,7 @@ BEGIN {
 
 END {
   if (bad) exit 2
-  if (variables == 0 || stamps == 0) fail("not a value change dump: " FILENAME)
+  if (variables == 0 || stamps == 0) fail("not a value change dump: " ENVIRON["dump"])
   chooseLanes()
   begin = from == "" ? firstTime : stepsOf(from)
   end = to == "" ? time : stepsOf(to)

@@ -47,6 +47,9 @@ draws() {  # draws TEXT...: each of them is part of the drawing
     '>bus&lt;5:0&gt;</text>' '>02</text>' '>2A</text>' '<rect fill="url(#unknown)" x="303.8" y="56" width="213.4"' \
     'x="303.8" y="16" width="213.4" height="68"><title>polls missed</title>' '>200 µs</text>'
   [ "$(grep -c moved out.svg)" -eq 0 ]
+  cp small.vcd width=9.vcd
+  render width=9.vcd again.svg
+  cmp out.svg again.svg
   render small.vcd out.svg --signals bit_moved,bit --from 0.2ms --to 300us
   draws '>bit_moved</text>' '>bit</text>' 'd="M97.7 78H520.8V56H944.0"' '>200 µs</text>' '>300 µs</text>'
   [ "$(grep -c bus out.svg)" -eq 0 ]
