@@ -26,6 +26,20 @@ remembers() {  # remembers ASYNC SYNC: what the file holds, which is the only on
   remembers F6 00
 }
 
+@test "a command that is killed remembers what it gave before, and at a cable with a long name" {
+  QORVIO_CABLE=lossy:$(printf '%0300d' 6)
+  "$QORVIO_LOSSY" press 'async_out_data[1]' --for 1h 3>&- &
+  pid=$!
+  catches_interrupt
+  until compgen -G 'qorvio/*.json'; do
+    kill -0 $pid || return 1
+    sleep 0.05
+  done
+  kill -KILL $pid
+  wait $pid || true
+  remembers 02 00
+}
+
 @test "a command that fails remembers what it gave before" {
   echo 'async_out_data,sync_out_data[0]' >steps.csv
   for row in {1..9}; do echo "$row,1"; done >>steps.csv

@@ -48,6 +48,9 @@ class CoreSession {
   /// The value that an output signal was last given, as far as this tool knows; 0 bits where it does not.
   Bytes lastWritten(const Signal& signal) const;
 
+  /// Keeps what the outputs were given now, not only at the end: for commands that are at work for long.
+  void rememberOutputs() { memory_.save(); }
+
  private:
   Link& link_;
   QOR_CORE_REF ref_;

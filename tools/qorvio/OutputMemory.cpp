@@ -1,6 +1,12 @@
 #include "OutputMemory.h"
 
+#include <fcntl.h>
+#include <sys/file.h>
 #include <unistd.h>
+#include <cctype>
+#include <cerrno>
+#include <cstdint>
+#include <cstdio>
 #include <cstdlib>
 #include <filesystem>
 #include <fstream>
@@ -13,6 +19,22 @@ namespace tool {
 namespace {
 
 namespace fs = std::filesystem;
+
+// As much of the key as can be read in a file name, and a hash (FNV-1a) of all of it.
+std::string fileName(const std::string& key) {
+  constexpr std::size_t longest = 80;
+  std::uint64_t hash = 0xCBF29CE484222325;
+  std::string name;
+  for (const char letter : key) {
+    hash = (hash ^ static_cast<unsigned char>(letter)) * 0x100000001B3;
+    const bool isPlain =
+        std::isalnum(static_cast<unsigned char>(letter)) != 0 || letter == '.' || letter == '-';
+    if (name.size() < longest) name += isPlain ? letter : '_';
+  }
+  char digits[20];
+  std::snprintf(digits, sizeof digits, "-%016llx", static_cast<unsigned long long>(hash));
+  return name + digits + ".json";
+}
 
 // One file a core, named after where it is.
 std::string pathFor(const std::string& key) {
@@ -27,10 +49,7 @@ std::string pathFor(const std::string& key) {
   } else {
     return {};
   }
-  std::string name = key;
-  for (char& each : name)
-    if (each == '/') each = '%';
-  return (folder / "qorvio" / (name + ".json")).string();
+  return (folder / "qorvio" / fileName(key)).string();
 }
 
 // The image that the file holds; zeros when it does not fit the port.
@@ -53,6 +72,23 @@ void overlay(Bytes& image, const Bytes& bits, const Bytes& mask) {
     image[i] = static_cast<unsigned char>((image[i] & ~mask[i]) | (bits[i] & mask[i]));
 }
 
+// Until its end, the only one that changes files of the folder; where the file system cannot tell, one of several.
+class FolderLock {
+ public:
+  explicit FolderLock(const fs::path& folder)
+      : folder_(open(folder.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC)) {
+    while (folder_ >= 0 && flock(folder_, LOCK_EX) != 0 && errno == EINTR) continue;
+  }
+  FolderLock(const FolderLock&) = delete;
+  FolderLock& operator=(const FolderLock&) = delete;
+  ~FolderLock() {
+    if (folder_ >= 0) close(folder_);
+  }
+
+ private:
+  int folder_;
+};
+
 }  // namespace
 
 OutputMemory::Images::Images(const QORVIO_CORE_INFO& info)
@@ -62,11 +98,7 @@ OutputMemory::OutputMemory(const std::string& key, const QORVIO_CORE_INFO& info)
     : path_(pathFor(key)), info_(info), now_(remembered()), given_(info) {}
 
 OutputMemory::~OutputMemory() {
-  try {
-    if (isChanged_ && !path_.empty()) save();
-  } catch (const std::exception&) {
-    return;  // what the command did stands; only the next toggle starts from older values
-  }
+  save();
 }
 
 void OutputMemory::set(const Signal& signal, const Bytes& value) {
@@ -87,13 +119,24 @@ OutputMemory::Images OutputMemory::remembered() const {
   return images;
 }
 
-void OutputMemory::save() const {
+void OutputMemory::save() {
+  if (!isChanged_ || path_.empty()) return;
+  try {
+    merge();
+  } catch (const std::exception&) {
+    return;  // what the command did stands; only the next toggle starts from older values
+  }
+}
+
+void OutputMemory::merge() {
+  std::error_code failed;
+  const fs::path folder = fs::path(path_).parent_path();
+  fs::create_directories(folder, failed);
+  const FolderLock lock(folder);
   Images images = remembered();
   overlay(images.asyncOut, now_.asyncOut, given_.asyncOut);
   overlay(images.syncOut, now_.syncOut, given_.syncOut);
   const nlohmann::json json{{"async_out", textOf(images.asyncOut)}, {"sync_out", textOf(images.syncOut)}};
-  std::error_code failed;
-  fs::create_directories(fs::path(path_).parent_path(), failed);
   const std::string fresh = path_ + "." + std::to_string(getpid());  // of this run alone
   bool written = false;
   {
@@ -101,8 +144,15 @@ void OutputMemory::save() const {
     file << json.dump() << '\n';
     written = static_cast<bool>(file.flush());
   }
+  failed.clear();
   if (written) fs::rename(fresh, path_, failed);
-  if (!written || failed) fs::remove(fresh, failed);
+  if (!written || failed) {
+    fs::remove(fresh, failed);
+    return;
+  }
+  now_ = images;
+  given_ = Images(info_);
+  isChanged_ = false;
 }
 
 }  // namespace tool

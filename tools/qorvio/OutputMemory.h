@@ -9,7 +9,8 @@
 
 namespace tool {
 
-/// Reads the file at its beginning and writes it once, at its end, however the command ends.
+/// Reads the file at its beginning and writes it at its end and whenever save() is called: what a command that is killed
+/// gave since then is not remembered.
 class OutputMemory {
  public:
   /// `key` names cable and core; with an empty one nothing is kept in a file.
@@ -17,12 +18,15 @@ class OutputMemory {
   OutputMemory(const OutputMemory&) = delete;
   OutputMemory& operator=(const OutputMemory&) = delete;
 
-  /// Writes the file, whole or not at all, if anything was set. Bits that were not set stay as the file has them by then:
-  /// another run may have given them meanwhile. A folder that cannot be written is no failure.
   ~OutputMemory();
 
   const Bytes& image(Port port) const { return now_.of(port); }
   void set(const Signal& signal, const Bytes& value);
+
+  /// Writes the file, whole or not at all, if anything was set since the time before. Bits that were not stay as the file
+  /// has them by then, and are taken from it: another run may have given them meanwhile. A folder that cannot be written
+  /// is no failure.
+  void save();
 
  private:
   struct Images {
@@ -34,12 +38,12 @@ class OutputMemory {
   };
 
   Images remembered() const;
-  void save() const;
+  void merge();
 
   std::string path_;
   QORVIO_CORE_INFO info_;
   Images now_;
-  Images given_;  // which bits were set
+  Images given_;  // which bits were set since the last save
   bool isChanged_ = false;
 };
 

@@ -60,6 +60,7 @@ void OutputTable::pulseChosen() {
 
 void OutputTable::write(const Assignment& assignment) {
   core_.write({assignment});
+  core_.rememberOutputs();
   for (std::size_t i = 0; i < outputs_.size(); ++i) format(i);  // one bit may have several names
 }
 

@@ -32,6 +32,7 @@ void press(Context& context, const PressOptions& options) {
   down.steps = {{1}};
   const Stop stop;  // whoever interrupts it finds the output released
   context.core().write({down});
+  context.core().rememberOutputs();
   stop.sleepUntil(std::chrono::steady_clock::now() + time);
   write(context, level(signal, {0}));
 }
