@@ -1,5 +1,7 @@
 # The everyday commands, as typed. Needs QORVIO, the tool, and QORVIO_SOURCES, the sources.
 
+export BATS_TEST_TIMEOUT=60
+
 setup() {
   cd "$BATS_TEST_TMPDIR" || exit 1
   unset QORVIO_CABLE QORVIO_CORE QORVIO_SIGNALS
