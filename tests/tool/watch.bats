@@ -71,6 +71,15 @@ hides() { ! tmux -L "$server" capture-pane -p | grep -qE "$1"; }  # hides REGEX:
   hides 'not shown'
 }
 
+@test "keys do not wait for a frame each where the link is slower than the rate" {
+  tmux -L "$server" -f /dev/null new-session -d -x 100 -y 50 "sh"
+  tmux -L "$server" send-keys "'$QORVIO_LOSSY' --cable slow:99 --core 0.1.0 watch --frames 6; echo left with \$?" Enter
+  shows '^frame 1 '
+  tmux -L "$server" send-keys j j j j j j j Space
+  shows 'left with 0'
+  [ "$(cat qorvio/*)" = '{"async_out":"80","sync_out":"00"}' ]
+}
+
 @test "a lost link leaves the last frame on a clean terminal, and ends with 1" {
   tmux -L "$server" -f /dev/null new-session -d -x 100 -y 50 "sh"
   tmux -L "$server" send-keys "'$QORVIO_LOSSY' --cable lossy:12 --core 0.1.0 watch --rate 50; echo left with \$?" Enter

@@ -1,7 +1,10 @@
 // Opens "lossy:N" in the place of all other cables: the demo board behind a link that goes down after N exchanges.
+// "slow:N" is the same, with a third of a second for each of them.
 #include <charconv>
+#include <chrono>
 #include <stdexcept>
 #include <string_view>
+#include <thread>
 
 #include "FaultyCable.h"
 #include "QorJtag_Host.h"
@@ -10,14 +13,19 @@
 namespace QorRT {
 
 std::unique_ptr<Qor_Cable> openCable(const char* url) {
-  const std::string_view text(url), kind = "lossy:";
+  const std::string_view text(url);
+  const bool isSlow = text.substr(0, 5) == "slow:";
+  const std::string_view kind = isSlow ? "slow:" : "lossy:";
   unsigned exchanges = 0;
   const char* const end = text.data() + text.size();
   const bool isKind = text.substr(0, kind.size()) == kind;
   const auto [rest, error] = std::from_chars(isKind ? text.data() + kind.size() : end, end, exchanges);
-  if (error != std::errc() || rest != end) throw std::logic_error("not lossy:N: " + std::string(text));
+  if (error != std::errc() || rest != end)
+    throw std::logic_error("neither lossy:N nor slow:N: " + std::string(text));
   auto cable = std::make_unique<qorsim::FaultyCable>(qorsim::demoBoard().cable());
-  for (unsigned i = 0; i < exchanges; ++i) cable->next({});
+  const qorsim::Fault slow{
+      [](qorsim::PassingExchange&) { std::this_thread::sleep_for(std::chrono::milliseconds(333)); }};
+  for (unsigned i = 0; i < exchanges; ++i) cable->next(isSlow ? slow : qorsim::Fault{});
   cable->next({[link = cable.get()](qorsim::PassingExchange&) {
     link->drop();
     throw std::runtime_error("the link is down");
