@@ -64,7 +64,7 @@ TEST(SimPins, scansAsTheCableDoesWithAndWithoutPauses) {
   const auto core = vio().asyncOut(5).syncOut(3).asyncIn(9).syncIn(3).design(qorsim::loopback());
   const auto board = [&] { return chain().device(7).irLength(9).device(5).core(2, 3, core).device(); };
   const std::string payload = noise(2 * 5 + 17 * 3);
-  for (const std::size_t pauses : {0, 1, 5}) {
+  for (const unsigned pauses : {0U, 1U, 5U}) {
     const auto cable = board().cable();
     const auto pins = board().pins();
     PinHost host(*pins);
