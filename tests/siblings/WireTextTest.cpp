@@ -181,10 +181,9 @@ TEST(Batches, AreOneCommandWithScansInFields) {
   std::string field;
   for (int i = 0; i < 32; ++i) field += "a5";
   const std::string fields = "drscan b.tap 256 0x" + field + " 4 0x09";
-  EXPECT_EQ(QorRT::procedureOf("p", "2", commands),
-            "proc p {} {debug_level -3\nif {[catch {set r ok\nirscan b.tap 255\n" + fields +
-                "\nruntest 8\nappend r { } [" + fields +
-                "]\nset r} m]} {set m \"failed $m\"}\ndebug_level 2\nset m}");
+  EXPECT_EQ(QorRT::procedureOf("p", commands),
+            "proc p {} {" + QorRT::silenceCommand() + "\nif {[catch {set r ok\nirscan b.tap 255\n" + fields +
+                "\nruntest 8\nappend r { } [" + fields + "]\nset r} m]} {set m \"failed $m\"}\nset m}");
 }
 
 std::string read(const std::string& answer, std::size_t bitCount) {

@@ -9,11 +9,13 @@
 #include <fstream>
 #include <optional>
 #include <regex>
+#include <sstream>
 #include <thread>
 
 #include "BitbangServer.h"
 #include "Board.h"
 #include "SimPins.h"
+#include "TcpStream.h"
 
 namespace {
 
@@ -163,12 +165,21 @@ class OpenOcd {
   ~OpenOcd() { kill(SIGKILL); }
 
   std::string url() const { return "openocd:127.0.0.1:" + port_ + "?timeout=0.5"; }
+  std::string log() const {
+    std::ostringstream text;
+    text << std::ifstream(log_).rdbuf();
+    return text.str();
+  }
+  std::string ask(const std::string& command) const {
+    QorRT::TcpStream stream({"127.0.0.1", port_}, QorRT::TcpStream::Seconds(5));
+    return stream.ask(command + '\x1A', '\x1A');
+  }
 
   void start() {
     setenv("QORVIO_BOARD_PORT", boardPort_.c_str(), 1);
     process_ = fork();  // what follows in the child needs no memory
     if (process_ == 0) {
-      execlp("openocd", "openocd", "-l", "/dev/null", "-f", QORVIO_SOURCE_DIR "/rtl/bench/openocd.cfg", "-c",
+      execlp("openocd", "openocd", "-l", log_.c_str(), "-f", QORVIO_SOURCE_DIR "/rtl/bench/openocd.cfg", "-c",
              ports_.c_str(), nullptr);
       _exit(127);
     }
@@ -191,6 +202,7 @@ class OpenOcd {
   }
 
   std::string boardPort_, port_, ports_;
+  std::string log_ = testing::TempDir() + "openocd_" + std::to_string(getpid()) + ".log";
   pid_t process_ = -1;
 };
 
@@ -219,6 +231,20 @@ TEST(OpenOcdServer, MayHangOrDieAndComeBackWithinASession) {
   server.start();
   core.write({{"async_out_data", "A7"}});
   EXPECT_EQ(core.read()["async_in_data"], "A7");
+}
+
+TEST(OpenOcdServer, LogsNoScanAndIsAsLoudAsBefore) {
+  ServedBoard served;
+  OpenOcd server(served.port());
+  server.ask("debug_level 1");
+  {
+    Board one(server.url()), other(server.url());
+    for (Board* board : {&one, &other, &one}) VioCore(*board, {0, 1, 0}).read();
+    one.close();
+    VioCore(other, {0, 1, 0}).read();
+  }
+  EXPECT_EQ(server.ask("debug_level"), "debug_level: 1\n");
+  EXPECT_THAT(server.log(), testing::Not(testing::HasSubstr("ok ")));
 }
 
 // What a cable says that cannot be opened.

@@ -55,14 +55,17 @@ OpenOcdCable::OpenOcdCable(WireUrl url)
 }
 
 OpenOcdCable::~OpenOcdCable() {
-  try {
-    if (stream_ && !server_) ask("catch {rename " + procedure_ + " {}}");
-  } catch (const std::exception&) {  // the server has gone first
-  }
+  OpenOcdCable::disconnect();
 }
 
-// A server of our own that has failed may have lost its adapter for good: the next one starts afresh.
+// A server of our own that has failed may have lost its adapter for good: the next one starts afresh. A server of
+// somebody else's is left as it was, if it still answers.
 void OpenOcdCable::disconnect() noexcept {
+  try {
+    if (answers_ && !server_) ask("catch {rename " + procedure_ + " {}}\n" + loudCommand());
+  } catch (const std::exception&) {  // it has gone first
+  }
+  answers_ = false;
   stream_.reset();
   server_.reset();
   known_.clear();
@@ -71,7 +74,7 @@ void OpenOcdCable::disconnect() noexcept {
 std::vector<WireDevice> OpenOcdCable::connect() {
   stream_ = reach();
   try {
-    readLogLevel();
+    ask(silenceCommand());
     taps_ = tapsIn(ask("capture scan_chain"));
   } catch (const std::runtime_error&) {
     if (server_) server_->requireRunning();
@@ -85,13 +88,6 @@ std::unique_ptr<TcpStream> OpenOcdCable::reach() {
   if (url_.config.empty()) return std::make_unique<TcpStream>(url_.endpoint, url_.timeout);
   server_ = std::make_unique<OpenOcdServer>(url_.config);
   return server_->connect(url_.timeout);
-}
-
-void OpenOcdCable::readLogLevel() {
-  constexpr const char* digits = "-0123456789";
-  const std::string answer = ask("debug_level");
-  const std::size_t first = std::min(answer.find_first_of(digits), answer.size());
-  logLevel_ = answer.substr(first, answer.find_first_not_of(digits, first) - first);
 }
 
 void OpenOcdCable::exchange(std::vector<Qor_Scan>& scans) {
@@ -116,11 +112,14 @@ void OpenOcdCable::exchange(std::vector<Qor_Scan>& scans) {
 std::string OpenOcdCable::commandFor(const std::string& commands) {
   if (commands == known_) return procedure_;
   known_ = commands;
-  return procedureOf(procedure_, logLevel_, commands) + "\n" + procedure_;
+  return procedureOf(procedure_, commands) + "\n" + procedure_;
 }
 
 std::string OpenOcdCable::ask(const std::string& command, std::size_t tcks) {
-  return stream_->ask(command + endOfText, endOfText, timeOf(tcks));
+  answers_ = false;
+  std::string answer = stream_->ask(command + endOfText, endOfText, timeOf(tcks));
+  answers_ = true;
+  return answer;
 }
 
 }  // namespace QorRT

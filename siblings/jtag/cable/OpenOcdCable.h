@@ -28,12 +28,11 @@ class QOR_API OpenOcdCable : public WireCable {
   std::unique_ptr<TcpStream> reach();
   std::string commandFor(const std::string& commands);
   std::string ask(const std::string& command, std::size_t tcks = 0);
-  void readLogLevel();
 
   WireUrl url_;
   std::unique_ptr<OpenOcdServer> server_;  // null for one that is not ours
   std::unique_ptr<TcpStream> stream_;      // null without a connection
-  std::string logLevel_;                   // of the server's log, between our commands
+  bool answers_ = false;                   // to the last that it was asked
   std::vector<OpenOcdTap> taps_;
   std::string procedure_;  // its name: nobody else's on this server
   std::string known_;      // what it does there; empty when it is not there

@@ -190,9 +190,18 @@ void appendStep(std::string& commands, const std::vector<OpenOcdTap>& taps,
   }
 }
 
-std::string procedureOf(const std::string& name, const std::string& logLevel, const std::string& commands) {
-  return "proc " + name + " {} {debug_level -3\nif {[catch {set r ok\n" + commands +
-         "set r} m]} {set m \"failed $m\"}\ndebug_level " + logLevel + "\nset m}";
+// The server keeps the level itself, for all its clients.
+std::string silenceCommand() {
+  return "if {![info exists ::qor_log_level]} {set ::qor_log_level [lindex [debug_level] 1]}\ndebug_level -3";
+}
+
+std::string loudCommand() {
+  return "if {[info exists ::qor_log_level]} {debug_level $::qor_log_level; unset ::qor_log_level}";
+}
+
+std::string procedureOf(const std::string& name, const std::string& commands) {
+  return "proc " + name + " {} {" + silenceCommand() + "\nif {[catch {set r ok\n" + commands +
+         "set r} m]} {set m \"failed $m\"}\nset m}";
 }
 
 CaptureReader::CaptureReader(std::string answer) : answer_(std::move(answer)) {

@@ -37,10 +37,16 @@ QOR_API void requireTaps(const std::vector<OpenOcdTap>& taps, const std::vector<
 QOR_API void appendStep(std::string& commands, const std::vector<OpenOcdTap>& taps,
                         const std::vector<WireDevice>& devices, const Qor_Scan& scan);
 
-/// Puts commands of appendStep() into a procedure that answers "ok" and every capture, or what failed. The server's
-/// log, which would hold every scan, is silent meanwhile, and then has `logLevel` again.
-QOR_API std::string procedureOf(const std::string& name, const std::string& logLevel,
-                                const std::string& commands);
+/// Silences the server's log, which would hold every answer, and gives it back the level that it had. Clients may
+/// do both in any order: the last one to speak leaves it loud.
+/// @{
+QOR_API std::string silenceCommand();
+QOR_API std::string loudCommand();
+/// @}
+
+/// Puts commands of appendStep() into a procedure that silences the log and answers "ok" and every capture, or
+/// what failed.
+QOR_API std::string procedureOf(const std::string& name, const std::string& commands);
 
 /// The captures in the answer of such a procedure, taken in order. Throws runtime_error for whatever is no such answer.
 class QOR_API CaptureReader {
