@@ -106,8 +106,8 @@ const Case cases[] = {
      "no debug hub answers, TDO is all ones"},
     {"OneBitFlipped", Fault::flip, 60, "the CRC of the answer does not hold over 80 data bits",
      "the CRC of the answer does not hold over 80 data bits"},
-    {"ReplyWithheld", Fault::withhold, 0, "HOST:PORT gave 0 of 147 answers, then nothing for 0.6 s",
-     "HOST:PORT did not answer within 0.6 s"},
+    {"ReplyWithheld", Fault::withhold, 0, "HOST:PORT gave 0 of 147 answers, then nothing for 1.1 s",
+     "HOST:PORT did not answer within 1.1 s"},
     {"SimulationKilled", Fault::die, 150, "HOST:PORT closed the connection after 0 of 147 answers",
      "HOST:PORT closed the connection before it answered"},
 };
@@ -142,12 +142,12 @@ class WireFault : public testing::TestWithParam<Case> {
 };
 
 TEST_P(WireFault, IsToldByABitbangCable) {
-  tryOn("rbb:127.0.0.1:" + served.port() + "?timeout=0.5", GetParam().byBitbang);
+  tryOn("rbb:127.0.0.1:" + served.port() + "?timeout=1", GetParam().byBitbang);
 }
 
 TEST_P(WireFault, IsToldThroughOpenOcd) {
   setenv("QORVIO_BOARD_PORT", served.port().c_str(), 1);
-  tryOn("openocd:?config=" QORVIO_SOURCE_DIR "/rtl/bench/openocd.cfg&timeout=0.5", GetParam().byOpenOcd);
+  tryOn("openocd:?config=" QORVIO_SOURCE_DIR "/rtl/bench/openocd.cfg&timeout=1", GetParam().byOpenOcd);
 }
 
 INSTANTIATE_TEST_SUITE_P(Wire, WireFault, testing::ValuesIn(cases),
@@ -164,7 +164,7 @@ class OpenOcd {
   }
   ~OpenOcd() { kill(SIGKILL); }
 
-  std::string url() const { return "openocd:127.0.0.1:" + port_ + "?timeout=0.5"; }
+  std::string url() const { return "openocd:127.0.0.1:" + port_ + "?timeout=1"; }
   std::string log() const {
     std::ostringstream text;
     text << std::ifstream(log_).rdbuf();
@@ -221,7 +221,7 @@ TEST(OpenOcdServer, MayHangOrDieAndComeBackWithinASession) {
   };
   const std::string where = "100 device 0, user chain 1, core 0: HOST:PORT ";
   server.kill(SIGSTOP);
-  EXPECT_THAT(said(), ElementsAre(where + "did not answer within 0.6 s"));
+  EXPECT_THAT(said(), ElementsAre(where + "did not answer within 1.1 s"));
   server.kill(SIGCONT);
   values = core.read();
   EXPECT_EQ(values["async_in_data.activity_up"], "5A");  // even if the hanging read was carried out after all
