@@ -1,4 +1,4 @@
-#include "HeapUse.h"
+#include "bench/HeapUse.h"
 
 #include <malloc.h>
 

@@ -1,4 +1,4 @@
-#include "PlainPorts.h"
+#include "bench/PlainPorts.h"
 
 #include <cstddef>
 

@@ -1,4 +1,4 @@
-#include "TableReporter.h"
+#include "bench/TableReporter.h"
 
 #include <cstdio>
 #include <initializer_list>

@@ -7,8 +7,8 @@
 #include <string>
 #include <vector>
 
-#include "Recording.h"
 #include "Sim.h"
+#include "board/record/Recording.h"
 
 namespace {
 
@@ -28,8 +28,8 @@ std::unique_ptr<QorRT::Qor_Cable> boardOf(unsigned width, unsigned bits) {
       .cable();
 }
 
-std::vector<tool::Signal> signalsOf(unsigned width) {
-  std::vector<tool::Signal> signals(width);
+std::vector<qor::Signal> signalsOf(unsigned width) {
+  std::vector<qor::Signal> signals(width);
   for (unsigned bit = 0; bit < width; ++bit) {
     signals[bit].name = "signal_" + std::to_string(bit);
     signals[bit].bits = {bit};
@@ -47,17 +47,17 @@ double secondsOf(Action action) {
 /// A recording, file and all, and as many reads without one.
 void record(benchmark::State& state) {
   const auto width = static_cast<unsigned>(state.range(0));
-  tool::Link link(boardOf(width, static_cast<unsigned>(state.range(2))));
-  tool::CoreSession core(link, {0, 1, 0}, "");
-  const std::vector<tool::Signal> signals = signalsOf(width);
+  qor::Link link(boardOf(width, static_cast<unsigned>(state.range(2))));
+  qor::CoreSession core(link, {0, 1, 0}, "");
+  const std::vector<qor::Signal> signals = signalsOf(width);
   const std::string path =
       fs::temp_directory_path() / (std::string("recorder_bench.") + endings[state.range(1)]);
-  tool::Limits limits;
+  qor::Limits limits;
   limits.samples = 800 + 80000 / width;
-  tool::Sample sample = core.emptySample();
+  qor::Sample sample = core.emptySample();
   double recorded = 0, bare = 0;
   for (auto _ : state) {
-    recorded += secondsOf([&] { tool::recordTo(path, core, signals, limits); });
+    recorded += secondsOf([&] { qor::recordTo(path, core, signals, limits); });
     bare += secondsOf([&] {
       for (std::uint64_t i = 0; i < limits.samples; ++i) core.read(sample);
     });

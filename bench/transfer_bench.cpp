@@ -4,11 +4,11 @@
 #include <string>
 #include <vector>
 
-#include "HeapUse.h"
-#include "NullSiblings.h"
-#include "PlainPorts.h"
 #include "QorVIO.h"
-#include "TableReporter.h"
+#include "bench/HeapUse.h"
+#include "bench/NullPlatform.h"
+#include "bench/PlainPorts.h"
+#include "bench/TableReporter.h"
 
 namespace {
 

@@ -1,4 +1,4 @@
-#include "BitbangClient.h"
+#include "sim/BitbangClient.h"
 
 #include <poll.h>
 #include <sys/socket.h>

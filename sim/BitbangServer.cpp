@@ -10,7 +10,7 @@
 #include <stdexcept>
 #include <system_error>
 
-#include "BitbangClient.h"
+#include "sim/BitbangClient.h"
 
 namespace qorsim {
 namespace {

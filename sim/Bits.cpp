@@ -1,4 +1,4 @@
-#include "Bits.h"
+#include "sim/Bits.h"
 
 namespace qorsim {
 

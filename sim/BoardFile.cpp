@@ -1,8 +1,8 @@
-#include "BoardError.h"
 #include "Sim.h"
-#include "TomlEntry.h"
-#include "TomlFile.h"
-#include "TomlKeys.h"
+#include "platform/jtag/cable/boardfile/TomlEntry.h"
+#include "platform/jtag/cable/boardfile/TomlFile.h"
+#include "platform/jtag/cable/boardfile/TomlKeys.h"
+#include "sim/BoardError.h"
 
 namespace qorsim {
 namespace {

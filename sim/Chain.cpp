@@ -1,4 +1,4 @@
-#include "Chain.h"
+#include "sim/Chain.h"
 
 #include <utility>
 

@@ -3,7 +3,7 @@
 
 #include <vector>
 
-#include "Tap.h"
+#include "sim/Tap.h"
 
 namespace qorsim {
 

@@ -1,11 +1,11 @@
 #include <utility>
 
-#include "BoardError.h"
-#include "Chain.h"
-#include "CoreCheck.h"
 #include "Sim.h"
-#include "StatusWord.h"
-#include "VioCore.h"
+#include "sim/BoardError.h"
+#include "sim/Chain.h"
+#include "sim/CoreCheck.h"
+#include "sim/StatusWord.h"
+#include "sim/VioCore.h"
 
 namespace qorsim {
 namespace {

@@ -1,4 +1,4 @@
-#include "Core.h"
+#include "sim/Core.h"
 
 namespace qorsim {
 

@@ -1,7 +1,7 @@
-#include "CoreCheck.h"
+#include "sim/CoreCheck.h"
 
-#include "BoardError.h"
-#include "StatusWord.h"
+#include "sim/BoardError.h"
+#include "sim/StatusWord.h"
 
 namespace qorsim {
 namespace {

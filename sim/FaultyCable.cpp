@@ -5,7 +5,7 @@
 #include <string>
 #include <utility>
 
-#include "Bits.h"
+#include "sim/Bits.h"
 
 namespace qorsim {
 namespace {

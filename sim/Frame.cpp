@@ -1,4 +1,4 @@
-#include "Frame.h"
+#include "sim/Frame.h"
 
 namespace qorsim {
 namespace {

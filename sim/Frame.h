@@ -4,7 +4,7 @@
 #include <cstddef>
 #include <optional>
 
-#include "Bits.h"
+#include "sim/Bits.h"
 
 namespace qorsim {
 

@@ -1,4 +1,4 @@
-#include "Hub.h"
+#include "sim/Hub.h"
 
 #include <utility>
 

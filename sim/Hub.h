@@ -4,8 +4,8 @@
 #include <array>
 #include <memory>
 
-#include "Core.h"
-#include "Frame.h"
+#include "sim/Core.h"
+#include "sim/Frame.h"
 
 namespace qorsim {
 

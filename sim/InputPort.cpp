@@ -1,4 +1,4 @@
-#include "InputPort.h"
+#include "sim/InputPort.h"
 
 #include <algorithm>
 

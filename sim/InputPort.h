@@ -1,8 +1,8 @@
 // One input port of a VIO core: its pins, and the activity on them.
 #pragma once
 
-#include "Bits.h"
 #include "SimDesign.h"
+#include "sim/Bits.h"
 
 namespace qorsim {
 

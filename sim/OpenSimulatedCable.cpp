@@ -1,5 +1,5 @@
-#include "Qor_CableFactories.h"
 #include "Sim.h"
+#include "platform/jtag/cable/Qor_CableFactories.h"
 
 namespace QorRT {
 

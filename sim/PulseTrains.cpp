@@ -1,4 +1,4 @@
-#include "PulseTrains.h"
+#include "sim/PulseTrains.h"
 
 #include <iterator>
 

@@ -4,8 +4,8 @@
 #include <cstdint>
 #include <vector>
 
-#include "Bits.h"
 #include "SimDesign.h"
+#include "sim/Bits.h"
 
 namespace qorsim {
 

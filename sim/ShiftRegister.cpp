@@ -1,4 +1,4 @@
-#include "ShiftRegister.h"
+#include "sim/ShiftRegister.h"
 
 #include <algorithm>
 

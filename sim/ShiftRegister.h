@@ -3,7 +3,7 @@
 
 #include <utility>
 
-#include "Bits.h"
+#include "sim/Bits.h"
 
 namespace qorsim {
 

@@ -2,8 +2,8 @@
 
 #include <utility>
 
-#include "Chain.h"
 #include "ChainScan.h"
+#include "sim/Chain.h"
 
 namespace qorsim {
 

@@ -2,8 +2,8 @@
 
 #include <utility>
 
-#include "Chain.h"
-#include "TapStates.h"
+#include "sim/Chain.h"
+#include "sim/TapStates.h"
 
 namespace qorsim {
 

@@ -1,4 +1,4 @@
-#include "StatusWord.h"
+#include "sim/StatusWord.h"
 
 namespace qorsim {
 

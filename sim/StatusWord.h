@@ -1,8 +1,8 @@
 // The status word of a core.
 #pragma once
 
-#include "Bits.h"
 #include "SimCoreDescription.h"
+#include "sim/Bits.h"
 
 namespace qorsim {
 

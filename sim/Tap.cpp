@@ -1,4 +1,4 @@
-#include "Tap.h"
+#include "sim/Tap.h"
 
 namespace qorsim {
 namespace {

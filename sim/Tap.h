@@ -5,8 +5,8 @@
 #include <cstdint>
 #include <memory>
 
-#include "Hub.h"
-#include "ShiftRegister.h"
+#include "sim/Hub.h"
+#include "sim/ShiftRegister.h"
 
 namespace qorsim {
 

@@ -1,4 +1,4 @@
-#include "TapStates.h"
+#include "sim/TapStates.h"
 
 #include <array>
 #include <cstddef>

@@ -1,8 +1,8 @@
-#include "VioCore.h"
+#include "sim/VioCore.h"
 
 #include <algorithm>
 
-#include "StatusWord.h"
+#include "sim/StatusWord.h"
 
 namespace qorsim {
 

@@ -3,10 +3,10 @@
 
 #include <memory>
 
-#include "Core.h"
-#include "InputPort.h"
-#include "PulseTrains.h"
 #include "SimCoreDescription.h"
+#include "sim/Core.h"
+#include "sim/InputPort.h"
+#include "sim/PulseTrains.h"
 
 namespace qorsim {
 

@@ -1,8 +1,8 @@
-#include "api/CallFrame.h"
+#include "src/api/CallFrame.h"
 
 #include <cstring>
 
-#include "api/Qor_AbortException.h"
+#include "src/api/Qor_AbortException.h"
 
 namespace QorRT {
 

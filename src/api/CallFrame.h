@@ -4,7 +4,7 @@
 #include <exception>
 
 #include "QorJtag.h"
-#include "Require.h"
+#include "src/Require.h"
 
 namespace QorRT {
 

@@ -1,9 +1,9 @@
-#include "api/CoreAccess.h"
+#include "src/api/CoreAccess.h"
 
 #include <stdexcept>
 
-#include "api/CallFrame.h"
-#include "api/Qor_AbortException.h"
+#include "src/api/CallFrame.h"
+#include "src/api/Qor_AbortException.h"
 
 namespace QorRT {
 

@@ -1,4 +1,4 @@
-#include "api/Qor_AbortException.h"
+#include "src/api/Qor_AbortException.h"
 
 namespace QorRT {
 

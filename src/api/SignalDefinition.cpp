@@ -3,8 +3,8 @@
 #include <vector>
 
 #include "QorVIO.h"
-#include "api/CallFrame.h"
-#include "api/CoreAccess.h"
+#include "src/api/CallFrame.h"
+#include "src/api/CoreAccess.h"
 
 using namespace QorRT;
 

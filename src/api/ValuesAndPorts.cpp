@@ -1,8 +1,8 @@
 #include <string>
 
 #include "QorVIO.h"
-#include "api/CallFrame.h"
-#include "api/CoreAccess.h"
+#include "src/api/CallFrame.h"
+#include "src/api/CoreAccess.h"
 
 using namespace QorRT;
 

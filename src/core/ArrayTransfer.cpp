@@ -3,7 +3,7 @@
 #include <stdexcept>
 
 #include "QorVIO_Core.h"
-#include "core/Messages.h"
+#include "src/core/Messages.h"
 
 namespace QorRT {
 

@@ -1,4 +1,4 @@
-#include "core/HexField.h"
+#include "src/core/HexField.h"
 
 #include <algorithm>
 #include <cstring>

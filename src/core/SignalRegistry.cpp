@@ -6,7 +6,7 @@
 #include <utility>
 
 #include "QorVIO_Core.h"
-#include "core/Messages.h"
+#include "src/core/Messages.h"
 
 namespace QorRT {
 

@@ -1,6 +1,6 @@
-#include "port/InputRecords.h"
+#include "src/port/InputRecords.h"
 
-#include "port/CharBlock.h"
+#include "src/port/CharBlock.h"
 
 namespace QorRT {
 

@@ -7,7 +7,7 @@
 #include "QorCore.h"
 #include "QorJtag.h"
 #include "QorUtil.h"
-#include "port/InputRecords.h"
+#include "src/port/InputRecords.h"
 
 namespace QorRT {
 

@@ -1,9 +1,9 @@
-#include "port/StepPlanes.h"
+#include "src/port/StepPlanes.h"
 
 #include <algorithm>
 
 #include "QorUtil.h"
-#include "port/CharBlock.h"
+#include "src/port/CharBlock.h"
 
 namespace QorRT {
 

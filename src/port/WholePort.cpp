@@ -4,8 +4,8 @@
 
 #include "QorUtil.h"
 #include "QorVIO_Core.h"
-#include "Require.h"
-#include "port/StepPlanes.h"
+#include "src/Require.h"
+#include "src/port/StepPlanes.h"
 
 namespace QorRT {
 

@@ -1,4 +1,4 @@
-#include "AllocationFault.h"
+#include "tests/fault/AllocationFault.h"
 
 #include <algorithm>
 #include <cstdlib>

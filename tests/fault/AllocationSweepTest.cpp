@@ -2,8 +2,8 @@
 #include <cstdio>
 #include <map>
 
-#include "AllocationFault.h"
-#include "Board.h"
+#include "tests/fault/AllocationFault.h"
+#include "tests/system/Board.h"
 
 namespace {
 

@@ -1,7 +1,7 @@
 // Everything that a link can do to a transfer: no wrong value reaches the caller, and nothing is lost.
 #include <cstdio>
 
-#include "LinkWorld.h"
+#include "tests/fault/LinkWorld.h"
 
 namespace {
 

@@ -6,8 +6,8 @@
 #include <cstdint>
 #include <random>
 
-#include "Board.h"
 #include "FaultyCable.h"
+#include "tests/system/Board.h"
 
 /// A port of 64 bits. Its bytes are the arrays of the exported functions: these tests are for hosts that keep
 /// the least significant byte first.

@@ -1,4 +1,4 @@
-#include "Fuzz.h"
+#include "tests/fuzz/Fuzz.h"
 
 #include <cstdio>
 #include <cstdlib>

@@ -5,7 +5,7 @@
 #include <string>
 #include <vector>
 
-#include "Fuzz.h"
+#include "tests/fuzz/Fuzz.h"
 
 /// A name: bit i of its value is bit `bits[i]` of the port.
 struct Group {

@@ -1,10 +1,10 @@
 // Board files. Input: the file.
 #include <toml++/toml.h>
 
-#include "Fuzz.h"
 #include "QorJtag_Host.h"
 #include "QorVIO.h"
 #include "Sim.h"
+#include "tests/fuzz/Fuzz.h"
 
 namespace {
 

@@ -1,8 +1,8 @@
 // Command texts, run on a simulated core whose outputs loop back. Input: the text.
-#include "Fuzz.h"
 #include "QorCore.h"
 #include "QorJtag_Host.h"
 #include "Sim.h"
+#include "tests/fuzz/Fuzz.h"
 
 namespace {
 

@@ -10,10 +10,10 @@
 #include <random>
 #include <sstream>
 
-#include "FakeSiblings.h"
-#include "OutputModel.h"
 #include "QorVIO.h"
 #include "QorVIO_Core.h"
+#include "tests/fuzz/OutputModel.h"
+#include "tests/unit/fakes/FakePlatform.h"
 
 namespace {
 
@@ -44,11 +44,11 @@ class Run {
         syncOut_(number(widths) % 70),
         model_(asyncOut_, syncOut_) {
     fake::reset();
-    fake::siblings().answerAsVioCore(asyncIn_, syncIn_, asyncOut_, syncOut_);
+    fake::platform().answerAsVioCore(asyncIn_, syncIn_, asyncOut_, syncOut_);
     require(QorVIO_initCore(7, ref) == 0, "a core");
     core_ = dynamic_cast<QorRT::QorVIO_Core*>(QorRT::Qor_CoreList::getCore(7, ref));
-    fake::siblings().take();
-    fake::siblings().before["sequence"] = [this] { answer(); };
+    fake::platform().take();
+    fake::platform().before["sequence"] = [this] { answer(); };
   }
   ~Run() { fake::reset(); }
   Run(const Run&) = delete;
@@ -66,7 +66,7 @@ class Run {
     if (letter == 's') setPorts(words);
     if (letter == 'g') getPorts(words);
     std::string told;
-    for (const std::string& call : fake::siblings().take())
+    for (const std::string& call : fake::platform().take())
       if (call.rfind("sequence ", 0) == 0 || call.rfind("message ", 0) == 0) told += call + "\n";
     requireEqual(told, expected_);
   }
@@ -95,7 +95,7 @@ class Run {
     std::string digits;
     for (unsigned i = 0; i < 4 * asyncIn_ + 6 * syncIn_; ++i) digits += random_() % 2 != 0 ? '1' : '0';
     records_.push_back(digits);
-    fake::siblings().readDigits = digits;
+    fake::platform().readDigits = digits;
   }
 
   /// Of an input: value, activity up and down, clocked activity up and down.

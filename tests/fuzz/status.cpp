@@ -2,9 +2,9 @@
 // stands for its low four bits.
 #include <memory>
 
-#include "Fuzz.h"
 #include "QorJtag_Host.h"
 #include "QorVIO.h"
+#include "tests/fuzz/Fuzz.h"
 
 namespace {
 

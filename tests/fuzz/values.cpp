@@ -1,9 +1,9 @@
 // Value texts and map keys. Input: lines KEY=TEXT; an empty line ends the map of one write.
 #include <map>
 
-#include "FakeSiblings.h"
-#include "OutputModel.h"
 #include "QorVIO.h"
+#include "tests/fuzz/OutputModel.h"
+#include "tests/unit/fakes/FakePlatform.h"
 
 namespace {
 
@@ -77,7 +77,7 @@ std::string write(const TextMap& map, OutputModel& model) {
 /// The writes and messages of a call.
 std::string told() {
   std::string text;
-  for (const std::string& call : fake::siblings().take())
+  for (const std::string& call : fake::platform().take())
     if (call.rfind("sequence ", 0) == 0 || call.rfind("message ", 0) == 0) text += call + "\n";
   return text;
 }
@@ -96,7 +96,7 @@ void check(TextMap& map, OutputModel& model) {
 
 void fuzz(std::string_view input) {
   fake::reset();
-  fake::siblings().answerAsVioCore(3, 2, asyncWidth, syncWidth);
+  fake::platform().answerAsVioCore(3, 2, asyncWidth, syncWidth);
   require(QorVIO_initCore(7, ref) == 0, "a core");
   define();
   told();

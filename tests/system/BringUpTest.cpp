@@ -1,7 +1,7 @@
 // The whole library on simulated boards: finding cores, values out and in, pulse trains.
 #include <numeric>
 
-#include "Board.h"
+#include "tests/system/Board.h"
 
 namespace {
 

@@ -1,7 +1,7 @@
 // The demo board, whatever it is made of and whatever leads to it. It keeps its state between tests.
 #include <array>
 
-#include "Board.h"
+#include "tests/system/Board.h"
 
 namespace {
 

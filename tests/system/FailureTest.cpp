@@ -1,5 +1,5 @@
 // What goes wrong on a board or a link: one message that names it, and a session that goes on.
-#include "Board.h"
+#include "tests/system/Board.h"
 
 namespace {
 

@@ -13,9 +13,9 @@
 #include <thread>
 
 #include "BitbangServer.h"
-#include "Board.h"
 #include "SimPins.h"
-#include "TcpStream.h"
+#include "platform/jtag/cable/wire/TcpStream.h"
+#include "tests/system/Board.h"
 
 namespace {
 
@@ -147,7 +147,7 @@ TEST_P(WireFault, IsToldByABitbangCable) {
 
 TEST_P(WireFault, IsToldThroughOpenOcd) {
   setenv("QORVIO_BOARD_PORT", served.port().c_str(), 1);
-  tryOn("openocd:?config=" QORVIO_SOURCE_DIR "/rtl/bench/openocd.cfg&timeout=1", GetParam().byOpenOcd);
+  tryOn("openocd:?config=" QORVIO_SOURCE_DIR "/rtl/cosim/openocd.cfg&timeout=1", GetParam().byOpenOcd);
 }
 
 INSTANTIATE_TEST_SUITE_P(Wire, WireFault, testing::ValuesIn(cases),
@@ -179,7 +179,7 @@ class OpenOcd {
     setenv("QORVIO_BOARD_PORT", boardPort_.c_str(), 1);
     process_ = fork();  // what follows in the child needs no memory
     if (process_ == 0) {
-      execlp("openocd", "openocd", "-l", log_.c_str(), "-f", QORVIO_SOURCE_DIR "/rtl/bench/openocd.cfg", "-c",
+      execlp("openocd", "openocd", "-l", log_.c_str(), "-f", QORVIO_SOURCE_DIR "/rtl/cosim/openocd.cfg", "-c",
              ports_.c_str(), nullptr);
       _exit(127);
     }
@@ -266,7 +266,7 @@ std::string written(const std::string& name, const std::string& text) {
 TEST(OpenOcdServer, IsHeldAgainstTheChainAndTheBoardFile) {
   ServedBoard served;
   setenv("QORVIO_BOARD_PORT", served.port().c_str(), 1);
-  const std::string good = QORVIO_SOURCE_DIR "/rtl/bench/openocd.cfg";
+  const std::string good = QORVIO_SOURCE_DIR "/rtl/cosim/openocd.cfg";
   const std::string taps = "transport select jtag\njtag newtap fpga tap -irlen 6 -expected-id 0x0A5F1093\n";
   const std::string adapter =
       "adapter driver remote_bitbang\nremote_bitbang host 127.0.0.1\nremote_bitbang port " + served.port() +

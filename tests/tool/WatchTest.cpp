@@ -2,16 +2,16 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "InputWatch.h"
-#include "Screen.h"
-#include "SignalTable.h"
-#include "Table.h"
+#include "board/model/SignalTable.h"
+#include "board/record/InputWatch.h"
+#include "tools/qorvio/terminal/Screen.h"
+#include "tools/qorvio/terminal/Table.h"
 
 namespace {
 
+using qor::Direction;
 using testing::ElementsAre;
 using testing::IsEmpty;
-using tool::Direction;
 using Lines = std::vector<std::string>;
 
 struct ScreenCase {
@@ -57,7 +57,7 @@ TEST(Screen, WritesTheLinesThatDiffer) {
        "scroll"},
       {"hardly any room", 2, {"1", "2", "3"}, {"q"}, -9, "\033[2J\033[1;1H\033[K1\033[2;1H\033[Kq"},
   };
-  tool::Screen screen;
+  qor::tool::Screen screen;
   for (const ScreenCase& step : steps) {
     screen.scroll(step.scrolled);
     EXPECT_EQ(screen.update(step.rows, {&step.body}, step.foot), step.written) << step.what;
@@ -65,7 +65,7 @@ TEST(Screen, WritesTheLinesThatDiffer) {
 }
 
 TEST(Table, LaysOutAgainWhatWasSetOrAllWhenAColumnGrows) {
-  tool::Table table({"A", "B"});
+  qor::tool::Table table({"A", "B"});
   table.add({"x", "1"});
   table.add({"y", "2"});
   EXPECT_THAT(table.lines(), ElementsAre("A  B", "x  1", "y  2"));
@@ -79,16 +79,16 @@ TEST(Table, LaysOutAgainWhatWasSetOrAllWhenAColumnGrows) {
 
 // The demo board loops the outputs of its first core back.
 TEST(InputWatch, NamesTheInputsThatLookDifferent) {
-  tool::Link link(tool::openCable("sim:"));
-  tool::CoreSession core(link, {0, 1, 0}, "");
-  tool::SignalTable signals;
+  qor::Link link(qor::openCable("sim:"));
+  qor::CoreSession core(link, {0, 1, 0}, "");
+  qor::SignalTable signals;
   signals.addWholePorts(core.info());
   const auto write = [&](const char* output, unsigned char value) {
-    core.write({tool::level(signals.find(output, Direction::output), {value})});
+    core.write({qor::level(signals.find(output, Direction::output), {value})});
   };
-  tool::InputWatch watch(core, {signals.find("async_in_data[0]", Direction::input),
-                                signals.find("async_in_data[1]", Direction::input),
-                                signals.find("sync_in_data", Direction::input)});
+  qor::InputWatch watch(core, {signals.find("async_in_data[0]", Direction::input),
+                               signals.find("async_in_data[1]", Direction::input),
+                               signals.find("sync_in_data", Direction::input)});
   watch.poll();
   EXPECT_THAT(watch.takeChanged(), ElementsAre(0, 1, 2));
   watch.poll();

@@ -12,7 +12,7 @@ setup() {
   QORVIO_BOARD_PORT=$(jq .port told)
   export QORVIO_BOARD_PORT
   direct=rbb:127.0.0.1:$QORVIO_BOARD_PORT
-  through="openocd:?config=$QORVIO_SOURCES/rtl/bench/openocd.cfg"
+  through="openocd:?config=$QORVIO_SOURCES/rtl/cosim/openocd.cfg"
 }
 
 teardown() { kill "$board" ${host:+"$host"} 2>/dev/null || true; }

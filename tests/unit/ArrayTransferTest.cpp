@@ -4,7 +4,7 @@
 #include <stdexcept>
 
 #include "QorVIO_Signal.h"
-#include "VioTest.h"
+#include "tests/unit/VioTest.h"
 
 namespace {
 
@@ -31,7 +31,7 @@ class Arrays : public VioTest {
     initCore(9, 2, 3, 4);
     EXPECT_EQ(define("leds", asyncOut, {0, 1, 2}), 0U);
     EXPECT_EQ(define("train", syncOut, {0, 3}), 0U);
-    siblings.take();
+    platform.take();
   }
 };
 
@@ -69,13 +69,13 @@ TEST_F(Arrays, AreCheckedBeforeAnythingIsStagedOrSent) {
             "The array of values is null.");
   EXPECT_EQ(failureOf([&] { core().writeValues(session, ref, {"leds"}, &bytes, nullptr, 1, 3, 0); }),
             noSizes);
-  EXPECT_THAT(siblings.take(), ElementsAre());
+  EXPECT_THAT(platform.take(), ElementsAre());
   core().writeValues(session, ref, {}, nullptr, nullptr, 0, 1, 0);
   EXPECT_EQ(writtenDigits(74), std::string(74, '0'));
 }
 
 TEST_F(Arrays, OfAReadMayHoldNullBuffers) {
-  siblings.readDigits = "1010" + std::string(4 * 8, '0') + "000000" + "110010";
+  platform.readDigits = "1010" + std::string(4 * 8, '0') + "000000" + "110010";
   Bytes value(4), syncUp(2);
   unsigned char* values[] = {value.data(), nullptr};
   unsigned char* syncUps[] = {nullptr, syncUp.data()};

@@ -2,7 +2,7 @@
 #include <functional>
 #include <stdexcept>
 
-#include "VioTest.h"
+#include "tests/unit/VioTest.h"
 
 namespace {
 
@@ -70,12 +70,12 @@ std::vector<Case> failingChecks() {
 TEST_F(VioTest, ArgumentChecksComeAfterTheLookupUnderTheLockAndSendNothing) {
   for (const Case& c : failingChecks()) {
     EXPECT_EQ(c.call(), failed);
-    EXPECT_THAT(siblings.take(), locked(lookupFailed));
+    EXPECT_THAT(platform.take(), locked(lookupFailed));
   }
   initCore(4, 3, 8, 10);
   for (const Case& c : failingChecks()) {
     EXPECT_EQ(c.call(), failed);
-    EXPECT_THAT(siblings.take(),
+    EXPECT_THAT(platform.take(),
                 locked("QorVIO_" + std::string(c.function) + "() arg. failed:" + c.failedCheck));
   }
   EXPECT_THAT(sizes, testing::Each(99U));
@@ -88,7 +88,7 @@ TEST_F(VioTest, InformationChecksTheRecordBeforeTheLockAndTheResultAfterIt) {
   EXPECT_EQ(QorVIO_getCoreInfo(session, ref, &map), failed);
   EXPECT_EQ(QorVIO_isVIOCore(session, ref, nullptr), failed);
   EXPECT_THAT(
-      siblings.take(),
+      platform.take(),
       ElementsAre("message 100 Arg. to function QorVIO_getCoreInfo() failed:coreInfo!=0",
                   "message 100 Arg. to function QorVIO_getCoreInfo() failed:coreInfo!=0",
                   "message 100 Arg. to function QorVIO_getCoreInfo() failed:*coreInfo!=0", "lock 7 60000",
@@ -105,25 +105,25 @@ TEST_F(VioTest, WhateverIsThrownBelowBecomesOneMessageAfterTheLock) {
       {[] { throw 3; }, "message 100 Qor internal error."},
   };
   for (const auto& [failure, message] : failures) {
-    siblings.before["flush"] = failure;
+    platform.before["flush"] = failure;
     EXPECT_EQ(write({{"async_out_data", "1"}}), failed);
-    EXPECT_THAT(siblings.take(),
+    EXPECT_THAT(platform.take(),
                 ElementsAre("lock 7 60000", testing::StartsWith("sequence"), "flush 7", "unlock 7", message));
   }
-  siblings.before["lock"] = [] { throw std::logic_error("unknown session 7"); };
+  platform.before["lock"] = [] { throw std::logic_error("unknown session 7"); };
   EXPECT_EQ(write({}), failed);
-  EXPECT_THAT(siblings.take(), ElementsAre("lock 7 60000", "message 100 unknown session 7"));
+  EXPECT_THAT(platform.take(), ElementsAre("lock 7 60000", "message 100 unknown session 7"));
 }
 
 TEST_F(VioTest, AFailedReadLeavesTheMapAndAMessageSinkThatThrowsLetsNothingOut) {
   initCore(4, 3, 8, 10);
-  siblings.before["sequence"] = [] { throw std::runtime_error("link"); };
-  siblings.before["message"] = [] { throw std::runtime_error("full"); };
+  platform.before["sequence"] = [] { throw std::runtime_error("link"); };
+  platform.before["message"] = [] { throw std::runtime_error("full"); };
   TextMap map{{"async_in_data", "mine"}};
   TextMap* pointer = &map;
   EXPECT_EQ(QorVIO_readValues(session, ref, &pointer), failed);
   EXPECT_EQ(map, (TextMap{{"async_in_data", "mine"}}));
-  siblings.info.core_type = 7;
+  platform.info.core_type = 7;
   EXPECT_EQ(QorVIO_initCore(session, ref), failed);
 }
 

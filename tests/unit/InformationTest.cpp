@@ -1,5 +1,5 @@
 // Status words, in every layout, as record and as text map; and what is not a VIO core.
-#include "VioTest.h"
+#include "tests/unit/VioTest.h"
 
 namespace {
 
@@ -34,9 +34,9 @@ TEST_F(VioTest, TheStatusWordIsDecodedByTheCoresVersionAndLeavesOtherEntriesOfTh
                               "sync_output_count",
                               "note"};
   for (const auto& c : cases) {
-    siblings.info = {0x51, 9, c.major, c.minor, 3};
-    siblings.word.assign(154, 0xFF);  // so that a field read elsewhere shows
-    for (auto [offset, length, value] : c.fields) siblings.putField(offset, length, value);
+    platform.info = {0x51, 9, c.major, c.minor, 3};
+    platform.word.assign(154, 0xFF);  // so that a field read elsewhere shows
+    for (auto [offset, length, value] : c.fields) platform.putField(offset, length, value);
     TextMap map{{"note", "mine"}, {"core_type", "old"}};
     TextMap* pointer = &map;
     EXPECT_EQ(QorVIO_getCoreInfo(session, ref, &pointer), 0U);
@@ -44,12 +44,12 @@ TEST_F(VioTest, TheStatusWordIsDecodedByTheCoresVersionAndLeavesOtherEntriesOfTh
     for (const char* key : keys) told += map[key] + ' ';
     EXPECT_EQ(told, c.entries);
     EXPECT_EQ(map.size(), std::size(keys));
-    EXPECT_THAT(siblings.take(), ElementsAre("lock 7 60000", "status 0.1.0 1232", "unlock 7"));
+    EXPECT_THAT(platform.take(), ElementsAre("lock 7 60000", "status 0.1.0 1232", "unlock 7"));
   }
 }
 
 TEST_F(VioTest, AnotherCoreTypeIsToldAndAbortsUnderTheLock) {
-  siblings.info.core_type = 7;
+  platform.info.core_type = 7;
   QORVIO_CORE_INFO info{1, 2, 3, 4, 5, 6, 7, 8, 9, 10, 11, 12};
   EXPECT_EQ(QorVIO_getInfo(session, ref, &info), failed);
   EXPECT_EQ(info.core_type, 0U);
@@ -58,7 +58,7 @@ TEST_F(VioTest, AnotherCoreTypeIsToldAndAbortsUnderTheLock) {
   TextMap* pointer = &map;
   EXPECT_EQ(QorVIO_getCoreInfo(session, ref, &pointer), failed);
   EXPECT_EQ(map, (TextMap{{"core_type", "old"}}));
-  EXPECT_THAT(siblings.take(),
+  EXPECT_THAT(platform.take(),
               ElementsAre("lock 7 60000", "status 0.1.0 1232", wrongType, "unlock 7",
                           "message 8000 Qor abort command", "lock 7 60000", "status 0.1.0 1232", wrongType,
                           "unlock 7", "message 8000 Qor abort command"));
@@ -66,12 +66,12 @@ TEST_F(VioTest, AnotherCoreTypeIsToldAndAbortsUnderTheLock) {
 
 TEST_F(VioTest, IsVioCoreDecidesByTheRecordAndReturnsTheStatus) {
   for (auto [type, status] : {std::pair{9U, 0U}, {7U, 0U}, {0U, 1U}, {9U, 5U}}) {
-    siblings.info.core_type = type;
-    siblings.plainStatus = status;
+    platform.info.core_type = type;
+    platform.plainStatus = status;
     unsigned result = 99;
     EXPECT_EQ(QorVIO_isVIOCore(session, ref, &result), status);
     EXPECT_EQ(result, type == 9 ? 1U : 0U);
-    EXPECT_THAT(siblings.take(), ElementsAre("lock 7 60000", "plain status 0.1.0 null 0", "unlock 7"));
+    EXPECT_THAT(platform.take(), ElementsAre("lock 7 60000", "plain status 0.1.0 null 0", "unlock 7"));
   }
 }
 

@@ -1,5 +1,5 @@
 // Whole ports as raw bits. Narrow ones, masks, counts and buffers left out: tests/fuzz/corpus/ports.
-#include "VioTest.h"
+#include "tests/unit/VioTest.h"
 
 namespace {
 

@@ -1,5 +1,5 @@
 // Defining, removing and sizing names.
-#include "VioTest.h"
+#include "tests/unit/VioTest.h"
 
 namespace {
 
@@ -43,9 +43,9 @@ TEST_F(Registry, ChecksDefinitionsInOrderAndKeepsNothingOfAFailedOne) {
       {"sync_out_data", asyncOut, {0}, used("sync_out_data")},
   };
   for (const auto& c : cases) {
-    siblings.take();
+    platform.take();
     EXPECT_EQ(define(c.name, c.type, c.bits), failed);
-    EXPECT_THAT(siblings.take(), locked(c.message));
+    EXPECT_THAT(platform.take(), locked(c.message));
   }
   EXPECT_EQ(define("x", asyncOut, {7}), 0U);
   std::vector<unsigned> none;
@@ -65,15 +65,15 @@ TEST_F(Registry, InputsAndOutputsAreTwoNameSpaces) {
   EXPECT_THAT(sizes({"Both", "async_out_data", "sync_out_data"}, 1), ElementsAre(3, 8, 10));
   EXPECT_EQ(QorVIO_undefineName(session, ref, "bOTH", asyncIn), 0U);  // direction alone counts
   EXPECT_EQ(QorVIO_undefineName(session, ref, "both", 7), 0U);        // any other code means outputs
-  siblings.take();
+  platform.take();
   EXPECT_EQ(QorVIO_undefineName(session, ref, "both", syncIn), failed);
-  EXPECT_THAT(siblings.take(),
+  EXPECT_THAT(platform.take(),
               locked("The name, both, has not been defined. Note: Signal names are case-insensitive"));
   EXPECT_EQ(QorVIO_undefineName(session, ref, "", syncIn), failed);
-  EXPECT_THAT(siblings.take(), locked("Invalid signal name."));
+  EXPECT_THAT(platform.take(), locked("Invalid signal name."));
   EXPECT_THAT(sizes({"async_in_data", "both", "sync_in_data"}, 0), ElementsAre(4, 99, 99));
   EXPECT_EQ(code, failed);
-  EXPECT_THAT(siblings.take(), locked("Could not find a signal with the name: both"));
+  EXPECT_THAT(platform.take(), locked("Could not find a signal with the name: both"));
 }
 
 TEST_F(Registry, ReservedNamesCanBeReplacedAndAreNoneOfAPortWithoutBits) {
@@ -105,7 +105,7 @@ TEST_F(Registry, AssigningACoreDuplicatesItsNamesOntoItsOwnImage) {
   QorRT::QorVIO_Core twin(session, ref, {0, 9, 0, 0, 0}, word, sizeof word * 8);
   twin = core();
   EXPECT_EQ(QorVIO_terminateCore(session, ref), 0U);
-  siblings.take();
+  platform.take();
   TextMap map{{"LED", "1"}};
   twin.writeValues(session, ref, &map);
   EXPECT_EQ(writtenDigits(8 + 160 + 8 + 10).substr(0, 8), "00010000");

@@ -1,5 +1,5 @@
 // Values by name, as hexadecimal text. More texts and keys: tests/fuzz/corpus/values.
-#include "VioTest.h"
+#include "tests/unit/VioTest.h"
 
 namespace {
 
@@ -11,7 +11,7 @@ class TextWrite : public VioTest {
     EXPECT_EQ(define("byte", asyncOut, {0, 1, 2, 3, 4, 5, 6, 7}), 0U);
     EXPECT_EQ(define("bus", asyncOut, {0, 1, 2, 3, 4, 5, 6, 7, 8, 9, 10, 11}), 0U);
     EXPECT_EQ(define("pulse", syncOut, {0}), 0U);
-    siblings.take();
+    platform.take();
   }
 
   std::string digits() { return writtenDigits(12 + 32 + 12 + 2); }
@@ -59,7 +59,7 @@ TEST_F(TextWrite, StagesNothingOfAFailedCheckAndAddressesNothingAfterAFailedText
   };
   for (const auto& [key, text, message] : cases) {
     EXPECT_EQ(write({{"sync_out_data", "3"}, {key, text}, {"async_out_data", "0"}}), failed);
-    EXPECT_THAT(siblings.take(), locked(message));
+    EXPECT_THAT(platform.take(), locked(message));
     EXPECT_EQ(write({}), 0U);
     const std::size_t from = message.find(noNumber) == 0 ? 12 + 32 : 0;
     EXPECT_EQ(digits().substr(from), std::string(12 + 32 + 12 + 2 - from, '0'));

@@ -1,10 +1,10 @@
-#include "VioTest.h"
+#include "tests/unit/VioTest.h"
 
 #include "QorUtil.h"
 
 std::string VioTest::writtenDigits(std::size_t count) {
   std::string data;
-  for (const std::string& call : siblings.take()) {
+  for (const std::string& call : platform.take()) {
     if (call.rfind("sequence ", 0) != 0) continue;
     EXPECT_TRUE(data.empty()) << "more than one write";
     std::string firstLine = call.substr(0, call.find('\n'));

@@ -7,9 +7,9 @@
 #include <string>
 #include <vector>
 
-#include "FakeSiblings.h"
 #include "QorVIO.h"
 #include "QorVIO_Core.h"
+#include "tests/unit/fakes/FakePlatform.h"
 
 using QorRT::hash_map;
 using TextMap = hash_map<std::string, std::string>;
@@ -28,13 +28,13 @@ class VioTest : public testing::Test {
   VioTest() { fake::reset(); }
   ~VioTest() override { fake::reset(); }
 
-  fake::Siblings& siblings = fake::siblings();
+  fake::Platform& platform = fake::platform();
 
   /// Sets up a core of these widths at `ref`, and forgets the calls that took.
   void initCore(unsigned asyncInWidth, unsigned syncInWidth, unsigned asyncOutWidth, unsigned syncOutWidth) {
-    siblings.answerAsVioCore(asyncInWidth, syncInWidth, asyncOutWidth, syncOutWidth);
+    platform.answerAsVioCore(asyncInWidth, syncInWidth, asyncOutWidth, syncOutWidth);
     ASSERT_EQ(QorVIO_initCore(session, ref), 0U);
-    siblings.take();
+    platform.take();
   }
 
   unsigned define(const char* name, unsigned type, std::vector<unsigned> bits) {

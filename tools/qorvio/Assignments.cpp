@@ -1,13 +1,13 @@
-#include "Assignments.h"
+#include "tools/qorvio/Assignments.h"
 
 #include <cstdio>
 #include <string_view>
 
 #include <nlohmann/json.hpp>
 
-#include "Errors.h"
+#include "board/model/Errors.h"
 
-namespace tool {
+namespace qor::tool {
 namespace {
 
 constexpr std::string_view trainSuffix = ".pulsetrain";
@@ -54,4 +54,4 @@ void printWritten(const Context& context, const std::vector<Assignment>& assignm
   std::printf("%s\n", json.dump(2).c_str());
 }
 
-}  // namespace tool
+}  // namespace qor::tool

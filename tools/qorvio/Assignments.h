@@ -3,9 +3,9 @@
 
 #include <string>
 
-#include "Context.h"
+#include "tools/qorvio/Context.h"
 
-namespace tool {
+namespace qor::tool {
 
 /// "NAME=VALUE", or "NAME.pulsetrain=V0,V1,...". Throws WrongUse.
 Assignment parseAssignment(const SignalTable& signals, const std::string& text);
@@ -13,4 +13,4 @@ Assignment parseAssignment(const SignalTable& signals, const std::string& text);
 /// With --json, tells on stdout what was written.
 void printWritten(const Context& context, const std::vector<Assignment>& assignments);
 
-}  // namespace tool
+}  // namespace qor::tool

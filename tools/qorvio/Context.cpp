@@ -1,12 +1,12 @@
-#include "Context.h"
+#include "tools/qorvio/Context.h"
 
 #include <cstdlib>
 #include <filesystem>
 
-#include "Errors.h"
-#include "TomlPlace.h"
+#include "board/model/Errors.h"
+#include "board/model/TomlPlace.h"
 
-namespace tool {
+namespace qor::tool {
 namespace {
 
 void fillFromEnvironment(std::string& value, const char* variable) {
@@ -86,4 +86,4 @@ const SignalTable& Context::signals() {
   return *signals_;
 }
 
-}  // namespace tool
+}  // namespace qor::tool

@@ -5,12 +5,12 @@
 #include <optional>
 #include <string>
 
-#include "CoreSession.h"
-#include "CountingCable.h"
-#include "Link.h"
-#include "SignalTable.h"
+#include "board/model/SignalTable.h"
+#include "board/session/CoreSession.h"
+#include "board/session/CountingCable.h"
+#include "board/session/Link.h"
 
-namespace tool {
+namespace qor::tool {
 
 /// From the command line, else the environment (QORVIO_CABLE, QORVIO_CORE, QORVIO_SIGNALS), else qorvio.toml in the
 /// working folder.
@@ -54,4 +54,4 @@ class Context {
   std::optional<SignalTable> signals_;
 };
 
-}  // namespace tool
+}  // namespace qor::tool

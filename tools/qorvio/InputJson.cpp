@@ -1,6 +1,6 @@
-#include "InputJson.h"
+#include "tools/qorvio/InputJson.h"
 
-namespace tool {
+namespace qor::tool {
 namespace {
 
 std::string bitsIn(const Bytes& portImage, const Signal& input) {
@@ -31,4 +31,4 @@ void addActivity(nlohmann::ordered_json& entry, const Signal& input, const Sampl
   entry["sync_activity_down" + ending] = bitsIn(sample.syncSyncDown, input);
 }
 
-}  // namespace tool
+}  // namespace qor::tool

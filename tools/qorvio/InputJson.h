@@ -5,9 +5,9 @@
 
 #include <nlohmann/json.hpp>
 
-#include "CoreSession.h"
+#include "board/session/CoreSession.h"
 
-namespace tool {
+namespace qor::tool {
 
 /// Name, width, value and activity flags, in the order of the man page. `radix` as in shown().
 nlohmann::ordered_json jsonOf(const Signal& input, const Sample& sample, const Radix* radix = nullptr);
@@ -16,4 +16,4 @@ nlohmann::ordered_json jsonOf(const Signal& input, const Sample& sample, const R
 void addActivity(nlohmann::ordered_json& entry, const Signal& input, const Sample& sample,
                  const std::string& ending);
 
-}  // namespace tool
+}  // namespace qor::tool

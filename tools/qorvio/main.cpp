@@ -1,17 +1,18 @@
 #include <cstdio>
 #include <exception>
 
-#include "Commands.h"
-#include "Errors.h"
+#include "board/model/Errors.h"
+#include "tools/qorvio/commands/Commands.h"
 
 namespace {
 
 enum ExitStatus { done = 0, deviceFailed = 1, wrongUse = 2 };
 
-constexpr tool::AddCommand commands[] = {
-    tool::addScan,     tool::addInfo,  tool::addSignals,  tool::addRead,   tool::addWrite,
-    tool::addGestures, tool::addPort,  tool::addWatch,    tool::addRecord, tool::addPlay,
-    tool::addDoctor,   tool::addBench, tool::addSimulate,
+constexpr qor::tool::AddCommand commands[] = {
+    qor::tool::addScan,     qor::tool::addInfo,     qor::tool::addSignals, qor::tool::addRead,
+    qor::tool::addWrite,    qor::tool::addGestures, qor::tool::addPort,    qor::tool::addWatch,
+    qor::tool::addRecord,   qor::tool::addPlay,     qor::tool::addDoctor,  qor::tool::addBench,
+    qor::tool::addSimulate,
 };
 
 int complain(const char* what, ExitStatus status) {
@@ -30,14 +31,14 @@ int runCommand(CLI::App& app, int argc, char** argv) {
     if (app.get_subcommands().empty() && !app.remaining().empty())
       return complain(("no such command: " + app.remaining().front()).c_str(), wrongUse);
     return complain(error.what(), wrongUse);
-  } catch (const tool::WrongUse& error) {
+  } catch (const qor::WrongUse& error) {
     return complain(error.what(), wrongUse);
   } catch (const std::exception& error) {
     return complain(error.what(), deviceFailed);
   }
 }
 
-void addSettings(CLI::App& app, tool::Settings& settings) {
+void addSettings(CLI::App& app, qor::tool::Settings& settings) {
   app.add_option("--cable", settings.cable,
                  "the board: sim:, sim:BOARD.toml, rbb:HOST:PORT, openocd:HOST:PORT or openocd:?config=FILE "
                  "(QORVIO_CABLE)")
@@ -52,13 +53,13 @@ void addSettings(CLI::App& app, tool::Settings& settings) {
 
 int runTool(int argc, char** argv) {
   CLI::App app{"Virtual inputs and outputs inside an FPGA, by name.", "qorvio"};
-  tool::Context context;
+  qor::tool::Context context;
   app.require_subcommand(1);
   app.fallthrough();
   app.set_version_flag("--version", "qorvio " QORVIO_VERSION);
   addSettings(app, context.settings);
   app.footer("Example:\n  qorvio scan\n  qorvio COMMAND --help");
-  for (const tool::AddCommand add : commands) add(app, context);
+  for (const qor::tool::AddCommand add : commands) add(app, context);
   return runCommand(app, argc, argv);
 }
 

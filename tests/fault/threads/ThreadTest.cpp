@@ -4,7 +4,7 @@
 #include <optional>
 #include <thread>
 
-#include "Board.h"
+#include "tests/system/Board.h"
 
 namespace {
 

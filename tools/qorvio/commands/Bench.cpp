@@ -5,12 +5,12 @@
 
 #include <nlohmann/json.hpp>
 
-#include "Commands.h"
-#include "CountingCable.h"
-#include "Errors.h"
-#include "Table.h"
+#include "board/model/Errors.h"
+#include "board/session/CountingCable.h"
+#include "tools/qorvio/commands/Commands.h"
+#include "tools/qorvio/terminal/Table.h"
 
-namespace tool {
+namespace qor::tool {
 namespace {
 
 using Clock = std::chrono::steady_clock;
@@ -97,4 +97,4 @@ void addBench(CLI::App& app, Context& context) {
   command->callback([&context, polls] { bench(context, *polls); });
 }
 
-}  // namespace tool
+}  // namespace qor::tool

@@ -3,9 +3,9 @@
 
 #include <CLI/CLI.hpp>
 
-#include "Context.h"
+#include "tools/qorvio/Context.h"
 
-namespace tool {
+namespace qor::tool {
 
 using AddCommand = void (*)(CLI::App& app, Context& context);
 
@@ -23,4 +23,4 @@ void addDoctor(CLI::App& app, Context& context);
 void addBench(CLI::App& app, Context& context);
 void addSimulate(CLI::App& app, Context& context);
 
-}  // namespace tool
+}  // namespace qor::tool

@@ -5,12 +5,12 @@
 
 #include <nlohmann/json.hpp>
 
-#include "Commands.h"
-#include "Errors.h"
-#include "Stop.h"
-#include "Table.h"
+#include "board/model/Errors.h"
+#include "os/Stop.h"
+#include "tools/qorvio/commands/Commands.h"
+#include "tools/qorvio/terminal/Table.h"
 
-namespace tool {
+namespace qor::tool {
 namespace {
 
 struct Check {
@@ -184,4 +184,4 @@ void addDoctor(CLI::App& app, Context& context) {
   command->callback([&context, dry] { doctor(context, !*dry); });
 }
 
-}  // namespace tool
+}  // namespace qor::tool

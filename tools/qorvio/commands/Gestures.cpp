@@ -1,12 +1,12 @@
 // pulse, toggle, press: what one does to a bit at the bench.
 #include <chrono>
 
-#include "Assignments.h"
-#include "Commands.h"
-#include "Duration.h"
-#include "Stop.h"
+#include "board/model/Duration.h"
+#include "os/Stop.h"
+#include "tools/qorvio/Assignments.h"
+#include "tools/qorvio/commands/Commands.h"
 
-namespace tool {
+namespace qor::tool {
 namespace {
 
 struct PulseOptions {
@@ -86,4 +86,4 @@ void addGestures(CLI::App& app, Context& context) {
   addPress(app, context);
 }
 
-}  // namespace tool
+}  // namespace qor::tool

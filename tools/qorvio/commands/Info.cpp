@@ -2,11 +2,11 @@
 
 #include <nlohmann/json.hpp>
 
-#include "Commands.h"
-#include "CoreFields.h"
-#include "Table.h"
+#include "board/model/CoreFields.h"
+#include "tools/qorvio/commands/Commands.h"
+#include "tools/qorvio/terminal/Table.h"
 
-namespace tool {
+namespace qor::tool {
 namespace {
 
 void print(const QORVIO_CORE_INFO& info, QOR_CORE_REF ref, bool asJson) {
@@ -32,4 +32,4 @@ void addInfo(CLI::App& app, Context& context) {
   });
 }
 
-}  // namespace tool
+}  // namespace qor::tool

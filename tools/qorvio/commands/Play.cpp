@@ -2,13 +2,13 @@
 #include <chrono>
 #include <cstdio>
 
-#include "Commands.h"
-#include "Duration.h"
-#include "Errors.h"
-#include "PlayScript.h"
-#include "Stop.h"
+#include "board/model/Duration.h"
+#include "board/model/Errors.h"
+#include "board/record/PlayScript.h"
+#include "os/Stop.h"
+#include "tools/qorvio/commands/Commands.h"
 
-namespace tool {
+namespace qor::tool {
 namespace {
 
 using Clock = std::chrono::steady_clock;
@@ -121,4 +121,4 @@ void addPlay(CLI::App& app, Context& context) {
   command->callback([&context, options] { play(context, *options); });
 }
 
-}  // namespace tool
+}  // namespace qor::tool

@@ -3,12 +3,12 @@
 
 #include <nlohmann/json.hpp>
 
-#include "Assignments.h"
-#include "Commands.h"
-#include "Errors.h"
-#include "Table.h"
+#include "board/model/Errors.h"
+#include "tools/qorvio/Assignments.h"
+#include "tools/qorvio/commands/Commands.h"
+#include "tools/qorvio/terminal/Table.h"
 
-namespace tool {
+namespace qor::tool {
 namespace {
 
 struct SetOptions {
@@ -99,4 +99,4 @@ void addPort(CLI::App& app, Context& context) {
   setCommand->callback([&context, options] { set(context, *options); });
 }
 
-}  // namespace tool
+}  // namespace qor::tool

@@ -1,11 +1,11 @@
 #include <cstdio>
 
-#include "Activity.h"
-#include "Commands.h"
-#include "InputJson.h"
-#include "Table.h"
+#include "board/record/Activity.h"
+#include "tools/qorvio/InputJson.h"
+#include "tools/qorvio/commands/Commands.h"
+#include "tools/qorvio/terminal/Table.h"
 
-namespace tool {
+namespace qor::tool {
 namespace {
 
 struct ReadOptions {
@@ -54,4 +54,4 @@ void addRead(CLI::App& app, Context& context) {
   command->callback([&context, options] { read(context, *options); });
 }
 
-}  // namespace tool
+}  // namespace qor::tool

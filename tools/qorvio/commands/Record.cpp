@@ -2,12 +2,12 @@
 #include <chrono>
 #include <cstdio>
 
-#include "Commands.h"
-#include "Duration.h"
-#include "Errors.h"
-#include "Recording.h"
+#include "board/model/Duration.h"
+#include "board/model/Errors.h"
+#include "board/record/Recording.h"
+#include "tools/qorvio/commands/Commands.h"
 
-namespace tool {
+namespace qor::tool {
 namespace {
 
 using std::chrono::nanoseconds;
@@ -98,4 +98,4 @@ void addRecord(CLI::App& app, Context& context) {
   command->callback([&context, options] { record(context, *options); });
 }
 
-}  // namespace tool
+}  // namespace qor::tool

@@ -2,11 +2,11 @@
 
 #include <nlohmann/json.hpp>
 
-#include "Commands.h"
-#include "CoreFields.h"
-#include "Table.h"
+#include "board/model/CoreFields.h"
+#include "tools/qorvio/commands/Commands.h"
+#include "tools/qorvio/terminal/Table.h"
 
-namespace tool {
+namespace qor::tool {
 namespace {
 
 using nlohmann::json;
@@ -79,4 +79,4 @@ void addScan(CLI::App& app, Context& context) {
   });
 }
 
-}  // namespace tool
+}  // namespace qor::tool

@@ -2,11 +2,11 @@
 
 #include <nlohmann/json.hpp>
 
-#include "Commands.h"
-#include "Errors.h"
-#include "Table.h"
+#include "board/model/Errors.h"
+#include "tools/qorvio/commands/Commands.h"
+#include "tools/qorvio/terminal/Table.h"
 
-namespace tool {
+namespace qor::tool {
 namespace {
 
 nlohmann::ordered_json jsonOf(const Signal& signal) {
@@ -77,4 +77,4 @@ void addSignals(CLI::App& app, Context& context) {
   });
 }
 
-}  // namespace tool
+}  // namespace qor::tool

@@ -4,12 +4,12 @@
 #include <nlohmann/json.hpp>
 
 #include "BitbangServer.h"
-#include "Commands.h"
-#include "Errors.h"
 #include "Sim.h"
-#include "Stop.h"
+#include "board/model/Errors.h"
+#include "os/Stop.h"
+#include "tools/qorvio/commands/Commands.h"
 
-namespace tool {
+namespace qor::tool {
 namespace {
 
 constexpr const char* host = "127.0.0.1";
@@ -61,4 +61,4 @@ void addSimulate(CLI::App& app, Context& context) {
   command->callback([&context, options] { simulate(context.settings, *options); });
 }
 
-}  // namespace tool
+}  // namespace qor::tool

@@ -2,18 +2,18 @@
 #include <chrono>
 #include <cstdio>
 
-#include "Commands.h"
-#include "Duration.h"
-#include "Errors.h"
-#include "InputJson.h"
-#include "InputWatch.h"
-#include "Output.h"
-#include "Screen.h"
-#include "Stop.h"
-#include "Terminal.h"
-#include "WatchTables.h"
+#include "board/model/Duration.h"
+#include "board/model/Errors.h"
+#include "board/record/InputWatch.h"
+#include "os/Output.h"
+#include "os/Stop.h"
+#include "os/Terminal.h"
+#include "tools/qorvio/InputJson.h"
+#include "tools/qorvio/commands/Commands.h"
+#include "tools/qorvio/terminal/Screen.h"
+#include "tools/qorvio/terminal/WatchTables.h"
 
-namespace tool {
+namespace qor::tool {
 namespace {
 
 using Clock = std::chrono::steady_clock;
@@ -210,4 +210,4 @@ void addWatch(CLI::App& app, Context& context) {
   command->callback([&context, options] { runWatch(context, *options); });
 }
 
-}  // namespace tool
+}  // namespace qor::tool

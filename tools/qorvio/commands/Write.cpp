@@ -2,10 +2,10 @@
 
 #include <nlohmann/json.hpp>
 
-#include "Assignments.h"
-#include "Commands.h"
+#include "tools/qorvio/Assignments.h"
+#include "tools/qorvio/commands/Commands.h"
 
-namespace tool {
+namespace qor::tool {
 
 void addWrite(CLI::App& app, Context& context) {
   auto texts = std::make_shared<std::vector<std::string>>();
@@ -23,4 +23,4 @@ void addWrite(CLI::App& app, Context& context) {
   });
 }
 
-}  // namespace tool
+}  // namespace qor::tool

@@ -1,0 +1,29 @@
+// The twelve fields of a core's information by name.
+#pragma once
+
+#include "QorVIO_Records.h"
+
+namespace qor {
+
+struct CoreField {
+  const char* name;
+  unsigned QORVIO_CORE_INFO::*member;
+  bool generic;  ///< cores of other types have it too
+};
+
+inline constexpr CoreField coreFields[] = {
+    {"manufacturer_id", &QORVIO_CORE_INFO::manufacturer_id, true},
+    {"core_type", &QORVIO_CORE_INFO::core_type, true},
+    {"core_major_version", &QORVIO_CORE_INFO::core_major_version, true},
+    {"core_minor_version", &QORVIO_CORE_INFO::core_minor_version, true},
+    {"core_revision", &QORVIO_CORE_INFO::core_revision, true},
+    {"cg_major_version", &QORVIO_CORE_INFO::cg_major_version, false},
+    {"cg_minor_version", &QORVIO_CORE_INFO::cg_minor_version, false},
+    {"cg_minor_version_alpha", &QORVIO_CORE_INFO::cg_minor_version_alpha, false},
+    {"async_input_count", &QORVIO_CORE_INFO::async_input_count, false},
+    {"sync_input_count", &QORVIO_CORE_INFO::sync_input_count, false},
+    {"async_output_count", &QORVIO_CORE_INFO::async_output_count, false},
+    {"sync_output_count", &QORVIO_CORE_INFO::sync_output_count, false},
+};
+
+}  // namespace qor

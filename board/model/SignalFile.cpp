@@ -1,0 +1,156 @@
+// Signals files: what stands in them, and a first one for a core.
+#include <algorithm>
+#include <charconv>
+
+#include "board/model/Errors.h"
+#include "board/model/SignalTable.h"
+#include "board/model/TomlPlace.h"
+#include "board/model/Value.h"
+
+namespace qor {
+namespace {
+
+constexpr Port ports[] = {Port::asyncOut, Port::syncOut, Port::asyncIn, Port::syncIn};
+constexpr unsigned widest = 65535;
+
+Port portNamed(const TomlPlace& place) {
+  const std::string text = place.text();
+  for (Port port : ports)
+    if (text == portName(port)) return port;
+  place.fail("must be async_out, sync_out, async_in or sync_in, is \"" + text + "\"");
+}
+
+unsigned bitNumber(const TomlPlace& place, std::int64_t number) {
+  if (number < 0 || number >= widest) place.fail("a bit is 0 to 65534, is " + std::to_string(number));
+  return static_cast<unsigned>(number);
+}
+
+unsigned bitNumber(const TomlPlace& place, std::string_view text) {
+  unsigned number = 0;
+  const auto [rest, error] = std::from_chars(text.data(), text.data() + text.size(), number);
+  if (error != std::errc() || rest != text.data() + text.size())
+    place.fail("must be a bit, a list of bits or a range such as \"7:4\", has \"" + std::string(text) + "\"");
+  return bitNumber(place, std::int64_t{number});
+}
+
+// "7:4": the bit before the colon is the most significant one.
+std::vector<unsigned> bitRange(const TomlPlace& place) {
+  const std::string text = place.text();
+  const std::size_t colon = text.find(':');
+  const unsigned high = bitNumber(place, std::string_view(text).substr(0, colon));
+  if (colon == text.npos) return {high};
+  const unsigned low = bitNumber(place, std::string_view(text).substr(colon + 1));
+  std::vector<unsigned> bits;
+  for (unsigned bit = low;; bit = bit < high ? bit + 1 : bit - 1) {
+    bits.push_back(bit);
+    if (bit == high) return bits;
+  }
+}
+
+std::vector<unsigned> bitsOf(const TomlPlace& place) {
+  if (const auto* number = place.node().as_integer()) return {bitNumber(place, number->get())};
+  const toml::array* const list = place.node().as_array();
+  if (list == nullptr) return bitRange(place);
+  std::vector<unsigned> bits;
+  for (const toml::node& each : *list) {
+    const auto* number = each.as_integer();
+    if (number == nullptr) place.fail("must be a list of whole numbers");
+    bits.push_back(bitNumber(place, number->get()));
+  }
+  if (bits.empty()) place.fail("names no bit");
+  std::reverse(bits.begin(), bits.end());  // the first one is the most significant, as in a range
+  return bits;
+}
+
+void readEnumeration(const TomlPlace& place, Signal& signal) {
+  for (const auto& [name, node] : place.table()) {
+    const auto* number = node.as_integer();
+    if (number == nullptr || number->get() < 0) place.at(name.str()).fail("must be a whole number from 0 on");
+    const auto value = static_cast<std::uint64_t>(number->get());
+    if (signal.width() < 64 && value >> signal.width() != 0)
+      place.at(name.str()).fail("is too wide for " + std::to_string(signal.width()) + " bits");
+    signal.names.emplace_back(std::string(name.str()), value);
+  }
+}
+
+Radix radixOf(const TomlPlace& place) {
+  const std::string text = place.text();
+  for (Radix radix : {Radix::hex, Radix::bin, Radix::dec, Radix::signedDec})
+    if (text == radixName(radix)) return radix;
+  place.fail("must be hex, bin, dec or signed, is \"" + text + "\"");
+}
+
+double scaleOf(const TomlPlace& place) {
+  if (const auto* number = place.node().as_floating_point()) return number->get();
+  if (const auto* number = place.node().as_integer()) return static_cast<double>(number->get());
+  place.fail("must be a number");
+}
+
+std::string nameOf(const TomlPlace& place, const std::string& text) {
+  const bool forbidden = std::any_of(text.begin(), text.end(), [](char letter) {
+    return static_cast<unsigned char>(letter) <= ' ' ||
+           std::string_view(".=[]").find(letter) != std::string_view::npos;
+  });
+  if (text.empty() || forbidden) place.fail("must be a name without blanks and . = [ ], is \"" + text + "\"");
+  return text;
+}
+
+Signal readSignal(const TomlPlace& place) {
+  place.requireKeys({"name", "port", "bits", "radix", "enum", "scale", "unit", "description"});
+  Signal signal;
+  signal.name = nameOf(place.at("name"), place.at("name").text());
+  signal.port = portNamed(place.at("port"));
+  signal.bits = bitsOf(place.at("bits"));
+  if (place.has("radix")) signal.radix = radixOf(place.at("radix"));
+  if (place.has("enum")) readEnumeration(place.at("enum"), signal);
+  if (place.has("scale")) signal.scale = scaleOf(place.at("scale"));
+  if (place.has("unit")) signal.unit = place.at("unit").text();
+  if (place.has("description")) signal.description = place.at("description").text();
+  return signal;
+}
+
+void readSignals(const std::string& path, const toml::node& list, SignalTable& table) {
+  if (!list.is_array_of_tables())
+    TomlPlace(path, list, "signal").fail("must be tables, each headed [[signal]]");
+  for (const toml::node& each : *list.as_array()) {
+    const TomlPlace place(path, each, "signal[" + std::to_string(table.signals().size()) + "]");
+    if (!table.add(readSignal(place))) place.at("name").fail("is there already: " + place.at("name").text());
+  }
+}
+
+}  // namespace
+
+SignalTable readSignalFile(const std::string& path) {
+  const toml::table parsed = readToml(path);
+  const TomlPlace root(path, parsed, "");
+  root.requireKeys({"core", "signal"});
+  SignalTable table;
+  if (root.has("core")) {
+    try {
+      table.core = parseRef(root.at("core").text());
+    } catch (const WrongUse& error) {
+      root.at("core").fail(error.what());
+    }
+  }
+  if (root.has("signal")) readSignals(path, root.at("signal").node(), table);
+  return table;
+}
+
+std::string firstSignalFile(QOR_CORE_REF ref, const QORVIO_CORE_INFO& info) {
+  std::string text =
+      "# Names for port bits. bits: one bit, a range such as \"7:4\", or a list, most significant first.\n"
+      "# Also: radix = \"hex\" (bin, dec, signed), enum = { off = 0 }, scale = 0.5, unit = \"V\",\n"
+      "# description = \"...\".\n"
+      "core = \"" +
+      refText(ref) + "\"\n";
+  for (Port port : ports) {
+    for (unsigned bit = 0; bit < widthOf(info, port); ++bit) {
+      const std::string number = std::to_string(bit), name = portName(port);
+      text.append("\n[[signal]]\nname = \"").append(name).append("_").append(number);
+      text.append("\"\nport = \"").append(name).append("\"\nbits = ").append(number).append("\n");
+    }
+  }
+  return text;
+}
+
+}  // namespace qor

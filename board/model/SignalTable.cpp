@@ -1,0 +1,172 @@
+#include "board/model/SignalTable.h"
+
+#include <algorithm>
+#include <charconv>
+
+#include "board/model/Errors.h"
+
+namespace qor {
+namespace {
+
+char folded(char letter) {
+  return letter >= 'A' && letter <= 'Z' ? static_cast<char>(letter - 'A' + 'a') : letter;
+}
+
+std::string foldedName(std::string_view name) {
+  std::string text(name);
+  for (char& letter : text) letter = folded(letter);
+  return text;
+}
+
+Direction directionOf(const Signal& signal) {
+  return isInput(signal.port) ? Direction::input : Direction::output;
+}
+
+bool points(const Signal& signal, Direction direction) {
+  return directionOf(signal) == direction;
+}
+
+// How many letters to add, drop or change.
+std::size_t distance(std::string_view a, std::string_view b) {
+  std::vector<std::size_t> row(b.size() + 1);
+  for (std::size_t j = 0; j <= b.size(); ++j) row[j] = j;
+  for (std::size_t i = 1; i <= a.size(); ++i) {
+    std::size_t diagonal = std::exchange(row[0], i);
+    for (std::size_t j = 1; j <= b.size(); ++j) {
+      const std::size_t changed = diagonal + (folded(a[i - 1]) == folded(b[j - 1]) ? 0 : 1);
+      diagonal = std::exchange(row[j], std::min({row[j] + 1, row[j - 1] + 1, changed}));
+    }
+  }
+  return row[b.size()];
+}
+
+const char* wordFor(Direction direction) {
+  return direction == Direction::input ? "input" : "output";
+}
+
+// The nearest name, if it is near enough to have been meant.
+const Signal* nearest(const std::vector<Signal>& signals, std::string_view name, Direction direction) {
+  const Signal* best = nullptr;
+  std::size_t least = std::max<std::size_t>(2, name.size() / 3) + 1;
+  for (const Signal& each : signals) {
+    if (!points(each, direction)) continue;
+    const std::size_t far = distance(name, each.name);
+    if (far < least) {
+      least = far;
+      best = &each;
+    }
+  }
+  return best;
+}
+
+bool parseNumber(std::string_view text, unsigned& number) {
+  const auto [rest, error] = std::from_chars(text.data(), text.data() + text.size(), number);
+  return error == std::errc() && rest == text.data() + text.size();
+}
+
+// The bits that stand in brackets behind the name.
+Signal slice(const Signal& whole, std::string_view name, std::string_view inside) {
+  const std::size_t colon = inside.find(':');
+  unsigned high = 0, low = 0;
+  const bool good =
+      parseNumber(inside.substr(0, colon), high) &&
+      (colon == inside.npos ? parseNumber(inside, low) : parseNumber(inside.substr(colon + 1), low));
+  if (!good) throw WrongUse("not a bit or a range of bits in brackets: " + std::string(name));
+  if (std::max(high, low) >= whole.width())
+    throw WrongUse(whole.name + " has " + std::to_string(whole.width()) +
+                   (whole.width() == 1 ? " bit" : " bits") + ": " + std::string(name));
+  Signal part{whole.name + "[" + std::string(inside) + "]", whole.port, {}, whole.radix};
+  for (unsigned bit = low;; bit = bit < high ? bit + 1 : bit - 1) {
+    part.bits.push_back(whole.bits[bit]);
+    if (bit == high) return part;
+  }
+}
+
+}  // namespace
+
+bool SignalTable::add(Signal signal) {
+  auto& places = places_[static_cast<unsigned>(directionOf(signal))];
+  if (!places.emplace(foldedName(signal.name), signals_.size()).second) return false;
+  signals_.push_back(std::move(signal));
+  fileSignals_ = signals_.size();
+  return true;
+}
+
+void SignalTable::addWholePorts(const QORVIO_CORE_INFO& info) {
+  const std::size_t before = fileSignals_;
+  for (Port port : {Port::asyncOut, Port::syncOut, Port::asyncIn, Port::syncIn}) {
+    Signal whole{wholePortName(port), port};
+    for (unsigned bit = 0; bit < widthOf(info, port); ++bit) whole.bits.push_back(bit);
+    if (!whole.bits.empty()) add(std::move(whole));
+  }
+  fileSignals_ = before;
+}
+
+const Signal* SignalTable::exact(std::string_view name, Direction direction) const {
+  const auto& places = places_[static_cast<unsigned>(direction)];
+  const auto place = places.find(foldedName(name));
+  return place != places.end() ? &signals_[place->second] : nullptr;
+}
+
+void SignalTable::failUnknown(std::string_view name, Direction direction) const {
+  const Direction other = direction == Direction::input ? Direction::output : Direction::input;
+  std::string hint;
+  if (exact(name, other) != nullptr) {
+    hint = std::string(" (it is an ") + wordFor(other) + ")";
+  } else if (const Signal* near = nearest(signals_, name, direction)) {
+    hint = " (did you mean " + near->name + "?)";
+  }
+  throw WrongUse(std::string("no ") + wordFor(direction) + " of that name" + hint + ": " + std::string(name));
+}
+
+Signal SignalTable::find(std::string_view name, Direction direction) const {
+  if (const Signal* signal = exact(name, direction)) return *signal;
+  const std::size_t bracket = name.find('[');
+  if (bracket == name.npos || name.back() != ']') failUnknown(name, direction);
+  const Signal* whole = exact(name.substr(0, bracket), direction);
+  if (whole == nullptr) failUnknown(name.substr(0, bracket), direction);
+  return slice(*whole, name, name.substr(bracket + 1, name.size() - bracket - 2));
+}
+
+std::vector<Signal> SignalTable::select(const std::vector<std::string>& names, Direction direction) const {
+  std::vector<Signal> chosen;
+  chosen.reserve(names.size());
+  for (const std::string& name : names) chosen.push_back(find(name, direction));
+  if (!names.empty()) return chosen;
+  const auto pick = [&](std::size_t first, std::size_t last) {
+    for (std::size_t i = first; i < last; ++i)
+      if (points(signals_[i], direction)) chosen.push_back(signals_[i]);
+  };
+  pick(0, fileSignals_);
+  if (chosen.empty()) pick(fileSignals_, signals_.size());
+  return chosen;
+}
+
+std::vector<std::string> misfits(const SignalTable& table, const QORVIO_CORE_INFO& info) {
+  std::vector<std::string> lines;
+  for (std::size_t i = 0; i < table.fileSignals(); ++i) {
+    const Signal& signal = table.signals()[i];
+    const unsigned width = widthOf(info, signal.port);
+    const unsigned highest = *std::max_element(signal.bits.begin(), signal.bits.end());
+    if (highest < width) continue;
+    lines.push_back(signal.name + ": bit " + std::to_string(highest) + " is beyond " + portName(signal.port) +
+                    ", which has " + std::to_string(width) + (width == 1 ? " bit" : " bits"));
+  }
+  return lines;
+}
+
+unsigned widthOf(const QORVIO_CORE_INFO& info, Port port) {
+  switch (port) {
+    case Port::syncOut:
+      return info.sync_output_count;
+    case Port::syncIn:
+      return info.sync_input_count;
+    case Port::asyncOut:
+      return info.async_output_count;
+    case Port::asyncIn:
+      break;
+  }
+  return info.async_input_count;
+}
+
+}  // namespace qor

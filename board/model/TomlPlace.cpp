@@ -1,0 +1,58 @@
+#include "board/model/TomlPlace.h"
+
+#include <algorithm>
+#include <cerrno>
+#include <filesystem>
+#include <fstream>
+#include <iterator>
+#include <system_error>
+
+#include "board/model/Errors.h"
+
+namespace qor {
+
+toml::table readToml(const std::string& path) {
+  std::error_code none;
+  const int directory = std::filesystem::is_directory(path, none) ? EISDIR : 0;
+  std::ifstream file(path, std::ios::binary);
+  const int error = directory != 0 ? directory : errno;
+  if (directory != 0 || !file)
+    throw WrongUse("cannot read the file " + path + ": " + std::generic_category().message(error));
+  const std::string text{std::istreambuf_iterator<char>(file), {}};
+  try {
+    return toml::parse(text);
+  } catch (const toml::parse_error& wrong) {
+    throw WrongUse(path + ":" + std::to_string(wrong.source().begin.line) + ": " +
+                   std::string(wrong.description()));
+  }
+}
+
+void TomlPlace::fail(const std::string& problem) const {
+  throw WrongUse(*file_ + ":" + std::to_string(node_->source().begin.line) + ": " +
+                 (key_.empty() ? "" : key_ + ": ") + problem);
+}
+
+const toml::table& TomlPlace::table() const {
+  if (const toml::table* table = node_->as_table()) return *table;
+  fail("must be a table");
+}
+
+std::string TomlPlace::text() const {
+  if (const auto* text = node_->as_string()) return text->get();
+  fail("must be a text");
+}
+
+TomlPlace TomlPlace::at(std::string_view name) const {
+  const std::string key = key_.empty() ? std::string(name) : key_ + "." + std::string(name);
+  if (const toml::node* node = table().get(name)) return {*file_, *node, key};
+  TomlPlace(*file_, *node_, key).fail("is missing");
+}
+
+void TomlPlace::requireKeys(const std::vector<std::string_view>& known) const {
+  for (const auto& [key, node] : table()) {
+    if (std::find(known.begin(), known.end(), key.str()) == known.end())
+      at(key.str()).fail("is no key of this file");
+  }
+}
+
+}  // namespace qor

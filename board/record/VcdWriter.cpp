@@ -1,0 +1,120 @@
+// Value change dumps: one variable a signal; one "moved" bit a signal, for activity between polls; a count of missed
+// polls, unknown (x) from the poll before them to the poll after.
+#include "board/record/SampleWriter.h"
+
+namespace qor {
+namespace {
+
+// Viewers take brackets for bits of a vector, and dots for scopes.
+std::string vcdName(std::string name) {
+  for (char& letter : name)
+    if (letter == '.' || letter == '[' || letter == ']' || letter == ':') letter = '_';
+  return name;
+}
+
+class VcdWriter : public SampleWriter {
+ public:
+  explicit VcdWriter(const std::string& path) : file_(path) {}
+
+  void begin(const std::vector<Signal>& signals, const std::string& core) override {
+    signals_ = signals;
+    for (std::size_t i = 0; i <= 2 * signals.size(); ++i) ids_.push_back(idOf(i));
+    std::string& text = file_.text();
+    text += "$version qorvio $end\n$timescale 1 ns $end\n$scope module core_" + vcdName(core) + " $end\n";
+    for (std::size_t i = 0; i < signals.size(); ++i) variable(signals[i].width(), 2 * i, signals[i].name);
+    for (std::size_t i = 0; i < signals.size(); ++i) variable(1, 2 * i + 1, signals[i].name + "_moved");
+    variable(32, 2 * signals.size(), "missed_polls");
+    text += "$upscope $end\n$enddefinitions $end\n";
+  }
+
+  void add(const Poll& poll) override {
+    if (poll.missed != 0 && !isFirst_ && poll.nanoseconds > last_ + 1) missing();
+    const std::size_t before = file_.text().size();
+    file_.text() += '#';
+    file_.text() += std::to_string(poll.nanoseconds);
+    file_.text() += '\n';
+    const std::size_t stamped = file_.text().size();
+    for (std::size_t i : poll.changed) value(i, poll.values[i]);
+    for (std::size_t i : isFirst_ ? poll.changed : poll.movedOtherwise) moved(i, poll.moved[i] != 0);
+    if (isFirst_ || poll.missed != 0) missed(poll.missed);
+    isFirst_ = false;
+    last_ = poll.nanoseconds;
+    // A poll that shows nothing new needs no time stamp; the last one gets its own at the end.
+    if (file_.text().size() == stamped) file_.text().resize(before);
+    file_.spill();
+  }
+
+  void addMissed(std::uint64_t nanoseconds, std::uint64_t count) override {
+    if (!isFirst_ && nanoseconds > last_ + 1) missing();
+    file_.text() += '#' + std::to_string(nanoseconds) + '\n';
+    missed(count);
+    last_ = nanoseconds;
+  }
+
+  void end() override {
+    file_.text() += "#" + std::to_string(last_ + 1) + "\n";
+    file_.close();
+  }
+
+ private:
+  static std::string idOf(std::size_t number) {
+    std::string id;
+    do {
+      id += static_cast<char>('!' + number % 94);
+      number /= 94;
+    } while (number-- != 0);
+    return id;
+  }
+
+  void variable(unsigned width, std::size_t number, const std::string& name) {
+    file_.text() +=
+        "$var wire " + std::to_string(width) + ' ' + ids_[number] + ' ' + vcdName(name) + " $end\n";
+  }
+
+  void endValue(std::size_t number) { (file_.text() += ids_[number]) += '\n'; }
+
+  void value(std::size_t i, const Bytes& value) {
+    std::string& text = file_.text();
+    if (signals_[i].width() == 1) {
+      text += static_cast<char>('0' + value[0]);
+    } else {
+      text += 'b';
+      appendDigits(text, value, signals_[i].width(), Radix::bin);
+      text += ' ';
+    }
+    endValue(2 * i);
+  }
+
+  void moved(std::size_t i, bool isMoved) {
+    file_.text() += isMoved ? '1' : '0';
+    endValue(2 * i + 1);
+  }
+
+  void missing() {
+    file_.text() += '#' + std::to_string(last_ + 1) + "\nbx ";
+    endValue(2 * signals_.size());
+  }
+
+  void missed(std::uint64_t count) {
+    missed_ += count;
+    file_.text() += 'b';
+    for (unsigned bit = 32; bit-- > 0;) file_.text() += static_cast<char>('0' + (missed_ >> bit & 1));
+    file_.text() += ' ';
+    endValue(2 * signals_.size());
+  }
+
+  OutputFile file_;
+  std::vector<Signal> signals_;
+  std::vector<std::string> ids_;
+  std::uint64_t missed_ = 0;
+  std::uint64_t last_ = 0;
+  bool isFirst_ = true;
+};
+
+}  // namespace
+
+std::unique_ptr<SampleWriter> vcdWriter(const std::string& path) {
+  return std::make_unique<VcdWriter>(path);
+}
+
+}  // namespace qor

@@ -1,0 +1,120 @@
+#include "board/session/Link.h"
+
+#include <array>
+#include <charconv>
+#include <utility>
+
+#include "QorVIO_Core.h"
+#include "board/model/Errors.h"
+
+namespace qor {
+namespace {
+
+using QorRT::Qor_ByteBuffer;
+
+constexpr unsigned statusBytes = 16, statusBits = 8 * statusBytes;
+constexpr unsigned coresOfAHub = 16;
+
+// Reads the status word; false when there is no such core. Throws when nothing answers.
+bool probe(unsigned session, FoundCore& core) {
+  const QorRT::QorJtagTargetLock lock(session, 60000);
+  QOR_CORE_INFO head{};
+  Qor_ByteBuffer word(statusBytes, statusBytes, statusBytes);
+  QorRT::Qor_CoreComm::getCoreStatus(session, core.ref, &head, word, statusBits);
+  if (head.core_type == 0 && head.manufacturer_id == 0) return false;
+  core.info = {};
+  core.info.manufacturer_id = head.manufacturer_id;
+  core.info.core_type = head.core_type;
+  core.info.core_major_version = head.core_major_version;
+  core.info.core_minor_version = head.core_minor_version;
+  core.info.core_revision = head.core_revision;
+  if (core.isVio())
+    QorRT::QorVIO_Core::getVioCoreStatus(session, core.ref, head, word, statusBits, &core.info);
+  return true;
+}
+
+bool isSilent(const std::exception& error) {
+  return std::string(error.what()).find("no debug hub answers") != std::string::npos;
+}
+
+void findBehind(Link& link, unsigned device, unsigned userChain, std::vector<FoundCore>& cores) {
+  for (unsigned index = 0; index < coresOfAHub; ++index) {
+    FoundCore core{{device, userChain, index}, {}};
+    try {
+      if (probe(link.session(), core)) cores.push_back(core);
+    } catch (const std::exception& error) {
+      if (!isSilent(error)) throw Failure(error.what());
+      return;
+    }
+  }
+}
+
+}  // namespace
+
+std::unique_ptr<QorRT::Qor_Cable> openCable(const std::string& url) {
+  try {
+    return QorRT::openCable(url.c_str());
+  } catch (const std::exception& error) {
+    throw Failure("cannot open the cable " + url + ": " + error.what());
+  }
+}
+
+Link::Link(std::unique_ptr<QorRT::Qor_Cable> cable) : session_(QorJtag_session_openCable(std::move(cable))) {
+  listen();
+}
+
+Link::~Link() {
+  QorJtag_session_close(session_);
+}
+
+void Link::listen() {
+  // The notice of an abort says nothing that the message before it did not.
+  QorJtag_session_setMessageHandler(session_, [this](unsigned type, const char* text) {
+    if (type == 0x100) message_ = text;
+  });
+}
+
+std::vector<QorRT::Qor_Device> Link::devices() const {
+  std::vector<QorRT::Qor_Device> devices;
+  QorJtag_session_getDevices(session_, devices);
+  return devices;
+}
+
+void Link::check(unsigned code) {
+  if (code != 0) throw Failure(takeMessage());
+}
+
+std::string Link::takeMessage() {
+  return std::exchange(message_, {});
+}
+
+std::vector<FoundCore> findCores(Link& link) {
+  std::vector<FoundCore> cores;
+  const std::size_t devices = link.devices().size();
+  for (unsigned device = 0; device < devices; ++device)
+    for (unsigned chain = 1; chain <= QorRT::Qor_Cable::userChainCount; ++chain)
+      findBehind(link, device, chain, cores);
+  return cores;
+}
+
+std::string refText(QOR_CORE_REF ref) {
+  return std::to_string(ref.device_index) + "." + std::to_string(ref.user_chain_number) + "." +
+         std::to_string(ref.core_index);
+}
+
+QOR_CORE_REF parseRef(const std::string& text) {
+  std::array<unsigned, 3> parts{};
+  const char* next = text.data();
+  const char* const end = next + text.size();
+  bool good = true;
+  for (std::size_t i = 0; i < parts.size(); ++i) {
+    if (i != 0) good = good && next != end && *next++ == '.';
+    const auto [rest, error] = std::from_chars(next, end, parts[i]);
+    good = good && error == std::errc();
+    next = rest;
+  }
+  if (!good || next != end) throw WrongUse("not a core address DEVICE.CHAIN.INDEX: " + text);
+  return {parts[0], parts[1], parts[2]};
+}
+
+}  // namespace qor

@@ -1,0 +1,45 @@
+// A terminal that is written to in place and hands out keys.
+#pragma once
+
+#include <signal.h>
+#include <termios.h>
+#include <chrono>
+#include <string_view>
+
+#include "os/Output.h"
+
+namespace qor {
+
+/// A character, or one of those below.
+using Key = int;
+constexpr Key noKey = 0, keyUp = 0x100, keyDown = 0x101, keyPageUp = 0x102, keyPageDown = 0x103,
+              endOfKeys = 0x104;
+
+/// From its construction to its end the terminal shows a screen of its own, without echo, cursor and line wrap;
+/// afterwards what it showed before.
+class Terminal {
+ public:
+  explicit Terminal(const Stop& stop);
+  Terminal(const Terminal&) = delete;
+  Terminal& operator=(const Terminal&) = delete;
+  ~Terminal();
+
+  /// How many rows it has, now.
+  std::size_t rows() const;
+
+  /// Whether it was resized since the call before.
+  bool takeResized();
+
+  /// Writes text and escape sequences. False when a Stop was asked for and the terminal takes no more.
+  bool write(std::string_view text) { return writeOutput(text, stop_); }
+
+  /// Waits so long for a key, or until a signal comes: then and afterwards there is none.
+  Key key(std::chrono::milliseconds wait);
+
+ private:
+  const Stop& stop_;
+  termios before_{};
+  struct sigaction resizeBefore_ {};
+};
+
+}  // namespace qor

@@ -1,0 +1,145 @@
+#include "platform/jtag/cable/wire/WireDevice.h"
+
+#include <array>
+#include <cstdio>
+#include <stdexcept>
+
+#include "platform/jtag/cable/boardfile/TomlEntry.h"
+#include "platform/jtag/cable/boardfile/TomlFile.h"
+#include "platform/jtag/cable/boardfile/TomlKeys.h"
+
+namespace QorRT {
+namespace {
+
+// Of a user register that there is not: all ones, which select BYPASS.
+constexpr std::uint64_t noOpcode = ~std::uint64_t{0};
+
+constexpr unsigned shortestIr = 2, longestIr = 64;  // bits
+
+void setIrLength(const TomlEntry& entry, DeviceEntry& device) {
+  const unsigned bits = entry.number();
+  if (bits < shortestIr || bits > longestIr) entry.fail("must be 2 to 64, is " + std::to_string(bits));
+  device.irLength = bits;
+}
+
+void setUserOpcodes(const TomlEntry& entry, DeviceEntry& device) {
+  const std::vector<unsigned> numbers = entry.numbers();
+  if (numbers.empty() || numbers.size() > Qor_Cable::userChainCount)
+    entry.fail("must be the opcodes of 1 to 4 user registers, is " + std::to_string(numbers.size()));
+  device.userOpcodes.emplace();
+  for (std::size_t i = 0; i < device.userOpcodes->size(); ++i)
+    (*device.userOpcodes)[i] = i < numbers.size() ? numbers[i] : noOpcode;
+}
+
+// A simulated board's file says more of its devices; that is for the simulation.
+constexpr std::array<TomlKey<DeviceEntry>, 6> deviceKeys{{
+    {"idcode", [](const TomlEntry& entry, DeviceEntry& device) { device.idcode = entry.number(); }},
+    {"ir_length", setIrLength},
+    {"user_opcodes", setUserOpcodes},
+    {"name", [](const TomlEntry& entry, DeviceEntry& device) { device.name = entry.text(); }},
+    {"tap", [](const TomlEntry& entry, DeviceEntry& device) { device.tap = entry.text(); }},
+    {"core", nullptr},
+}};
+
+void addDevices(const TomlEntry& entry, std::vector<DeviceEntry>& devices) {
+  for (const TomlEntry& table : entry.tables()) applyTomlKeys(table, deviceKeys, devices.emplace_back());
+}
+
+constexpr std::array<TomlKey<std::vector<DeviceEntry>>, 2> boardKeys{{
+    {"device", addDevices},
+    {"tcks_per_clock", nullptr},
+}};
+
+[[noreturn]] void contradict(std::size_t device, const std::string& found, const std::string& described) {
+  throw std::runtime_error("device " + std::to_string(device) + " " + found + ", the board file says " +
+                           described);
+}
+
+unsigned irLengthOf(std::size_t index, const Qor_Device& found, const DeviceEntry& entry) {
+  if (found.irLength == 0 && !entry.irLength) {
+    throw std::runtime_error("the IR length of device " + std::to_string(index) + ", IDCODE " +
+                             idcodeText(found.idcode) +
+                             ", cannot be told from its capture; a board file can say it");
+  }
+  if (found.irLength != 0 && entry.irLength && *entry.irLength != found.irLength)
+    contradict(index, "has an IR of " + std::to_string(found.irLength) + " bits",
+               std::to_string(*entry.irLength));
+  return entry.irLength.value_or(found.irLength);
+}
+
+bool fits(std::uint64_t opcode, unsigned irLength) {
+  return irLength >= 64 || opcode >> irLength == 0;
+}
+
+void requireOpcodes(std::size_t index, const WireDevice& device) {
+  for (const std::uint64_t opcode : device.userOpcodes) {
+    if (opcode != noOpcode && !fits(opcode, device.head.irLength)) {
+      throw std::runtime_error("device " + std::to_string(index) + " has an IR of " +
+                               std::to_string(device.head.irLength) + " bits, too short for the opcode " +
+                               std::to_string(opcode) + " of a user register");
+    }
+  }
+}
+
+void dropOpcodesBeyondIr(WireDevice& device) {
+  for (std::uint64_t& opcode : device.userOpcodes)
+    if (!fits(opcode, device.head.irLength)) opcode = noOpcode;
+}
+
+WireDevice described(std::size_t index, const Qor_Device& found, const DeviceEntry& entry) {
+  if (entry.idcode && *entry.idcode != found.idcode)
+    contradict(index, "has the IDCODE " + idcodeText(found.idcode), idcodeText(*entry.idcode));
+  WireDevice device{found};
+  device.head.irLength = irLengthOf(index, found, entry);
+  if (!entry.name.empty()) device.head.name = entry.name;
+  if (entry.userOpcodes) {
+    device.userOpcodes = *entry.userOpcodes;
+    requireOpcodes(index, device);
+  }
+  dropOpcodesBeyondIr(device);
+  return device;
+}
+
+}  // namespace
+
+std::vector<DeviceEntry> boardDevices(const std::string& path) {
+  return boardDevicesOf(fileContents(path), path);
+}
+
+std::vector<DeviceEntry> boardDevicesOf(const std::string& text, const std::string& file) {
+  const toml::table parsed = parseToml(text, file);
+  const TomlEntry root(file, parsed, "");
+  std::vector<DeviceEntry> devices;
+  root.at("device");
+  applyTomlKeys(root, boardKeys, devices);
+  return devices;
+}
+
+std::vector<WireDevice> describedDevices(const std::vector<Qor_Device>& found,
+                                         const std::vector<DeviceEntry>& entries) {
+  if (!entries.empty() && entries.size() != found.size())
+    throw std::runtime_error("the chain has " + std::to_string(found.size()) +
+                             " devices, the board file says " + std::to_string(entries.size()));
+  std::vector<WireDevice> devices;
+  devices.reserve(found.size());
+  for (std::size_t i = 0; i < found.size(); ++i)
+    devices.push_back(described(i, found[i], entries.empty() ? DeviceEntry() : entries[i]));
+  return devices;
+}
+
+void requireIrBits(const std::vector<WireDevice>& devices, std::size_t bitCount) {
+  std::size_t sum = 0;
+  for (const WireDevice& device : devices) sum += device.head.irLength;
+  if (sum != bitCount) {
+    throw std::runtime_error("the IRs of the chain have " + std::to_string(bitCount) +
+                             " bits together, the board file says " + std::to_string(sum));
+  }
+}
+
+std::string idcodeText(unsigned idcode) {
+  std::array<char, 9> digits{};
+  std::snprintf(digits.data(), digits.size(), "%08X", idcode);
+  return digits.data();
+}
+
+}  // namespace QorRT

@@ -1,0 +1,43 @@
+// What stands on a screen, and what to write for something else to stand there.
+#pragma once
+
+#include <cstddef>
+#include <string>
+#include <vector>
+
+namespace qor::tool {
+
+/// Lines of text one part after another. The parts must outlive it.
+using Parts = std::vector<const std::vector<std::string>*>;
+
+/// A body of any number of lines, seen through a window that can be scrolled, and a foot that is always seen.
+class Screen {
+ public:
+  /// What to write to a terminal with so many rows: the lines that differ from those that stand there, each addressed by
+  /// its row, and everything when the number of rows has changed. When the body has more lines than there is room for,
+  /// a last line says how many are not shown.
+  std::string update(std::size_t rows, const Parts& body, std::vector<std::string> foot);
+
+  /// From the next update on the window stands so many lines or windows further down, as far as the body goes.
+  /// @{
+  void scroll(std::ptrdiff_t lines);
+  void scrollPages(std::ptrdiff_t pages) { scroll(pages * static_cast<std::ptrdiff_t>(window_)); }
+  /// @}
+
+  /// From the next update on the line of the body is in the window.
+  void reveal(std::size_t line);
+
+  /// What stands on the terminal is not known any more: the next update writes everything.
+  void forget() { rows_ = 0; }
+
+  /// The lines that stand there.
+  const std::vector<std::string>& shown() const { return shown_; }
+
+ private:
+  std::vector<std::string> shown_;
+  std::size_t rows_ = 0;
+  std::size_t top_ = 0;     // the first line in the window
+  std::size_t window_ = 1;  // how many lines of the body are seen
+};
+
+}  // namespace qor::tool

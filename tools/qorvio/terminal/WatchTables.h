@@ -1,0 +1,57 @@
+// The two tables of watch: inputs that change by themselves, outputs that keys drive.
+#pragma once
+
+#include <string>
+#include <vector>
+
+#include "board/model/SignalTable.h"
+#include "board/record/InputWatch.h"
+#include "tools/qorvio/terminal/Table.h"
+
+namespace qor::tool {
+
+class InputTable {
+ public:
+  explicit InputTable(const InputWatch& watch);
+
+  /// Formats the rows of the inputs that changed, which it takes.
+  const std::vector<std::string>& lines(InputWatch& watch);
+
+ private:
+  Table table_;
+};
+
+/// Outputs bit by bit, one of them chosen, with the values that they were last given.
+class OutputTable {
+ public:
+  /// The core must outlive it.
+  OutputTable(CoreSession& core, const SignalTable& signals);
+
+  const std::vector<std::string>& lines() { return table_.lines(); }
+
+  /// Chooses the next one, or the one before; the first and last ones stay.
+  void chooseNext() { choose(chosen_ + 1); }
+  void chooseBefore() { choose(chosen_ - 1); }
+
+  /// In which of the lines the chosen one stands.
+  std::size_t chosenLine() const { return chosen_ + 1; }
+
+  /// Writes to the chosen one. Throws Failure, or WrongUse where it plays no pulses.
+  /// @{
+  void toggleChosen();
+  void pulseChosen();
+  /// @}
+
+ private:
+  void addBits(const SignalTable& signals, const Signal& output);
+  void choose(std::size_t index);
+  void format(std::size_t index);
+  void write(const Assignment& assignment);
+
+  CoreSession& core_;
+  std::vector<Signal> outputs_;
+  std::size_t chosen_ = 0;
+  Table table_;
+};
+
+}  // namespace qor::tool
