@@ -1,14 +1,13 @@
 // Ctrl-C as a question that a loop can ask.
 #pragma once
 
-#include <signal.h>
-#include <array>
 #include <chrono>
+#include <memory>
 
-namespace qor {
+namespace os {
 
 /// From its construction to its end, SIGINT and SIGTERM end nothing by themselves, nor does SIGHUP, which is left alone
-/// where it is ignored (nohup). Afterwards they do what they did before.
+/// where it is ignored (nohup). Afterwards they do what they did before. One at a time.
 class Stop {
  public:
   Stop();
@@ -17,13 +16,17 @@ class Stop {
   ~Stop();
 
   /// Whether one of them has come.
-  bool asked() const;
+  bool asked() const { return signal() != 0; }
+
+  /// The number of the first that has come; 0 when none has.
+  int signal() const;
 
   /// Sleeps until then, or until one of them comes.
   void sleepUntil(std::chrono::steady_clock::time_point due) const;
 
  private:
-  std::array<struct sigaction, 3> before_{};
+  struct Handlers;
+  std::unique_ptr<Handlers> before_;
 };
 
-}  // namespace qor
+}  // namespace os

@@ -1,22 +1,23 @@
 #include "os/Terminal.h"
 
 #include <poll.h>
+#include <signal.h>
 #include <sys/ioctl.h>
+#include <termios.h>
 #include <unistd.h>
 #include <cerrno>
-#include <csignal>
 #include <exception>
 #include <string>
 #include <utility>
 
-namespace qor {
+namespace os {
 namespace {
 
 using std::chrono::milliseconds;
 
 constexpr Key escape = '\033';
 
-volatile std::sig_atomic_t isResized = 0;
+volatile sig_atomic_t isResized = 0;
 
 void handleResize(int) {
   isResized = 1;
@@ -34,7 +35,9 @@ Key nextByte(milliseconds wait) {
 // What the terminal sends behind ESC for the keys that send more than a character.
 Key keyOf(const std::string& sequence) {
   constexpr std::pair<const char*, Key> keys[] = {{"[A", keyUp},   {"OA", keyUp},      {"[B", keyDown},
-                                                  {"OB", keyDown}, {"[5~", keyPageUp}, {"[6~", keyPageDown}};
+                                                  {"OB", keyDown}, {"[5~", keyPageUp}, {"[6~", keyPageDown},
+                                                  {"[H", keyHome}, {"OH", keyHome},    {"[1~", keyHome},
+                                                  {"[F", keyEnd},  {"OF", keyEnd},     {"[4~", keyEnd}};
   for (const auto& [text, key] : keys)
     if (sequence == text) return key;
   return noKey;
@@ -52,10 +55,15 @@ Key keyBehindEscape() {
 
 }  // namespace
 
-Terminal::Terminal(const Stop& stop) : stop_(stop) {
+struct Terminal::State {
+  termios modes{};
+  struct sigaction resize {};
+};
+
+Terminal::Terminal(const Stop& stop) : stop_(stop), before_(std::make_unique<State>()) {
   write("\033[?1049h\033[?25l\033[?7l\033[2J");  // first: a terminal that takes it not is left as it is
-  tcgetattr(STDIN_FILENO, &before_);
-  termios raw = before_;
+  tcgetattr(STDIN_FILENO, &before_->modes);
+  termios raw = before_->modes;
   raw.c_lflag &= ~static_cast<tcflag_t>(ICANON | ECHO);
   // With either, the shell would get the terminal as it is.
   raw.c_cc[VSUSP] = _POSIX_VDISABLE;
@@ -64,12 +72,12 @@ Terminal::Terminal(const Stop& stop) : stop_(stop) {
   struct sigaction action {};
   action.sa_handler = handleResize;
   action.sa_flags = SA_RESTART;
-  sigaction(SIGWINCH, &action, &resizeBefore_);
+  sigaction(SIGWINCH, &action, &before_->resize);
 }
 
 Terminal::~Terminal() {
-  sigaction(SIGWINCH, &resizeBefore_, nullptr);
-  tcsetattr(STDIN_FILENO, TCSANOW, &before_);
+  sigaction(SIGWINCH, &before_->resize, nullptr);
+  tcsetattr(STDIN_FILENO, TCSANOW, &before_->modes);
   try {
     write("\033[?7h\033[?25h\033[?1049l");
   } catch (const std::exception&) {
@@ -77,9 +85,10 @@ Terminal::~Terminal() {
   }
 }
 
-std::size_t Terminal::rows() const {
+TerminalSize Terminal::size() const {
   winsize size{};
-  return ioctl(STDOUT_FILENO, TIOCGWINSZ, &size) == 0 && size.ws_row != 0 ? size.ws_row : 24;
+  if (ioctl(STDOUT_FILENO, TIOCGWINSZ, &size) != 0) size = {};
+  return {size.ws_row != 0 ? size.ws_row : std::size_t{24}, size.ws_col != 0 ? size.ws_col : std::size_t{80}};
 }
 
 bool Terminal::takeResized() {
@@ -93,4 +102,4 @@ Key Terminal::key(milliseconds wait) {
   return byte == escape ? keyBehindEscape() : byte;
 }
 
-}  // namespace qor
+}  // namespace os

@@ -1,19 +1,23 @@
-// A terminal that is written to in place and hands out keys.
+// A terminal that is written to in place and reads keys.
 #pragma once
 
-#include <signal.h>
-#include <termios.h>
 #include <chrono>
+#include <memory>
 #include <string_view>
 
-#include "os/Output.h"
+#include "os/StandardStreams.h"
 
-namespace qor {
+namespace os {
 
 /// A character, or one of those below.
 using Key = int;
 constexpr Key noKey = 0, keyUp = 0x100, keyDown = 0x101, keyPageUp = 0x102, keyPageDown = 0x103,
-              endOfKeys = 0x104;
+              keyHome = 0x104, keyEnd = 0x105, endOfKeys = 0x106;
+
+struct TerminalSize {
+  std::size_t rows;
+  std::size_t columns;
+};
 
 /// From its construction to its end the terminal shows a screen of its own, without echo, cursor and line wrap;
 /// afterwards what it showed before.
@@ -24,8 +28,8 @@ class Terminal {
   Terminal& operator=(const Terminal&) = delete;
   ~Terminal();
 
-  /// How many rows it has, now.
-  std::size_t rows() const;
+  /// Rows and columns that it has, now.
+  TerminalSize size() const;
 
   /// Whether it was resized since the call before.
   bool takeResized();
@@ -37,9 +41,9 @@ class Terminal {
   Key key(std::chrono::milliseconds wait);
 
  private:
+  struct State;
   const Stop& stop_;
-  termios before_{};
-  struct sigaction resizeBefore_ {};
+  std::unique_ptr<State> before_;
 };
 
-}  // namespace qor
+}  // namespace os

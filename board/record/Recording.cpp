@@ -23,7 +23,7 @@ class Schedule {
     bool isEnd;            ///< nothing is to be polled any more
   };
 
-  Turn await(const Stop& stop) {
+  Turn await(const os::Stop& stop) {
     const bool isPeriodic = limits_.period.count() != 0;
     if (isPeriodic) stop.sleepUntil(begin_ + std::min(slotBegin(next_), timeLimit()));
     const nanoseconds woken = std::min<nanoseconds>(Clock::now() - begin_, timeLimit());
@@ -50,7 +50,7 @@ class Schedule {
 
 void runPolls(Recorder& recorder, SampleWriter& writer, const Limits& limits, const OnSample& onSample,
               Recorded& recorded) {
-  const Stop stop;
+  const os::Stop stop;
   Schedule schedule(limits);
   while (limits.samples == 0 || recorded.samples < limits.samples) {
     const auto [now, missed, isEnd] = schedule.await(stop);

@@ -2,6 +2,7 @@
 #include <exception>
 
 #include "board/model/Errors.h"
+#include "os/StandardStreams.h"
 #include "tools/qorvio/commands/Commands.h"
 
 namespace {
@@ -66,6 +67,7 @@ int runTool(int argc, char** argv) {
 }  // namespace
 
 int main(int argc, char** argv) {
+  os::openMissingStreams();
   int status = deviceFailed;
   try {
     status = runTool(argc, argv);

@@ -94,7 +94,7 @@ std::string loop(CoreSession& core) {
   Sample sample = core.emptySample();
   Bytes pattern((width + 7) / 8), value;
   bool follows = true;
-  const Stop stop;  // whoever interrupts it finds the outputs put back
+  const os::Stop stop;  // whoever interrupts it finds the outputs put back
   for (unsigned first : {0U, 1U}) {
     for (unsigned bit = 0; bit < width; ++bit) setBit(pattern, bit, (bit + first) % 2);
     core.write({level(outputs, pattern)});

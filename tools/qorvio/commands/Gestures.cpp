@@ -30,7 +30,7 @@ void press(Context& context, const PressOptions& options) {
   const Signal signal = context.signals().find(options.name, Direction::output);
   Assignment down = toggle(context.core(), signal);  // asks for one bit
   down.steps = {{1}};
-  const Stop stop;  // whoever interrupts it finds the output released
+  const os::Stop stop;  // whoever interrupts it finds the output released
   context.core().write({down});
   context.core().rememberOutputs();
   stop.sleepUntil(std::chrono::steady_clock::now() + time);

@@ -62,7 +62,7 @@ std::vector<Assignment> assignmentsOf(const PlayScript& script, std::size_t firs
 
 Played playRows(CoreSession& core, const PlayScript& script, const Timing& timing) {
   const std::size_t atOnce = timing.isAsap() && canBurst(script) ? stepCount : 1;
-  const Stop stop;
+  const os::Stop stop;
   Played played;
   const Clock::time_point begin = Clock::now();
   while (played.rows < script.rows.size()) {

@@ -1,10 +1,10 @@
-#include <unistd.h>
 #include <chrono>
 #include <cstdio>
 
 #include "board/model/Duration.h"
 #include "board/model/Errors.h"
 #include "board/record/Recording.h"
+#include "os/StandardStreams.h"
 #include "tools/qorvio/commands/Commands.h"
 
 namespace qor::tool {
@@ -35,7 +35,8 @@ Limits limitsOf(const RecordOptions& options) {
 // One line on the terminal, drawn again four times a second.
 class Progress {
  public:
-  Progress(bool wanted, Limits limits) : wanted_(wanted && isatty(STDERR_FILENO) != 0), limits_(limits) {}
+  Progress(bool wanted, Limits limits)
+      : wanted_(wanted && os::isTerminal(os::Stream::error)), limits_(limits) {}
   Progress(const Progress&) = delete;
   Progress& operator=(const Progress&) = delete;
   ~Progress() {

@@ -42,7 +42,7 @@ void printPlace(const std::string& board, unsigned port, bool json) {
 void simulate(const Settings& settings, const SimulateOptions& options) {
   const std::unique_ptr<qorsim::Pins> pins = powerUp(options.board);
   qorsim::BitbangServer server(*pins, options.port);
-  const Stop stop;
+  const os::Stop stop;
   printPlace(options.board, server.port(), settings.json);
   server.serve([&stop] { return stop.asked(); },
                [](const std::string& reason) { std::fprintf(stderr, "qorvio: %s\n", reason.c_str()); });

@@ -1,11 +1,10 @@
-#include <unistd.h>
 #include <chrono>
 #include <cstdio>
 
 #include "board/model/Duration.h"
 #include "board/model/Errors.h"
 #include "board/record/InputWatch.h"
-#include "os/Output.h"
+#include "os/StandardStreams.h"
 #include "os/Stop.h"
 #include "os/Terminal.h"
 #include "tools/qorvio/InputJson.h"
@@ -35,7 +34,7 @@ class Frames {
   void begin() { due_ = std::max(due_ + period_, Clock::now()); }
   bool isOver() const { return stop_.asked() || Clock::now() >= due_; }
   void sleep() const { stop_.sleepUntil(due_); }
-  const Stop& stop() const { return stop_; }
+  const os::Stop& stop() const { return stop_; }
 
   // Short enough for a signal that no wait saw.
   milliseconds nap() const {
@@ -44,7 +43,7 @@ class Frames {
   }
 
  private:
-  const Stop stop_;
+  const os::Stop stop_;
   Clock::duration period_;
   std::uint64_t count_;
   Clock::time_point due_ = Clock::now();
@@ -63,7 +62,7 @@ class LiveWatch {
     return screen_.update(rows, {&inputs_.lines(watch_), &between_, &outputs_.lines()}, std::move(foot));
   }
 
-  void press(Key key) {
+  void press(os::Key key) {
     status_.clear();
     try {
       obey(key);
@@ -81,7 +80,7 @@ class LiveWatch {
   }
 
  private:
-  void obey(Key key) {
+  void obey(os::Key key) {
     switch (key) {
       case 'j':
       case 'k':
@@ -93,12 +92,12 @@ class LiveWatch {
         return outputs_.pulseChosen();
       case 'c':
         return watch_.clear();
-      case keyUp:
-      case keyDown:
-        return screen_.scroll(key == keyUp ? -1 : 1);
-      case keyPageUp:
-      case keyPageDown:
-        return screen_.scrollPages(key == keyPageUp ? -1 : 1);
+      case os::keyUp:
+      case os::keyDown:
+        return screen_.scroll(key == os::keyUp ? -1 : 1);
+      case os::keyPageUp:
+      case os::keyPageDown:
+        return screen_.scrollPages(key == os::keyPageUp ? -1 : 1);
       default:
         return;
     }
@@ -116,15 +115,15 @@ class LiveWatch {
 constexpr int keysAtOnce = 16;
 
 // Shows the frame and what the keys make of it until the next one is due; false when that is not wanted.
-bool showWithKeys(LiveWatch& live, Terminal& terminal, const Frames& frames) {
+bool showWithKeys(LiveWatch& live, os::Terminal& terminal, const Frames& frames) {
   do {
     if (terminal.takeResized()) live.redraw();
-    if (!terminal.write(live.update(terminal.rows()))) return false;
+    if (!terminal.write(live.update(terminal.size().rows))) return false;
     milliseconds wait = frames.nap();
     for (int i = 0; i < keysAtOnce; ++i, wait = milliseconds(0)) {
-      const Key key = terminal.key(wait);
-      if (key == noKey) break;
-      if (key == 'q' || key == endOfKeys) return false;
+      const os::Key key = terminal.key(wait);
+      if (key == os::noKey) break;
+      if (key == 'q' || key == os::endOfKeys) return false;
       live.press(key);
     }
   } while (!frames.isOver());
@@ -134,13 +133,13 @@ bool showWithKeys(LiveWatch& live, Terminal& terminal, const Frames& frames) {
 void runOnTerminal(InputWatch& watch, OutputTable outputs, Frames& frames) {
   LiveWatch live(watch, std::move(outputs));
   try {
-    Terminal terminal(frames.stop());
+    os::Terminal terminal(frames.stop());
     while (frames.goesOn(watch.frames())) {
       frames.begin();
       watch.poll();
       if (!showWithKeys(live, terminal, frames)) return;
     }
-  } catch (const Failure&) {  // the screen is gone: leave the last frame where it can be seen
+  } catch (const std::exception&) {  // the screen is gone: leave the last frame where it can be seen
     if (watch.frames() != 0) std::printf("%s", live.shown().c_str());
     throw;
   }
@@ -152,7 +151,7 @@ void print(InputWatch& watch, Frames& frames, Text text) {
   while (frames.goesOn(watch.frames())) {
     frames.begin();
     watch.poll();
-    if (!writeOutput(text(), frames.stop())) return;
+    if (!os::writeOutput(text(), frames.stop())) return;
     if (frames.goesOn(watch.frames())) frames.sleep();
   }
 }
@@ -189,7 +188,8 @@ void runWatch(Context& context, const WatchOptions& options) {
   InputWatch watch(context.core(), context.signals().select(options.names, Direction::input));
   Frames frames(period, options.frames);
   if (context.settings.json) return printJson(watch, frames);
-  if (isatty(STDIN_FILENO) == 0 || isatty(STDOUT_FILENO) == 0) return printTables(watch, frames);
+  if (!os::isTerminal(os::Stream::input) || !os::isTerminal(os::Stream::output))
+    return printTables(watch, frames);
   runOnTerminal(watch, OutputTable(context.core(), context.signals()), frames);
 }
 

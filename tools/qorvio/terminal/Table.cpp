@@ -1,8 +1,8 @@
 #include "tools/qorvio/terminal/Table.h"
 
-#include <unistd.h>
 #include <algorithm>
 #include <cstdlib>
+#include "os/StandardStreams.h"
 
 namespace qor::tool {
 namespace {
@@ -88,7 +88,7 @@ std::string Table::laidOut(const std::vector<std::string>& row) const {
 }
 
 std::string inked(Ink ink, const std::string& text) {
-  static const bool coloured = isatty(STDOUT_FILENO) != 0 && std::getenv("NO_COLOR") == nullptr;
+  static const bool coloured = os::isTerminal(os::Stream::output) && std::getenv("NO_COLOR") == nullptr;
   return coloured && ink != Ink::plain ? escapeOf(ink) + text + "\033[0m" : text;
 }
 

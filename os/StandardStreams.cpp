@@ -1,14 +1,14 @@
-#include "os/Output.h"
+#include "os/StandardStreams.h"
 
+#include <fcntl.h>
 #include <poll.h>
 #include <unistd.h>
 #include <algorithm>
 #include <cerrno>
 #include <climits>
-
 #include <stdexcept>
 
-namespace qor {
+namespace os {
 namespace {
 
 // Waits in short naps, as Stop::sleepUntil does.
@@ -20,6 +20,15 @@ bool isReady(const Stop& stop) {
 }
 
 }  // namespace
+
+void openMissingStreams() {
+  for (int descriptor = STDIN_FILENO; descriptor <= STDERR_FILENO; ++descriptor)
+    if (fcntl(descriptor, F_GETFD) < 0) open("/dev/null", O_RDWR);  // takes the lowest number that is free
+}
+
+bool isTerminal(Stream stream) {
+  return isatty(static_cast<int>(stream)) != 0;
+}
 
 bool writeOutput(std::string_view text, const Stop& stop) {
   while (!text.empty()) {
@@ -37,4 +46,4 @@ bool writeOutput(std::string_view text, const Stop& stop) {
   return true;
 }
 
-}  // namespace qor
+}  // namespace os

@@ -1,0 +1,23 @@
+// A lock between processes.
+#pragma once
+
+#include <chrono>
+#include <string>
+
+namespace os {
+
+/// Held from its construction to its end, and released when the process ends, however it ends.
+class FileLock {
+ public:
+  /// Makes the file when there is none, and leaves it there; its folder must exist. A symbolic link is not followed.
+  /// Throws std::system_error: std::errc::timed_out when another process has held the lock all the time.
+  FileLock(const std::string& path, std::chrono::milliseconds timeout);
+  FileLock(const FileLock&) = delete;
+  FileLock& operator=(const FileLock&) = delete;
+  ~FileLock();
+
+ private:
+  int file_;
+};
+
+}  // namespace os
