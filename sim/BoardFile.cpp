@@ -1,5 +1,5 @@
+#include "platform/jtag/cable/boardfile/BoardFile.h"
 #include "Sim.h"
-#include "platform/jtag/cable/boardfile/TomlEntry.h"
 #include "platform/jtag/cable/boardfile/TomlFile.h"
 #include "platform/jtag/cable/boardfile/TomlKeys.h"
 #include "sim/BoardError.h"
@@ -60,40 +60,16 @@ void addCore(const TomlEntry& table, ChainBuilder& board) {
   }
 }
 
-void setIrLength(const TomlEntry& entry, ChainBuilder& board) {
-  const unsigned bits = entry.number();
+void addDevice(const QorRT::BoardDevice& device, ChainBuilder& board) {
+  board.device(device.idcode.value_or(0));
+  if (!device.name.empty()) board.named(device.name);
   try {
-    board.irLength(bits);
+    if (device.irLength) board.irLength(*device.irLength);
   } catch (const BoardError& error) {
-    entry.fail(error.problem());
+    device.table.failAt(error.key(), error.problem());
   }
+  for (const TomlEntry& core : device.cores) addCore(core, board);
 }
-
-void addCores(const TomlEntry& entry, ChainBuilder& board) {
-  for (const TomlEntry& core : entry.tables()) addCore(core, board);
-}
-
-// The name of the TAP matters to the cables that lead to a real board.
-constexpr std::array<TomlKey<ChainBuilder>, 5> deviceKeys{{
-    {"idcode", nullptr},
-    {"name", [](const TomlEntry& entry, ChainBuilder& board) { board.named(entry.text()); }},
-    {"ir_length", setIrLength},
-    {"core", addCores},
-    {"tap", [](const TomlEntry& entry, ChainBuilder&) { entry.text(); }},
-}};
-
-void addDevices(const TomlEntry& entry, ChainBuilder& board) {
-  for (const TomlEntry& device : entry.tables()) {
-    board.device(device.table().contains("idcode") ? device.at("idcode").number() : 0);
-    applyTomlKeys(device, deviceKeys, board);
-  }
-}
-
-constexpr std::array<TomlKey<ChainBuilder>, 2> boardKeys{{
-    {"tcks_per_clock",
-     [](const TomlEntry& entry, ChainBuilder& board) { board.tcksPerClock(entry.number()); }},
-    {"device", addDevices},
-}};
 
 }  // namespace
 
@@ -102,11 +78,10 @@ ChainBuilder boardFile(const std::string& path) {
 }
 
 ChainBuilder boardText(const std::string& text, const std::string& file) {
-  const toml::table parsed = QorRT::parseToml(text, file);
-  const TomlEntry root(file, parsed, "");
+  const QorRT::BoardFile described = QorRT::readBoard(text, file);
   ChainBuilder board = chain();
-  root.at("device");
-  applyTomlKeys(root, boardKeys, board);
+  board.tcksPerClock(described.tcksPerClock);
+  for (const QorRT::BoardDevice& device : described.devices) addDevice(device, board);
   return board;
 }
 

@@ -10,6 +10,7 @@
 
 #include <functional>
 #include <memory>
+#include <string>
 #include <vector>
 
 #include "QorExport.h"
@@ -32,6 +33,11 @@ namespace QorRT {
 /// Opens the cable of a URL without a session, for a host that puts a cable of its own around it. Throws as
 /// QorJtag_session_open() does.
 QOR_API std::unique_ptr<Qor_Cable> openCable(const char* url);
+
+/// The text of a TOML file, for a host that parses files of its own: at most 1 MB, with no more than 16 levels of
+/// nesting, so that its parser needs little of the stack. Throws runtime_error, "FILE: what is wrong" or "FILE:LINE:
+/// what is wrong", for a file without these bounds or that cannot be read, a directory, a FIFO or a device among them.
+QOR_API std::string readTomlText(const std::string& path);
 
 }  // namespace QorRT
 

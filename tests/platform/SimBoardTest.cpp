@@ -1,6 +1,7 @@
 // Boards: devices on the chain, the builder, board files.
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
+#include <sys/stat.h>
 #include <unistd.h>
 
 #include <cstdio>
@@ -135,6 +136,28 @@ TEST_F(BoardFiles, errorsSayWhereAndWhat) {
   for (const auto& [text, message] : cases) EXPECT_EQ(messageFor(text), message) << text;
 }
 
+TEST_F(BoardFiles, areBounded) {
+  const auto many = [](const std::string& text, unsigned count) {
+    std::string all;
+    while (count-- > 0) all += text;
+    return all;
+  };
+  const std::string device = "[[device]]\nname=", deep = ": is nested more than 16 levels deep";
+  const std::pair<std::string, std::string> cases[] = {
+      {many("a.", 16) + "a=1", ":1: device: is missing"},
+      {many("a.", 17) + "a=1", ":1" + deep},
+      {"[" + many("a.", 31000) + "a]", ":1" + deep},
+      {"device=" + many("{a=", 31000), ":1" + deep},
+      {device + "\"\"\"\n\"\\\"\"\"\"\"\n" + many("a.", 31000) + "a=1", ":4" + deep},
+      {device + "'''\n'''''\nidcode=" + many("[", 31000), ":4" + deep},
+      {device + "'\\' # \"\ncore=" + many("[", 31000), ":3" + deep},
+      {device + "'''" + many("[.", 31000) + "'''", "nothing"},
+      {device + "\"\\\"" + many("[.", 31000) + "\" #" + many("{", 31000), "nothing"},
+      {std::string((1 << 20) + 1, '\n'), ": is larger than 1048576 bytes"},
+  };
+  for (const auto& [text, message] : cases) EXPECT_EQ(messageFor(text), message) << text.substr(0, 80);
+}
+
 TEST_F(BoardFiles, syntaxErrorsHaveALine) {
   EXPECT_THAT(messageFor("[[device]]\nname=\n"), testing::StartsWith(":2: Error while parsing key-value"));
   EXPECT_THAT(messageFor("[[device]]\nname=\"a\"\nname=\"b\"\n"), testing::StartsWith(":3: Error while"));
@@ -143,7 +166,15 @@ TEST_F(BoardFiles, syntaxErrorsHaveALine) {
 TEST_F(BoardFiles, filesThatCannotBeRead) {
   EXPECT_EQ(thrownBy([] { qorsim::boardFile("no/such.toml"); }),
             "runtime: no/such.toml: cannot be opened: No such file or directory");
-  EXPECT_EQ(thrownBy([] { qorsim::boardFile("/"); }), "runtime: /: cannot be read");
+  EXPECT_EQ(thrownBy([] { qorsim::boardFile("/"); }), "runtime: /: cannot be opened: it is a directory");
+  ASSERT_EQ(::mkfifo(path_.c_str(), 0600), 0);
+  EXPECT_EQ(thrownBy([this] { qorsim::boardFile(path_); }),
+            "runtime: " + path_ + ": cannot be opened: it is not a regular file");
+}
+
+TEST(SimBoard, readsTheFileOfARealChain) {
+  EXPECT_EQ(qorsim::boardFile(QORVIO_SOURCE_DIR "/examples/adapters/board.toml").cable()->devices()[0].idcode,
+            0x0A5F1093u);
 }
 
 }  // namespace

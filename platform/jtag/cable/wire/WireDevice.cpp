@@ -4,51 +4,11 @@
 #include <cstdio>
 #include <stdexcept>
 
-#include "platform/jtag/cable/boardfile/TomlEntry.h"
+#include "platform/jtag/cable/boardfile/BoardFile.h"
 #include "platform/jtag/cable/boardfile/TomlFile.h"
-#include "platform/jtag/cable/boardfile/TomlKeys.h"
 
 namespace QorRT {
 namespace {
-
-// Of a user register that there is not: all ones, which select BYPASS.
-constexpr std::uint64_t noOpcode = ~std::uint64_t{0};
-
-constexpr unsigned shortestIr = 2, longestIr = 64;  // bits
-
-void setIrLength(const TomlEntry& entry, DeviceEntry& device) {
-  const unsigned bits = entry.number();
-  if (bits < shortestIr || bits > longestIr) entry.fail("must be 2 to 64, is " + std::to_string(bits));
-  device.irLength = bits;
-}
-
-void setUserOpcodes(const TomlEntry& entry, DeviceEntry& device) {
-  const std::vector<unsigned> numbers = entry.numbers();
-  if (numbers.empty() || numbers.size() > Qor_Cable::userChainCount)
-    entry.fail("must be the opcodes of 1 to 4 user registers, is " + std::to_string(numbers.size()));
-  device.userOpcodes.emplace();
-  for (std::size_t i = 0; i < device.userOpcodes->size(); ++i)
-    (*device.userOpcodes)[i] = i < numbers.size() ? numbers[i] : noOpcode;
-}
-
-// A simulated board's file says more of its devices; that is for the simulation.
-constexpr std::array<TomlKey<DeviceEntry>, 6> deviceKeys{{
-    {"idcode", [](const TomlEntry& entry, DeviceEntry& device) { device.idcode = entry.number(); }},
-    {"ir_length", setIrLength},
-    {"user_opcodes", setUserOpcodes},
-    {"name", [](const TomlEntry& entry, DeviceEntry& device) { device.name = entry.text(); }},
-    {"tap", [](const TomlEntry& entry, DeviceEntry& device) { device.tap = entry.text(); }},
-    {"core", nullptr},
-}};
-
-void addDevices(const TomlEntry& entry, std::vector<DeviceEntry>& devices) {
-  for (const TomlEntry& table : entry.tables()) applyTomlKeys(table, deviceKeys, devices.emplace_back());
-}
-
-constexpr std::array<TomlKey<std::vector<DeviceEntry>>, 2> boardKeys{{
-    {"device", addDevices},
-    {"tcks_per_clock", nullptr},
-}};
 
 [[noreturn]] void contradict(std::size_t device, const std::string& found, const std::string& described) {
   throw std::runtime_error("device " + std::to_string(device) + " " + found + ", the board file says " +
@@ -107,12 +67,8 @@ std::vector<DeviceEntry> boardDevices(const std::string& path) {
 }
 
 std::vector<DeviceEntry> boardDevicesOf(const std::string& text, const std::string& file) {
-  const toml::table parsed = parseToml(text, file);
-  const TomlEntry root(file, parsed, "");
-  std::vector<DeviceEntry> devices;
-  root.at("device");
-  applyTomlKeys(root, boardKeys, devices);
-  return devices;
+  const BoardFile board = readBoard(text, file);
+  return {board.devices.begin(), board.devices.end()};
 }
 
 std::vector<WireDevice> describedDevices(const std::vector<Qor_Device>& found,

@@ -1,29 +1,18 @@
 // A device on a real chain, and what a board file says of the devices there.
 #pragma once
 
-#include <array>
-#include <cstdint>
-#include <optional>
 #include <string>
 #include <vector>
 
 #include "QorExport.h"
 #include "Qor_Cable.h"
+#include "platform/jtag/cable/boardfile/DeviceEntry.h"
 
 namespace QorRT {
 
 struct WireDevice {
   Qor_Device head;
-  std::array<std::uint64_t, Qor_Cable::userChainCount> userOpcodes{2, 3, 4, 5};  ///< of USER1 to USER4
-};
-
-/// What a board file says of one device; nothing, for what is to be found out.
-struct DeviceEntry {
-  std::optional<unsigned> idcode;
-  std::optional<unsigned> irLength;
-  std::optional<decltype(WireDevice::userOpcodes)> userOpcodes;
-  std::string name;
-  std::string tap;  ///< what a JTAG server calls it
+  UserOpcodes userOpcodes{2, 3, 4, 5};
 };
 
 /// The devices of a board file, the one nearest to TDO first; of a simulated board's file, what is known of it
