@@ -9,6 +9,8 @@
 ///     whole input image, or leaves it as it was when it fails.
 ///  3. Positions given to the accessors are below the port's width; they are not checked.
 ///  4. No lock of its own: the holder of the session's target lock uses it.
+///  5. Only the name of the class is part of the exported interface, because groups are constructed with a
+///     pointer to it. The library hides the members.
 #pragma once
 
 #include <array>

@@ -1,3 +1,5 @@
+#include <cxxabi.h>
+
 #include <cstdio>
 
 #include "QorJtag.h"
@@ -22,6 +24,8 @@ unsigned QorJtag_session_sendMessage(unsigned session, unsigned type, const char
       (*handler)(type, text);
     }
     return receiver == nullptr ? 1 : 0;
+  } catch (const abi::__forced_unwind&) {  // the thread is being cancelled
+    throw;
   } catch (...) {  // a sink that throws must not keep its caller from returning
     return 1;
   }

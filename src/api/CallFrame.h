@@ -1,6 +1,8 @@
 // The frame around every exported function: whatever is thrown inside becomes a message and an error return.
 #pragma once
 
+#include <cxxabi.h>
+
 #include <exception>
 
 #include "QorJtag.h"
@@ -15,23 +17,30 @@ inline constexpr unsigned abortMessage = 0x8000;
 inline constexpr unsigned lockTimeout = 60000;  // milliseconds
 
 /// Sends the session a message, whatever the receiving side does with it.
-void sendMessage(unsigned session, unsigned type, const char* text) noexcept;
+void sendMessage(unsigned session, unsigned type, const char* text);
 
 /// Sends the exception's text and gives callFailed.
-unsigned reportException(unsigned session, const std::exception& exception) noexcept;
+unsigned reportException(unsigned session, const std::exception& exception);
 
 /// Runs the body of an exported function and returns its code. Locals of the body, the target lock among
-/// them, are gone before a failure is reported.
+/// them, are gone before a failure is reported. A thread that is cancelled unwinds through here: the C library
+/// ends a process that stops it. So the message is sent outside the handlers, which it cannot leave.
 template <class Body>
-unsigned callFrame(unsigned session, const Body& body) noexcept {
+unsigned callFrame(unsigned session, const Body& body) {
+  std::exception_ptr owner;
+  const std::exception* failure = nullptr;
   try {
     return body();
   } catch (const std::exception& exception) {
-    return reportException(session, exception);
-  } catch (...) {
-    sendMessage(session, errorMessage, "Qor internal error.");
-    return callFailed;
+    owner = std::current_exception();
+    failure = &exception;
+  } catch (const abi::__forced_unwind&) {
+    throw;
+  } catch (...) {  // a failure without a text
   }
+  if (failure != nullptr) return reportException(session, *failure);
+  sendMessage(session, errorMessage, "Qor internal error.");
+  return callFailed;
 }
 
 }  // namespace QorRT

@@ -5,6 +5,7 @@
 
 #include "QorUtil.h"
 #include "QorVIO_Core.h"
+#include "src/api/CallFrame.h"
 
 namespace QorRT {
 
@@ -26,5 +27,16 @@ QorVIO_Core& getVioCore(unsigned session, QOR_CORE_REF coreRef);
 
 /// "Device:D,user chain number:U,core index:C" with blanks after the commas, as messages name an address.
 std::string addressText(QOR_CORE_REF coreRef);
+
+/// The frame of every exported function that works on a core: runs the body on the core that is set up at the
+/// address, under the session's target lock.
+template <class Body>
+unsigned onCore(unsigned session, QOR_CORE_REF coreRef, const Body& body) {
+  return callFrame(session, [&] {
+    QorJtagTargetLock lock(session, lockTimeout);
+    body(getVioCore(session, coreRef));
+    return callSucceeded;
+  });
+}
 
 }  // namespace QorRT

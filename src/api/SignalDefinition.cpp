@@ -3,52 +3,40 @@
 #include <vector>
 
 #include "QorVIO.h"
-#include "src/api/CallFrame.h"
 #include "src/api/CoreAccess.h"
 
 using namespace QorRT;
 
 unsigned QorVIO_defineSignal(unsigned session, QOR_CORE_REF coreRef, const char* name, unsigned type,
                              unsigned bitIndex) {
-  return callFrame(session, [&] {
-    QorJtagTargetLock lock(session, lockTimeout);
-    QorVIO_Core& core = getVioCore(session, coreRef);
+  return onCore(session, coreRef, [&](QorVIO_Core& core) {
     require(name != nullptr, "QorVIO_defineSignal() arg. failed:name!=0");
     std::vector<unsigned> positions{bitIndex};
     core.defineSignal(name, type, positions);
-    return callSucceeded;
   });
 }
 
 unsigned QorVIO_defineBus(unsigned session, QOR_CORE_REF coreRef, const char* name, unsigned type,
                           const unsigned* bitIndexArray, unsigned arrayLen) {
-  return callFrame(session, [&] {
-    QorJtagTargetLock lock(session, lockTimeout);
-    QorVIO_Core& core = getVioCore(session, coreRef);
+  return onCore(session, coreRef, [&](QorVIO_Core& core) {
     require(name != nullptr, "QorVIO_defineBus() arg. failed:name!=0");
     require(bitIndexArray != nullptr, "QorVIO_defineBus() arg. failed:bitIndexArray!=0");
     require(arrayLen != 0, "QorVIO_defineBus() arg. failed:arrayLen!=0");
     std::vector<unsigned> positions(bitIndexArray, bitIndexArray + arrayLen);
     core.defineSignal(name, type, positions);
-    return callSucceeded;
   });
 }
 
 unsigned QorVIO_undefineName(unsigned session, QOR_CORE_REF coreRef, const char* name, unsigned type) {
-  return callFrame(session, [&] {
-    QorJtagTargetLock lock(session, lockTimeout);
-    QorVIO_Core& core = getVioCore(session, coreRef);
+  return onCore(session, coreRef, [&](QorVIO_Core& core) {
     require(name != nullptr, "QorVIO_undefineName() arg. failed:name!=0");
     core.undefineSignal(name, type);
-    return callSucceeded;
   });
 }
 
 unsigned QorVIO_getSignalSizes(unsigned session, QOR_CORE_REF coreRef, const char** nameArray,
                                unsigned* sizeArray, unsigned arrayLen, unsigned isOutput) {
-  return callFrame(session, [&] {
-    QorJtagTargetLock lock(session, lockTimeout);
-    QorVIO_Core& core = getVioCore(session, coreRef);
+  return onCore(session, coreRef, [&](QorVIO_Core& core) {
     require(nameArray != nullptr, "QorVIO_getSignalSizes() arg. failed:nameArray!=0");
     require(sizeArray != nullptr, "QorVIO_getSignalSizes() arg. failed:sizeArray!=0");
     require(arrayLen != 0, "QorVIO_getSignalSizes() arg. failed:arrayLen!=0");
@@ -58,6 +46,5 @@ unsigned QorVIO_getSignalSizes(unsigned session, QOR_CORE_REF coreRef, const cha
       names.emplace_back(nameArray[i]);
     }
     core.getSignalSizes(std::move(names), sizeArray, arrayLen, isOutput);
-    return callSucceeded;
   });
 }

@@ -1,40 +1,26 @@
 #include <string>
 
 #include "QorVIO.h"
-#include "src/api/CallFrame.h"
 #include "src/api/CoreAccess.h"
+#include "src/core/PortCount.h"
 
 using namespace QorRT;
 
-namespace {
-
-void requireInputCount(const QorVIO_Core& core, unsigned type, unsigned count, const char* text) {
-  require(count == core.getCorePhysicalSignalCount(type) || count == 0, text);
-}
-
-}  // namespace
-
 unsigned QorVIO_writeValues(unsigned session, QOR_CORE_REF coreRef,
                             hash_map<std::string, std::string>** outputHashMap) {
-  return callFrame(session, [&] {
-    QorJtagTargetLock lock(session, lockTimeout);
-    QorVIO_Core& core = getVioCore(session, coreRef);
+  return onCore(session, coreRef, [&](QorVIO_Core& core) {
     require(outputHashMap != nullptr, "QorVIO_writeValues() arg. failed:outputHashMap!=0");
     require(*outputHashMap != nullptr, "QorVIO_writeValues() arg. failed:*outputHashMap!=0");
     core.writeValues(session, coreRef, *outputHashMap);
-    return callSucceeded;
   });
 }
 
 unsigned QorVIO_readValues(unsigned session, QOR_CORE_REF coreRef,
                            hash_map<std::string, std::string>** inputHashMap) {
-  return callFrame(session, [&] {
-    QorJtagTargetLock lock(session, lockTimeout);
-    QorVIO_Core& core = getVioCore(session, coreRef);
+  return onCore(session, coreRef, [&](QorVIO_Core& core) {
     require(inputHashMap != nullptr, "QorVIO_readValues() arg. failed:inputHashMap!=0");
     require(*inputHashMap != nullptr, "QorVIO_readValues() arg. failed:*inputHashMap!=0");
     core.readValues(session, coreRef, *inputHashMap);
-    return callSucceeded;
   });
 }
 
@@ -42,12 +28,9 @@ unsigned QorVIO_setPortBits(unsigned session, QOR_CORE_REF coreRef, const unsign
                             const unsigned char* asyncOutMaskBits, unsigned asyncOutDataBitCount,
                             const unsigned char* syncOutStepBits, const unsigned char* syncOutMaskBits,
                             unsigned syncOutDataBitCount) {
-  return callFrame(session, [&] {
-    QorJtagTargetLock lock(session, lockTimeout);
-    QorVIO_Core& core = getVioCore(session, coreRef);
+  return onCore(session, coreRef, [&](QorVIO_Core& core) {
     core.setPortBits(session, coreRef, asyncOutValueBits, asyncOutMaskBits, asyncOutDataBitCount,
                      syncOutStepBits, syncOutMaskBits, syncOutDataBitCount);
-    return callSucceeded;
   });
 }
 
@@ -57,20 +40,17 @@ unsigned QorVIO_getPortBits(unsigned session, QOR_CORE_REF coreRef, unsigned cha
                             unsigned char* syncInActivityUpBits, unsigned char* syncInActivityDownBits,
                             unsigned char* syncInSyncActivityUpBits,
                             unsigned char* syncInSyncActivityDownBits, unsigned syncInDataBitCount) {
-  return callFrame(session, [&] {
-    QorJtagTargetLock lock(session, lockTimeout);
-    QorVIO_Core& core = getVioCore(session, coreRef);
-    requireInputCount(core, Qor_SignalBase::SIGNAL_TYPE_VIO_ASYNC_INPUT, asyncInDataBitCount,
-                      "QorVIO_getPortBits() arg. failed:(asyncInDataBitCount == "
-                      "core->getCorePhysicalSignalCount(Qor_SignalBase::SIGNAL_TYPE_VIO_ASYNC_INPUT)) || "
-                      "(asyncInDataBitCount == 0)");
-    requireInputCount(core, Qor_SignalBase::SIGNAL_TYPE_VIO_SYNC_INPUT, syncInDataBitCount,
-                      "QorVIO_getPortBits() arg. failed:(syncInDataBitCount == "
-                      "core->getCorePhysicalSignalCount(Qor_SignalBase::SIGNAL_TYPE_VIO_SYNC_INPUT)) || "
-                      "(syncInDataBitCount == 0)");
+  return onCore(session, coreRef, [&](QorVIO_Core& core) {
+    requireCount(core, Qor_SignalBase::SIGNAL_TYPE_VIO_ASYNC_INPUT, asyncInDataBitCount,
+                 "QorVIO_getPortBits() arg. failed:(asyncInDataBitCount == "
+                 "core->getCorePhysicalSignalCount(Qor_SignalBase::SIGNAL_TYPE_VIO_ASYNC_INPUT)) || "
+                 "(asyncInDataBitCount == 0)");
+    requireCount(core, Qor_SignalBase::SIGNAL_TYPE_VIO_SYNC_INPUT, syncInDataBitCount,
+                 "QorVIO_getPortBits() arg. failed:(syncInDataBitCount == "
+                 "core->getCorePhysicalSignalCount(Qor_SignalBase::SIGNAL_TYPE_VIO_SYNC_INPUT)) || "
+                 "(syncInDataBitCount == 0)");
     core.getPortBits(session, coreRef, asyncInValueBits, asyncInActivityUpBits, asyncInActivityDownBits,
                      asyncInDataBitCount, syncInValueBits, syncInActivityUpBits, syncInActivityDownBits,
                      syncInSyncActivityUpBits, syncInSyncActivityDownBits, syncInDataBitCount);
-    return callSucceeded;
   });
 }

@@ -3,7 +3,7 @@
 #include <stdexcept>
 
 #include "QorVIO_Core.h"
-#include "src/core/Messages.h"
+#include "src/Messages.h"
 
 namespace QorRT {
 

@@ -6,7 +6,7 @@
 #include <utility>
 
 #include "QorVIO_Core.h"
-#include "src/core/Messages.h"
+#include "src/Messages.h"
 
 namespace QorRT {
 

@@ -5,8 +5,8 @@
 #include <utility>
 
 #include "QorVIO_Core.h"
+#include "src/Messages.h"
 #include "src/core/HexField.h"
-#include "src/core/Messages.h"
 
 namespace QorRT {
 

@@ -4,7 +4,7 @@
 
 #include "QorUtil.h"
 #include "QorVIO_Core.h"
-#include "src/Require.h"
+#include "src/core/PortCount.h"
 #include "src/port/StepPlanes.h"
 
 namespace QorRT {
@@ -28,14 +28,14 @@ void QorVIO_Core::setPortBits(unsigned session, QOR_CORE_REF coreRef, const unsi
                               unsigned syncOutDataBitCount) {
   const bool hasAsync = asyncOutDataBitCount != 0;
   const bool hasSync = syncOutDataBitCount != 0;
-  require(!hasAsync || asyncOutDataBitCount == vioCoreInfo.async_output_count,
-          "QorVIO_setPortBits() arg. failed:(asyncOutDataBitCount == "
-          "core->getCorePhysicalSignalCount(Qor_SignalBase::SIGNAL_TYPE_VIO_ASYNC_OUTPUT)) || "
-          "(asyncOutDataBitCount == 0)");
-  require(!hasSync || syncOutDataBitCount == vioCoreInfo.sync_output_count,
-          "QorVIO_setPortBits() arg. failed:(syncOutDataBitCount == "
-          "core->getCorePhysicalSignalCount(Qor_SignalBase::SIGNAL_TYPE_VIO_SYNC_OUTPUT)) || "
-          "(syncOutDataBitCount == 0)");
+  requireCount(*this, Qor_SignalBase::SIGNAL_TYPE_VIO_ASYNC_OUTPUT, asyncOutDataBitCount,
+               "QorVIO_setPortBits() arg. failed:(asyncOutDataBitCount == "
+               "core->getCorePhysicalSignalCount(Qor_SignalBase::SIGNAL_TYPE_VIO_ASYNC_OUTPUT)) || "
+               "(asyncOutDataBitCount == 0)");
+  requireCount(*this, Qor_SignalBase::SIGNAL_TYPE_VIO_SYNC_OUTPUT, syncOutDataBitCount,
+               "QorVIO_setPortBits() arg. failed:(syncOutDataBitCount == "
+               "core->getCorePhysicalSignalCount(Qor_SignalBase::SIGNAL_TYPE_VIO_SYNC_OUTPUT)) || "
+               "(syncOutDataBitCount == 0)");
   require(!hasAsync || asyncOutValueBits != nullptr, "QorVIO_setPortBits() arg. failed:asyncOutValueBits!=0");
   require(!hasAsync || asyncOutMaskBits != nullptr, "QorVIO_setPortBits() arg. failed:asyncOutMaskBits!=0");
   require(!hasSync || syncOutStepBits != nullptr, "QorVIO_setPortBits() arg. failed:syncOutStepBits!=0");

@@ -6,6 +6,7 @@
 
 #include "QorVIO_Command.h"
 #include "QorVIO_SignalGroup.h"
+#include "src/Messages.h"
 
 namespace QorRT {
 
@@ -60,8 +61,7 @@ void QorVIO_SignalGroup::getValues(unsigned char* value, unsigned char* activity
 }
 
 void QorVIO_SignalGroup::requireBytes(unsigned size, unsigned long long needed) const {
-  if (size < needed)
-    throw std::logic_error("The size of the value is not large enough for the signal: " + getName());
+  if (size < needed) throw tooSmall(getName());
 }
 
 void QorVIO_SignalGroup::stageSequence(const unsigned char* value, unsigned count) {

@@ -22,6 +22,7 @@ TEST(CommandText, IsRefusedBeforeAnythingIsSent) {
       {write1 + write2 + "\n", "3, device index: "},
       {" " + write1 + write2, "1, device index: "},
       {"0 1 0 01 0 00000006 1F" + write2, "1, device index: 0"},
+      {"0a 1 f 01 1 00000006 1F" + write2, "1, capture flag: 1"},
       {"00  1 0 01 0 00000006 1F" + write2, "1, user chain number: "},
       {"00 1 G 01 0 00000006 1F" + write2, "1, core index: G"},
       {"00 1 0 00 0 00000006 1F" + write2, "1, code: 00"},

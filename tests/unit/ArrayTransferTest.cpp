@@ -122,17 +122,40 @@ TEST_F(Group, AsksForTheBytesOfWhatItStages) {
   sync.setValues(ones.data(), 1, 0);
 }
 
+/// Values, activity up and down, and of the synchronous input its two clocked activities.
+std::vector<std::string> inputsOf(const QorRT::QorVIO_Command& c) {
+  return {c.getAsyncInValues(),        c.getAsyncInActivityUp(),     c.getAsyncInActivityDown(),
+          c.getSyncInValues(),         c.getSyncInActivityUp(),      c.getSyncInActivityDown(),
+          c.getSyncInSyncActivityUp(), c.getSyncInSyncActivityDown()};
+}
+
+TEST_F(VioTest, AnImageIsAssignedWholly) {
+  QORVIO_CORE_INFO info{};
+  info.async_input_count = info.sync_input_count = info.async_output_count = info.sync_output_count = 1;
+  QorRT::QorVIO_Command image, copy;
+  image.initFromCoreInfo(info);
+  image.setAsyncOutValueBit(0, '1');
+  image.setSyncOutPulseTrainBit(0, 15, '1');
+  image.setAsyncOutMaskBit(0, '1');
+  image.setSyncOutMaskBit(0, '1');
+  platform.readDigits = "1110111110";
+  image.readInputs(session, ref);
+  image.setKeepsActivity(true);
+  copy = image;
+  EXPECT_EQ(inputsOf(copy), std::vector<std::string>(8, "1"));
+  std::string text;
+  EXPECT_EQ(copy.buildCommandText(ref, 1, text, nullptr), "00 1 0 01 0 00000014 40007");
+  platform.readDigits = "0000000000";
+  copy.readInputs(session, ref);
+  EXPECT_THAT(inputsOf(copy), ElementsAre("0", "1", "1", "0", "1", "1", "1", "1"));
+}
+
 TEST_F(Group, CopiesShareTheImageAndTheName) {
   QorRT::QorVIO_SignalGroup copy(sync);
   auto assigned = group(Qor_SignalBase::SIGNAL_TYPE_VIO_SYNC_INPUT, {0});
   assigned = sync;
   const auto& self = assigned;
   assigned = self;
-  QorRT::QorVIO_Command imageCopy;
-  imageCopy = image;
-  std::string text;
-  EXPECT_EQ(imageCopy.buildCommandText({0, 1, 0}, 1, text, nullptr),
-            "00 1 0 01 0 000000A1 " + std::string(40, '0'));
   for (const auto* g : {&copy, &assigned}) {
     EXPECT_EQ(g->getCommand(), &image);
     EXPECT_EQ(g->getKeyName(), "g");

@@ -1,4 +1,6 @@
 // What every exported function shares: lock, lookup, checks, and failures that become messages.
+#include <pthread.h>
+
 #include <functional>
 #include <stdexcept>
 
@@ -113,6 +115,32 @@ TEST_F(VioTest, WhateverIsThrownBelowBecomesOneMessageAfterTheLock) {
   platform.before["lock"] = [] { throw std::logic_error("unknown session 7"); };
   EXPECT_EQ(write({}), failed);
   EXPECT_THAT(platform.take(), ElementsAre("lock 7 60000", "message 100 unknown session 7"));
+}
+
+void* callRead(void* read) {
+  (*static_cast<std::function<void()>*>(read))();
+  return nullptr;
+}
+
+TEST_F(VioTest, ACancelledThreadEndsAndFreesTheLock) {
+#ifdef __SANITIZE_ADDRESS__
+  GTEST_SKIP() << "AddressSanitizer aborts when a cancelled thread unwinds";
+#endif
+  initCore(4, 3, 8, 10);
+  std::function<void()> call = [this] { read(); };
+  for (const char* place : {"sequence", "message"}) {
+    platform.before[place] = [] {
+      pthread_cancel(pthread_self());
+      pthread_testcancel();
+    };
+    pthread_t thread;
+    ASSERT_EQ(pthread_create(&thread, nullptr, callRead, &call), 0);
+    void* result = nullptr;
+    pthread_join(thread, &result);
+    EXPECT_EQ(result, PTHREAD_CANCELED);
+    EXPECT_EQ(platform.take().at(2), "unlock 7");
+    platform.before[place] = [] { throw std::runtime_error("link"); };
+  }
 }
 
 TEST_F(VioTest, AFailedReadLeavesTheMapAndAMessageSinkThatThrowsLetsNothingOut) {

@@ -101,6 +101,7 @@ TEST_F(Registry, NamesAreToldApartByLengthAndByte) {
 
 TEST_F(Registry, AssigningACoreDuplicatesItsNamesOntoItsOwnImage) {
   EXPECT_EQ(define("led", asyncOut, {3}), 0U);
+  EXPECT_EQ(define("key", asyncIn, {2}), 0U);
   const unsigned char word[154] = {};
   QorRT::QorVIO_Core twin(session, ref, {0, 9, 0, 0, 0}, word, sizeof word * 8);
   twin = core();
@@ -111,6 +112,15 @@ TEST_F(Registry, AssigningACoreDuplicatesItsNamesOntoItsOwnImage) {
   EXPECT_EQ(writtenDigits(8 + 160 + 8 + 10).substr(0, 8), "00010000");
   twin.addSignal(nullptr);
   twin.removeSignal(nullptr);
+  platform.readDigits =
+      "0000"
+      "0000"
+      "1000"
+      "0000" +
+      std::string(3 * 6, '0');
+  map.clear();
+  twin.readValues(session, ref, &map);
+  EXPECT_EQ(map["key"], "1");
   EXPECT_EQ(twin.getSignal("led", 0, 0), nullptr);
 }
 

@@ -1,4 +1,4 @@
-// Failures that several members of a core share.
+// Failures that several members of a core and its groups share.
 #pragma once
 
 #include <stdexcept>
