@@ -1,14 +1,14 @@
 /// @file
-/// The host's image of a core's four ports, and the command texts that move it to and from the core.
+/// The host's copy of a core's four ports, and the command texts that transfer it to and from the core.
 ///
 /// Conventions
 ///
-///  1. The image is characters, '0' or '1': character i of a port string belongs to port bit i. Once
-///     initialised, no string ever changes its length.
-///  2. A write sends the whole output image; its masks say which bits the core takes. A read replaces the
-///     whole input image, or leaves it as it was when it fails.
-///  3. Positions given to the accessors are below the port's width; they are not checked.
-///  4. No lock of its own: the holder of the session's target lock uses it.
+///  1. The image is characters, '0' or '1': character i of a port string is port bit i. After initialisation
+///     no string changes its length.
+///  2. A write sends the whole output image; its masks select the bits that the core takes. A read replaces
+///     the whole input image; if it fails, the image is as it was.
+///  3. Positions must be below the port's width; the accessors do not check them.
+///  4. The class has no lock: only the owner of the session's target lock may use it.
 ///  5. Only the name of the class is part of the exported interface, because groups are constructed with a
 ///     pointer to it. The library hides the members.
 #pragma once
@@ -25,59 +25,59 @@
 
 namespace QorRT {
 
-/// The port image of one core. A new one has no ports.
+/// The port image of one core. A new image has no ports.
 class QORVIO_API QorVIO_Command {
  public:
   /// Steps of a pulse train.
   static constexpr unsigned int stepCount = 16;
 
-  /// The values of one synchronous output at steps 0 to 15. The string is held in place, because a port has
-  /// one for each bit: no allocation to fail while values are staged, and one run of memory to send.
+  /// The values of one synchronous output at steps 0 to 15. An array, not a string, because a port has one
+  /// per bit: staging a value then allocates nothing, and all of a port is one block of memory.
   using PulseTrain = std::array<char, stepCount>;
 
   QorVIO_Command();
-  /// Copies the whole image, or throws with the target as it was.
+  /// Copies the whole image. If it throws, the target is as it was.
   /// @{
   QorVIO_Command(const QorVIO_Command& other);
   QorVIO_Command& operator=(const QorVIO_Command& other);
   /// @}
   ~QorVIO_Command();
-  /// Exchanges the images; throws nothing.
+  /// Exchanges the two images.
   void swap(QorVIO_Command& other) noexcept;
 
-  /// Sizes the image by the record's widths, all '0'. Called once, on a new object.
+  /// Gives every string the width of its port in the record, all '0'. Called once, on a new object.
   void initFromCoreInfo(QORVIO_CORE_INFO info);
 
-  /// Replaces `text` by the command text of code 1 (outputs), 2 (obey) or 3 (read), and returns it; other
-  /// codes leave it empty. `resultBitCount` (out, may be null) receives the number of bits that the text
-  /// returns. Throws logic_error for an address that its fields cannot hold (device above 255, user chain or
-  /// core above 15), with `text` unfit to be sent.
+  /// Replaces `text` (out) by the command text of code 1 (output data), 2 (write) or 3 (read), and returns
+  /// it; for other codes it is empty. `resultBitCount` (out, may be null) receives the number of bits that
+  /// the text returns. Throws logic_error for an address that does not fit its fields (device above 255,
+  /// user chain or core above 15); `text` must not be sent then.
   std::string& buildCommandText(const QOR_CORE_REF& coreRef, unsigned int commandCode, std::string& text,
                                 unsigned int* resultBitCount);
 
-  /// Sends the output image and flushes the target; does nothing for a core without outputs. A failure leaves
-  /// the image as staged.
+  /// Sends the output image and flushes the target. Does nothing for a core without outputs. After a failure
+  /// the image is as staged.
   void writeOutputs(unsigned int session, const QOR_CORE_REF& coreRef);
 
-  /// Reads all inputs into the image; does nothing for a core without inputs. A failure leaves the image as
+  /// Reads all inputs into the image. Does nothing for a core without inputs. After a failure the image is as
   /// it was.
   void readInputs(unsigned int session, const QOR_CORE_REF& coreRef);
 
-  /// Says whether the next read adds its activity flags to those in the image, because they have not reached
-  /// the caller, instead of replacing them. False at first, and after each read.
+  /// If true, the next read adds its activity flags to those in the image, which have not reached the caller;
+  /// otherwise it replaces them. False at first, and after each read.
   void setKeepsActivity(bool keeps) { keepsActivity = keeps; }
 
   /// Marks no output for the next write.
   void clearMasks();
 
-  /// Whole strings are of the port's width, '0' and '1' only.
+  /// Replace a whole string. The new one has the port's width, and only '0' and '1'.
   /// @{
   void setAsyncOutValues(std::string values) { asyncOutValues = std::move(values); }
   void setAsyncOutMask(std::string mask) { asyncOutMask = std::move(mask); }
   void setSyncOutMask(std::string mask) { syncOutMask = std::move(mask); }
   /// @}
 
-  /// One bit, '0' or '1', or the 16 steps of one synchronous output.
+  /// Set one bit to '0' or '1', or the 16 steps of one synchronous output.
   /// @{
   void setAsyncOutValueBit(unsigned int position, char c) { asyncOutValues[position] = c; }
   void setAsyncOutMaskBit(unsigned int position, char c) { asyncOutMask[position] = c; }
@@ -88,7 +88,7 @@ class QORVIO_API QorVIO_Command {
   }
   /// @}
 
-  /// What the last read brought of one input bit (out, '0' or '1' each).
+  /// Value and activity flags of one input bit at the last read (out, '0' or '1' each).
   /// @{
   void getAsyncInBits(unsigned int position, char* value, char* activityUp, char* activityDown) const {
     *value = asyncInValues[position];
@@ -105,7 +105,7 @@ class QORVIO_API QorVIO_Command {
   }
   /// @}
 
-  /// What the last read brought, a character a port bit.
+  /// Values and activity flags at the last read, one character per port bit.
   /// @{
   const std::string& getAsyncInValues() const { return asyncInValues; }
   const std::string& getAsyncInActivityUp() const { return asyncInActivityUp; }
@@ -137,7 +137,7 @@ class QORVIO_API QorVIO_Command {
   QORVIO_CORE_INFO vioCoreInfo;
   bool keepsActivity = false;
 
-  /// What a transfer needs on the way, kept so that polling allocates nothing. A copy starts with its own.
+  /// Buffers of a transfer, kept so that polling allocates nothing. A copy starts with buffers of its own.
   struct Scratch {
     Scratch() = default;
     Scratch(const Scratch& /*other*/) noexcept {}

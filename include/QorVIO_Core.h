@@ -4,12 +4,12 @@
 ///
 /// Conventions
 ///
-///  1. Every failure is a standard exception, most of them logic_error; the exported functions turn it into a
+///  1. Every failure is a standard exception, usually logic_error. The exported functions report it as a
 ///     message.
-///  2. No lock of its own: the holder of the session's target lock uses it.
-///  3. Port type codes, names, bits and bytes are as in QorVIO.h; values of groups as in
+///  2. The class has no lock: only the owner of the session's target lock may use it.
+///  3. Port type codes, names, bits and bytes are those of QorVIO.h; values of groups are those of
 ///     QorVIO_SignalGroup.h.
-///  4. Checks come first: a name, size or array that fails one means that nothing was staged or sent.
+///  4. Names, sizes and arrays are checked first: if a check fails, nothing was staged or sent.
 #pragma once
 
 #include <array>
@@ -29,8 +29,8 @@ namespace QorRT {
 /// A VIO core that has been set up: what QorVIO_initCore puts into the core list.
 class QORVIO_API QorVIO_Core : public Qor_SignalCore {
  public:
-  /// Where the status word keeps the port widths and versions, in bits: before version 6.2, before 10.0, and
-  /// since.
+  /// Bit offsets and lengths of the port widths and versions in the status word: before version 6.2, before
+  /// 10.0, and since.
   /// @{
   static const unsigned int BEFORE_062_ASYNC_INPUT_COUNT_BIT_OFFSET = 40;
   static const unsigned int BEFORE_062_SYNC_INPUT_COUNT_BIT_OFFSET = 48;
@@ -57,79 +57,81 @@ class QORVIO_API QorVIO_Core : public Qor_SignalCore {
   static const unsigned int PORT_BIT_LEN = 16;
   /// @}
 
-  /// `statusWord` (in) holds `bitCount` bits and is copied. The core has no ports before initFromStatusWord.
+  /// Copies `statusWord` (in, `bitCount` bits). The core has no ports before initFromStatusWord.
   QorVIO_Core(unsigned int session, QOR_CORE_REF coreRef, QOR_CORE_INFO coreInfo,
               const unsigned char* statusWord, unsigned int bitCount);
   QorVIO_Core(const QorVIO_Core&) = delete;
-  /// Takes over session, address and information, and duplicates every group, onto this core's own port
-  /// image; or throws with this core's names and image as they were.
+  /// Copies session, address, information and port image, and duplicates every group; the duplicates use this
+  /// core's own image. If it throws, names and image are as they were.
   QorVIO_Core& operator=(const QorVIO_Core& other);
   ~QorVIO_Core() override;
 
-  /// Takes widths and versions from the status word and defines the whole-port names. Called once, on a new
+  /// Decodes widths and versions from the status word and defines the whole-port names. Called once, on a new
   /// core. Returns true.
   bool initFromStatusWord(unsigned int session) override;
 
-  /// The generic signals of a core are not used here: adding and removing do nothing, getting gives null.
+  /// The generic signals of a core are not used here: adding and removing do nothing, getting returns null.
   /// @{
   void addSignal(Qor_SignalBase* signal) override;
   Qor_SignalBase* getSignal(const std::string& name, unsigned int first, unsigned int last) override;
   void removeSignal(Qor_SignalBase* signal) override;
   /// @}
 
-  /// Decodes a status word (in) by the core's version into `*vioCoreInfo` (out). Session, address and
-  /// `bitCount` take no part. Checks nothing.
+  /// Decodes a status word (in), in the layout of the core's version, into `*vioCoreInfo` (out). Session,
+  /// address and `bitCount` are not used. Nothing is checked.
   static void getVioCoreStatus(unsigned int session, QOR_CORE_REF coreRef, const QOR_CORE_INFO& coreInfo,
                                Qor_ByteBuffer& statusWord, unsigned int bitCount,
                                QORVIO_CORE_INFO* vioCoreInfo);
 
-  /// Names port bits, in the order of the value's bits; see QorVIO_defineBus. A failure changes nothing.
+  /// Gives a name to port bits (in), in the order of the value's bits; see QorVIO_defineBus. A failure
+  /// changes nothing.
   void defineSignal(const std::string& name, unsigned int type, std::vector<unsigned int>& positions);
 
-  /// Removes a name from the inputs when `type` is 1 or 3, else from the outputs. A failure changes nothing.
+  /// Removes a name from the inputs if `type` is 1 or 3, else from the outputs. A failure changes nothing.
   void undefineSignal(const std::string& name, unsigned int type);
 
-  /// Widths of the first `count` names into `sizes` (out, `count` elements). Sizes before a failure stay
-  /// written.
+  /// Writes the widths in bits of the first `count` names to `sizes` (out, `count` elements). At a name
+  /// that is not defined it throws; the sizes before it are written.
   void getSignalSizes(std::vector<std::string> names, unsigned int* sizes, unsigned int count,
                       unsigned int isOutput);
 
   /// Defines a whole-port name for each port that has bits.
   void addReservedSignals();
 
-  /// Writes every entry of the map (in) in one exchange; see QorVIO_writeValues. A text that is no
-  /// hexadecimal number leaves entries before it staged, unsent, and unmarked for the next write.
+  /// Writes every entry of the map (in) in one exchange; see QorVIO_writeValues. If a text is not
+  /// hexadecimal, nothing is sent, but values of entries before it are staged; the next write does not mark
+  /// them.
   void writeValues(unsigned int session, QOR_CORE_REF coreRef,
                    hash_map<std::string, std::string>* outputHashMap);
 
-  /// Reads all inputs in one exchange into the map (out); see QorVIO_readValues. Each entry is set wholly or
-  /// not at all. When not all are set, the next read tells their activity again.
+  /// Reads all inputs in one exchange into the map (in, out); see QorVIO_readValues. If not all entries can
+  /// be set, each is set completely or not at all, and the next read reports the activity flags again.
   void readValues(unsigned int session, QOR_CORE_REF coreRef,
                   hash_map<std::string, std::string>* inputHashMap);
 
-  /// Writes `samples` values of each of `count` names. `values[i]` (in) holds them one after another in
-  /// `sizes[i]` bytes. One exchange a sample; with `burst` 1 one for every 16, as pulse trains of synchronous
-  /// outputs. After a failed exchange the samples before it are written.
+  /// Writes `samples` values of each of `count` names. `values[i]` (in, `sizes[i]` bytes) is the values of
+  /// name i, one after another. One exchange per sample; with `burst` 1 one per 16 samples, as pulse trains
+  /// of synchronous outputs. After a failed exchange the samples before it are written.
   void writeValues(unsigned int session, QOR_CORE_REF coreRef, std::vector<std::string> names,
                    const unsigned char** values, unsigned int* sizes, unsigned int count,
                    unsigned int samples, unsigned int burst);
 
-  /// Reads `samples` values of each of `count` names, one exchange a sample. Sample k of name i lands k
-  /// values into its buffers (out, `sizes[i]` bytes each, zero-filled by the caller). Each of the five
-  /// arrays, and each buffer, may be null: not wanted. After a failed exchange the samples before it are in
+  /// Reads `samples` values of each of `count` names, one exchange per sample. Sample k of name i is value
+  /// k of its buffers (out, `sizes[i]` bytes each, zero-filled by the caller). Each of the five arrays, and
+  /// each buffer, may be null: it is not filled then. After a failed exchange the samples before it are in
   /// the buffers.
   void readValues(unsigned int session, QOR_CORE_REF coreRef, std::vector<std::string> names,
                   unsigned char** values, unsigned char** activityUp, unsigned char** activityDown,
                   unsigned char** syncActivityUp, unsigned char** syncActivityDown, unsigned int* sizes,
                   unsigned int count, unsigned int samples);
 
-  /// Writes whole output ports in one exchange; see QorVIO_setPortBits, whose checks are made here.
+  /// Writes whole output ports in one exchange; see QorVIO_setPortBits, whose checks are here.
   void setPortBits(unsigned int session, QOR_CORE_REF coreRef, const unsigned char* asyncOutValueBits,
                    const unsigned char* asyncOutMaskBits, unsigned int asyncOutDataBitCount,
                    const unsigned char* syncOutStepBits, const unsigned char* syncOutMaskBits,
                    unsigned int syncOutDataBitCount);
 
-  /// Reads whole input ports in one exchange; see QorVIO_getPortBits. Any count but 0 delivers the whole
+  /// Reads whole input ports in one exchange; see QorVIO_getPortBits. Any count except 0 delivers the whole
   /// port.
   void getPortBits(unsigned int session, QOR_CORE_REF coreRef, unsigned char* asyncInValueBits,
                    unsigned char* asyncInActivityUpBits, unsigned char* asyncInActivityDownBits,
@@ -139,7 +141,7 @@ class QORVIO_API QorVIO_Core : public Qor_SignalCore {
                    unsigned int syncInDataBitCount);
 
  protected:
-  /// The four port widths, by signal type.
+  /// Sets the count of each signal type to the width of its port.
   void setCorePhysicalSignalCounts() override;
 
  private:

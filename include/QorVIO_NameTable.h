@@ -3,10 +3,10 @@
 ///
 /// Conventions
 ///
-///  1. Names are told apart by length and byte, but A to Z equal a to z. Every other byte, NUL included,
-///     counts as it is.
-///  2. A key looks at the name that its group keeps, so a group outlives its entry; looking a name up makes
-///     no copy of it and leaves no entry behind.
+///  1. Two names are the same if their lengths and bytes are the same; A to Z equal a to z. Every other byte,
+///     NUL included, must match exactly.
+///  2. A key is a view of the name in its group, so a group must live longer than its entry. Looking a
+///     name up copies nothing and adds no entry.
 #pragma once
 
 #include <cstddef>
@@ -19,7 +19,7 @@
 
 namespace QorRT {
 
-/// Tells names apart as the conventions say.
+/// Compares names as the conventions say.
 struct QorVIO_NameEqual {
   /// The byte, A to Z as a to z.
   static unsigned char folded(char letter) {
@@ -36,8 +36,8 @@ struct QorVIO_NameEqual {
   }
 };
 
-/// FNV-1a over the folded bytes. Not noexcept on purpose: the table then keeps each hash instead of computing
-/// it again for every name that it passes on the way to another.
+/// FNV-1a over the folded bytes. Not noexcept on purpose: the table then stores each hash instead of
+/// computing it again when it searches a bucket.
 struct QorVIO_NameHash {
   /// The same for names that are the same.
   std::size_t operator()(std::string_view name) const {
@@ -47,7 +47,7 @@ struct QorVIO_NameHash {
   }
 };
 
-/// The groups by name, each owned by its entry.
+/// The groups by name. Each entry owns its group.
 using QorVIO_NameTable = std::unordered_map<std::string_view, std::unique_ptr<QorVIO_SignalGroup>,
                                             QorVIO_NameHash, QorVIO_NameEqual>;
 

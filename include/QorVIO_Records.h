@@ -1,5 +1,9 @@
 /// @file
-/// The records and the map that cross the exported interface.
+/// The record and the map of the exported interface.
+///
+/// Conventions
+///
+///  1. All fields are unsigned 32-bit numbers. Widths are in bits.
 #pragma once
 
 #include <string>
@@ -9,13 +13,13 @@
 
 namespace QorRT {
 
-/// The text map: hashed by the whole key, compared exactly.
+/// The text map. Keys are compared exactly, case included.
 template <class Key, class Value>
 using hash_map = std::unordered_map<Key, Value>;
 
 }  // namespace QorRT
 
-/// What a VIO core says of itself. Widths are in bits; 0 means that the core has no such port.
+/// The decoded status word of a VIO core. A width of 0 means that the core has no such port.
 struct QORVIO_CORE_INFO {
   unsigned manufacturer_id;         ///< as in QOR_CORE_INFO
   unsigned core_type;               ///< 9

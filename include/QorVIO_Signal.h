@@ -1,5 +1,9 @@
 /// @file
-/// A one-bit signal for clients that keep signals of their own.
+/// A one-bit signal for hosts that keep signals of their own. The library itself creates none.
+///
+/// Conventions
+///
+///  1. Failures are exceptions. No lock: the host serialises access to an object.
 #pragma once
 
 #include <string>
@@ -15,7 +19,7 @@ class QORVIO_API QorVIO_Signal : public Qor_Signal {
  public:
   /// The arguments are those of Qor_Signal.
   QorVIO_Signal(unsigned int type, unsigned int unit, unsigned int position, const std::string& name);
-  /// Copies the properties too. Assigning is wholly done, or throws bad_alloc with the target as it was.
+  /// Copies the properties too. If an assignment throws (bad_alloc), the target is as it was.
   /// @{
   QorVIO_Signal(const QorVIO_Signal& other);
   QorVIO_Signal& operator=(const QorVIO_Signal& other);
