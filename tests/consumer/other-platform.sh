@@ -5,8 +5,9 @@ top=$1/../..
 mkdir -p "$3"
 platform=$3/libOtherPlatform.so
 # shellcheck disable=SC2086 # a list of options
-"$CXX" -std=c++17 $CXXFLAGS -fPIC -shared -Wl,-soname,libOtherPlatform.so -I"$top/platform/include" "$1"/platform/*.cpp \
-  -o "$platform"
+"$CXX" -std=c++17 $CXXFLAGS -fPIC -shared -Wl,-soname,libOtherPlatform.so -I"$top" -I"$top/platform/include" -I"$top/include" \
+  "$1"/platform/Board.cpp "$top"/tests/unit/fakes/FakePlatform.cpp "$top"/platform/util/*.cpp "$top"/platform/core/Qor_Core.cpp \
+  "$top"/platform/core/Qor_Signal.cpp -o "$platform"
 
 cmake -S "$top" -B "$3/library" -G Ninja -DQORVIO_PLATFORM="$platform" >/dev/null
 cmake --build "$3/library"

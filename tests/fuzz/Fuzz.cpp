@@ -6,14 +6,10 @@
 #include <fstream>
 #include <iterator>
 
-void require(bool holds, const std::string& what) {
-  if (holds) return;
-  std::fprintf(stderr, "not as the model says: %s\n", what.c_str());
+void require(bool condition, const std::string& what) {
+  if (condition) return;
+  std::fprintf(stderr, "not so: %s\n", what.c_str());
   std::abort();
-}
-
-void requireEqual(const std::string& seen, const std::string& wanted) {
-  require(seen == wanted, "\n   seen: " + seen + "\n wanted: " + wanted);
 }
 
 std::vector<std::string> split(std::string_view text, char separator) {
@@ -25,17 +21,6 @@ std::vector<std::string> split(std::string_view text, char separator) {
       parts.back() += c;
   }
   return parts;
-}
-
-int digitValue(char c) {
-  const std::size_t at = std::string_view("0123456789ABCDEFabcdef").find(c);
-  return at == std::string_view::npos ? -1 : static_cast<int>(at < 16 ? at : at - 6);
-}
-
-std::string hexText(unsigned value, int count) {
-  char text[16];
-  std::snprintf(text, sizeof text, "%0*X", count, value);
-  return text;
 }
 
 extern "C" int LLVMFuzzerTestOneInput(const unsigned char* data, std::size_t size) {

@@ -1,7 +1,7 @@
-// What the fuzz targets share. Each is one function over any bytes that compares the library with a slow and
-// obvious model of what it promises.
+// What the fuzz targets share. Each is one function over any bytes that checks properties of the library.
 #pragma once
 
+#include <exception>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -9,17 +9,10 @@
 /// The target of this program.
 void fuzz(std::string_view input);
 
-/// Prints `what` and aborts, unless it holds.
-void require(bool holds, const std::string& what);
-void requireEqual(const std::string& seen, const std::string& wanted);
+/// Prints `what` and aborts, unless the condition is true.
+void require(bool condition, const std::string& what);
 
 std::vector<std::string> split(std::string_view text, char separator);
-
-/// The value of a hexadecimal digit, or -1.
-int digitValue(char c);
-
-/// At least `count` digits, upper case.
-std::string hexText(unsigned value, int count);
 
 /// What the call throws, or an empty text.
 template <typename Call>

@@ -1,8 +1,8 @@
-// Values by name, as bytes, several samples a call; and the groups underneath. Samples, bursts and port images:
-// tests/fuzz/corpus/ports.
+// Values by name, as bytes, several samples per call; and the groups underneath.
 #include <functional>
 #include <stdexcept>
 
+#include "QorUtil.h"
 #include "QorVIO_Signal.h"
 #include "tests/unit/VioTest.h"
 
@@ -63,6 +63,11 @@ TEST_F(Arrays, AreCheckedBeforeAnythingIsStagedOrSent) {
   EXPECT_EQ(read({"async_in_data"}, &size), tooSmall + "async_in_data");
   EXPECT_EQ(read({"leds"}, &size), "Could not find a signal with the name: leds");
   EXPECT_EQ(read({"sync_in_data"}, nullptr), noSizes);
+  EXPECT_EQ(failureOf([&] {
+              core().readValues(session, ref, {"async_in_data"}, nullptr, nullptr, nullptr, nullptr, nullptr,
+                                &size, 1, 0x80000000);
+            }),
+            tooSmall + "async_in_data");
   EXPECT_EQ(read({}, &size), "The list of names is shorter than the count.");
 
   EXPECT_EQ(failureOf([&] { core().writeValues(session, ref, {"leds"}, nullptr, &size, 1, 3, 0); }),
@@ -72,6 +77,25 @@ TEST_F(Arrays, AreCheckedBeforeAnythingIsStagedOrSent) {
   EXPECT_THAT(platform.take(), ElementsAre());
   core().writeValues(session, ref, {}, nullptr, nullptr, 0, 1, 0);
   EXPECT_EQ(writtenDigits(74), std::string(74, '0'));
+}
+
+TEST_F(Arrays, AreWrittenInBurstsOfSixteen) {
+  const auto written = [](const std::string& first, const std::string& second) {
+    std::string hex;
+    QorRT::Qor_NumberUtil::binStr2HexStr("000" + first + std::string(32, '0') + second + "0001001", hex);
+    return "sequence 00 1 0 01 0 0000004B " + hex + "\n00 1 0 02 0 00000004 0";
+  };
+  Bytes samples(20);
+  for (unsigned i = 0; i < 20; ++i) samples[i] = i % 4;
+  const unsigned char* values[] = {samples.data()};
+  unsigned sizes[] = {20};
+  core().writeValues(session, ref, {"train"}, values, sizes, 1, 20, 1);
+  EXPECT_THAT(platform.take(), ElementsAre(written("0101010101010101", "0011001100110011"), "flush 7",
+                                           written("0101111111111111", "0011111111111111"), "flush 7"));
+  core().writeValues(session, ref, {"train"}, values, sizes, 1, 20, 2);
+  EXPECT_EQ(platform.take().size(), 40U);
+  core().writeValues(session, ref, {"train"}, values, sizes, 1, 0, 0);
+  EXPECT_THAT(platform.take(), ElementsAre());
 }
 
 TEST_F(Arrays, OfAReadMayHoldNullBuffers) {
