@@ -47,6 +47,9 @@ setup() {
   printf 'leds\n1\n' >unknown.csv
   run "$QORVIO" play unknown.csv
   [ "$output" = "qorvio: unknown.csv:1: no output of that name: leds" ]
+  echo sync_out_data >none.csv
+  run "$QORVIO" play none.csv
+  [ "$output" = "qorvio: none.csv:1: has no row of values below its names" ]
 }
 
 @test "play sends rows at their times, in a recording's own columns too" {
