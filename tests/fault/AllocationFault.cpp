@@ -60,29 +60,22 @@ std::size_t liveBlocks() noexcept {
 
 }  // namespace allocation_fault
 
-using std::align_val_t;
-using std::nothrow_t;
-using std::size_t;
-
-// clang-format off
-void* operator new(size_t n) { return orThrow(allocate(n)); }
-void* operator new[](size_t n) { return orThrow(allocate(n)); }
-void* operator new(size_t n, const nothrow_t&) noexcept { return allocate(n); }
-void* operator new[](size_t n, const nothrow_t&) noexcept { return allocate(n); }
-void* operator new(size_t n, align_val_t a) { return orThrow(allocate(n, static_cast<size_t>(a))); }
-void* operator new[](size_t n, align_val_t a) { return orThrow(allocate(n, static_cast<size_t>(a))); }
-void* operator new(size_t n, align_val_t a, const nothrow_t&) noexcept { return allocate(n, static_cast<size_t>(a)); }
-void* operator new[](size_t n, align_val_t a, const nothrow_t&) noexcept { return allocate(n, static_cast<size_t>(a)); }
-
-void operator delete(void* p) noexcept { release(p); }
-void operator delete[](void* p) noexcept { release(p); }
-void operator delete(void* p, size_t) noexcept { release(p); }
-void operator delete[](void* p, size_t) noexcept { release(p); }
-void operator delete(void* p, const nothrow_t&) noexcept { release(p); }
-void operator delete[](void* p, const nothrow_t&) noexcept { release(p); }
-void operator delete(void* p, align_val_t) noexcept { release(p); }
-void operator delete[](void* p, align_val_t) noexcept { release(p); }
-void operator delete(void* p, size_t, align_val_t) noexcept { release(p); }
-void operator delete[](void* p, size_t, align_val_t) noexcept { release(p); }
-void operator delete(void* p, align_val_t, const nothrow_t&) noexcept { release(p); }
-void operator delete[](void* p, align_val_t, const nothrow_t&) noexcept { release(p); }
+// The others call these.
+void* operator new(std::size_t size) {
+  return orThrow(allocate(size));
+}
+void* operator new(std::size_t size, std::align_val_t alignment) {
+  return orThrow(allocate(size, static_cast<std::size_t>(alignment)));
+}
+void operator delete(void* block) noexcept {
+  release(block);
+}
+void operator delete(void* block, std::size_t) noexcept {
+  release(block);
+}
+void operator delete(void* block, std::align_val_t) noexcept {
+  release(block);
+}
+void operator delete(void* block, std::size_t, std::align_val_t) noexcept {
+  release(block);
+}

@@ -47,19 +47,7 @@ static_assert(sizeof(QorVIO_Signal) == sizeof(QorRT::Qor_Signal));
 static_assert(sizeof(QorVIO_SignalGroup) ==
               sizeof(QorRT::Qor_SignalGroup) + sizeof(std::string) + sizeof(void*));
 
-static_assert(Core::BEFORE_062_ASYNC_INPUT_COUNT_BIT_OFFSET == 40);
-static_assert(Core::BEFORE_062_SYNC_INPUT_COUNT_BIT_OFFSET == 48);
-static_assert(Core::BEFORE_062_ASYNC_OUTPUT_COUNT_BIT_OFFSET == 56);
-static_assert(Core::BEFORE_062_SYNC_OUTPUT_COUNT_BIT_OFFSET == 64);
-static_assert(Core::BEFORE_101_ASYNC_INPUT_COUNT_BIT_OFFSET == 40);
-static_assert(Core::BEFORE_101_SYNC_INPUT_COUNT_BIT_OFFSET == 56);
-static_assert(Core::BEFORE_101_ASYNC_OUTPUT_COUNT_BIT_OFFSET == 72);
-static_assert(Core::BEFORE_101_SYNC_OUTPUT_COUNT_BIT_OFFSET == 88);
-static_assert(Core::CG_MAJOR_VERSION_BIT_OFFSET == 40 && Core::CG_MAJOR_VERSION_BIT_LEN == 4);
-static_assert(Core::CG_MINOR_VERSION_BIT_OFFSET == 44 && Core::CG_MINOR_VERSION_BIT_LEN == 8);
-static_assert(Core::CG_MINOR_VERSION_ALPHA_BIT_OFFSET == 52 && Core::CG_MINOR_VERSION_ALPHA_BIT_LEN == 8);
-static_assert(Core::ASYNC_INPUT_COUNT_BIT_OFFSET == 60 && Core::SYNC_INPUT_COUNT_BIT_OFFSET == 76);
-static_assert(Core::ASYNC_OUTPUT_COUNT_BIT_OFFSET == 92 && Core::SYNC_OUTPUT_COUNT_BIT_OFFSET == 108);
+// The offsets are in InformationTest.cpp.
 static_assert(Core::BEFORE_062_PORT_BIT_LEN == 8 && Core::BEFORE_101_PORT_BIT_LEN == 16 &&
               Core::PORT_BIT_LEN == 16);
 

@@ -47,6 +47,12 @@ TEST_F(VioTest, ACoreOfAnotherLibraryIsReplacedByInitOnly) {
   platform.cores["0.1.0"] = std::make_unique<OtherCore>(9);  // of the type, but not of the class
   EXPECT_EQ(write({}), failed);
   EXPECT_THAT(platform.take(), locked(lookupFailed));
+  const unsigned char word[154] = {};
+  const QOR_CORE_INFO otherType{0, 7, 0, 0, 0};  // and the other way round
+  platform.cores["0.1.0"] =
+      std::make_unique<QorRT::QorVIO_Core>(session, ref, otherType, word, sizeof word * 8);
+  EXPECT_EQ(write({}), failed);
+  EXPECT_THAT(platform.take(), locked(lookupFailed));
   platform.cores["0.1.0"] = std::make_unique<OtherCore>(7);
   EXPECT_EQ(QorVIO_terminateCore(session, ref), 0U);
   EXPECT_TRUE(platform.take().empty());
