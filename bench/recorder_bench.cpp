@@ -9,6 +9,7 @@
 
 #include "Sim.h"
 #include "board/record/Recording.h"
+#include "board/session/LocalCore.h"
 
 namespace {
 
@@ -48,16 +49,17 @@ double secondsOf(Action action) {
 void record(benchmark::State& state) {
   const auto width = static_cast<unsigned>(state.range(0));
   qor::Link link(boardOf(width, static_cast<unsigned>(state.range(2))));
-  qor::CoreSession core(link, {0, 1, 0}, "");
+  qor::LocalCore core(link, {0, 1, 0});
+  qor::Poller poller({&core});
   const std::vector<qor::Signal> signals = signalsOf(width);
   const std::string path =
       fs::temp_directory_path() / (std::string("recorder_bench.") + endings[state.range(1)]);
   qor::Limits limits;
   limits.samples = 800 + 80000 / width;
-  qor::Sample sample = core.emptySample();
+  qor::Sample sample = qor::emptySample(core.info());
   double recorded = 0, bare = 0;
   for (auto _ : state) {
-    recorded += secondsOf([&] { qor::recordTo(path, core, signals, limits); });
+    recorded += secondsOf([&] { qor::recordTo(path, poller, signals, limits); });
     bare += secondsOf([&] {
       for (std::uint64_t i = 0; i < limits.samples; ++i) core.read(sample);
     });

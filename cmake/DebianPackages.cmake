@@ -45,7 +45,7 @@ This package holds the command line.")
 
 file(WRITE ${PROJECT_BINARY_DIR}/triggers "activate-noawait ldconfig\n")
 set(shlibs "")
-foreach(library QorCore QorJtag QorUtil QorVIO)
+foreach(library QorBoard QorCore QorJtag QorUtil QorVIO)
   string(APPEND shlibs "lib${library} ${PROJECT_VERSION_MAJOR} libqorvio (>= ${PROJECT_VERSION})\n")
 endforeach()
 file(WRITE ${PROJECT_BINARY_DIR}/shlibs "${shlibs}")

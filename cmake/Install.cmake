@@ -7,14 +7,21 @@ set(qor_headers ${CMAKE_INSTALL_INCLUDEDIR}/qorvio)
 set(qor_config ${CMAKE_INSTALL_LIBDIR}/cmake/QorVIO)
 file(RELATIVE_PATH to_headers ${CMAKE_INSTALL_FULL_LIBDIR}/pkgconfig ${CMAKE_INSTALL_FULL_INCLUDEDIR}/qorvio)
 
-# qor_install(TARGET DESCRIPTION [REQUIRES TARGET...] HEADERS FILE...)
+# qor_install(TARGET DESCRIPTION [REQUIRES TARGET...] [FOLDER NAME] HEADERS FILE...): with a folder, headers keep their
+# paths, in that folder.
 function(qor_install target description)
-  cmake_parse_arguments(arg "" "" "REQUIRES;HEADERS" ${ARGN})
+  cmake_parse_arguments(arg "" "FOLDER" "REQUIRES;HEADERS" ${ARGN})
   set_target_properties(${target} PROPERTIES INSTALL_RPATH "$ORIGIN")
   target_include_directories(${target} INTERFACE $<INSTALL_INTERFACE:${qor_headers}>)
   install(TARGETS ${target} EXPORT QorVIO LIBRARY
           DESTINATION ${CMAKE_INSTALL_LIBDIR} COMPONENT libqorvio NAMELINK_COMPONENT libqorvio-dev)
-  install(FILES ${arg_HEADERS} DESTINATION ${qor_headers} COMPONENT libqorvio-dev)
+  foreach(header ${arg_HEADERS})
+    set(folder "")
+    if(arg_FOLDER)
+      get_filename_component(folder ${arg_FOLDER}/${header} DIRECTORY)
+    endif()
+    install(FILES ${header} DESTINATION ${qor_headers}/${folder} COMPONENT libqorvio-dev)
+  endforeach()
 
   string(TOLOWER "${arg_REQUIRES}" requires)
   list(JOIN requires ", " requires)

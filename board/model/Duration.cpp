@@ -1,5 +1,6 @@
 #include "board/model/Duration.h"
 
+#include <algorithm>
 #include <charconv>
 #include <cstdio>
 #include <string_view>
@@ -21,6 +22,18 @@ std::chrono::nanoseconds parseDuration(const std::string& text) {
     return std::chrono::nanoseconds(static_cast<std::int64_t>(number * nanoseconds));
   }
   throw WrongUse("not a time such as 100ms, 10s or 2m: " + text);
+}
+
+std::string durationText(std::chrono::nanoseconds time) {
+  constexpr std::pair<const char*, double> units[] = {{" s", 1e9}, {" ms", 1e6}, {" us", 1e3}};
+  const auto number = static_cast<double>(time.count());
+  const auto* const unit = std::find_if(std::begin(units), std::end(units) - 1, [&](const auto& each) {
+    return number == 0 || number >= each.second;
+  });
+  char text[40];
+  const auto end =
+      std::to_chars(text, text + sizeof text, number / unit->second, std::chars_format::general, 6).ptr;
+  return std::string(text, end) + unit->first;
 }
 
 std::chrono::nanoseconds periodOf(double rate, double fewest, double most) {

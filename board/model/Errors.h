@@ -1,17 +1,47 @@
-// How a command ends: WrongUse with exit status 2, any other exception with 1. Texts read "what: offending value".
+/// @file
+/// What the engine throws. Texts read "what is wrong: offending value".
 #pragma once
 
 #include <stdexcept>
 
+#include "board/Export.h"
+
 namespace qor {
 
-class WrongUse : public std::runtime_error {
+/// The base of all of them.
+class QORBOARD_API Error : public std::runtime_error {
+ public:
   using std::runtime_error::runtime_error;
 };
 
-/// The device or the link failed.
-class Failure : public std::runtime_error {
-  using std::runtime_error::runtime_error;
+/// A name, value, file or option that cannot be used. Nothing was sent.
+class QORBOARD_API WrongUse : public Error {
+ public:
+  using Error::Error;
+};
+
+/// No signal of that name; the text names the nearest one, if one is near.
+class QORBOARD_API UnknownSignal : public WrongUse {
+ public:
+  using WrongUse::WrongUse;
+};
+
+/// The device, the link or a file that was being written failed.
+class QORBOARD_API Failure : public Error {
+ public:
+  using Error::Error;
+};
+
+/// What was waited for did not come in time; the text says what was seen last.
+class QORBOARD_API Timeout : public Error {
+ public:
+  using Error::Error;
+};
+
+/// The caller's stop function ended a wait.
+class QORBOARD_API Stopped : public Error {
+ public:
+  using Error::Error;
 };
 
 }  // namespace qor

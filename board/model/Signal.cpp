@@ -1,10 +1,15 @@
 #include "board/model/Signal.h"
 
+#include "board/model/Errors.h"
+
 namespace qor {
 namespace {
 
 constexpr const char* portNames[] = {"sync_out", "sync_in", "async_out", "async_in"};
 constexpr const char* wholePortNames[] = {"sync_out_data", "sync_in_data", "async_out_data", "async_in_data"};
+
+constexpr std::pair<const char*, Radix> radixes[] = {
+    {"hex", Radix::hex}, {"bin", Radix::bin}, {"dec", Radix::dec}, {"signed", Radix::signedDec}};
 
 // 1 or -1 when each bit follows the one before at that distance, else 0.
 int direction(const std::vector<unsigned>& bits) {
@@ -25,10 +30,35 @@ const char* wholePortName(Port port) {
   return wholePortNames[static_cast<unsigned>(port)];
 }
 
+unsigned widthOf(const QORVIO_CORE_INFO& info, Port port) {
+  switch (port) {
+    case Port::syncOut:
+      return info.sync_output_count;
+    case Port::syncIn:
+      return info.sync_input_count;
+    case Port::asyncOut:
+      return info.async_output_count;
+    case Port::asyncIn:
+      break;
+  }
+  return info.async_input_count;
+}
+
+const char* radixName(Radix radix) {
+  return radixes[static_cast<unsigned>(radix)].first;
+}
+
+Radix radixNamed(std::string_view text) {
+  for (const auto& [name, radix] : radixes)
+    if (name == text) return radix;
+  throw WrongUse("not a radix (hex, bin, dec, signed): " + std::string(text));
+}
+
 std::string bitsText(const std::vector<unsigned>& bits) {
   if (direction(bits) != 0) return std::to_string(bits.back()) + ":" + std::to_string(bits.front());
   std::string text;
-  for (unsigned bit : bits) text.append(text.empty() ? "" : ",").append(std::to_string(bit));
+  for (auto bit = bits.rbegin(); bit != bits.rend(); ++bit)
+    text.append(text.empty() ? "" : ",").append(std::to_string(*bit));
   return text;
 }
 

@@ -1,10 +1,15 @@
-// A named row of port bits, and how its values are shown and given.
+/// @file
+/// A named row of port bits, and how its values are shown and given.
 #pragma once
 
 #include <cstdint>
 #include <string>
+#include <string_view>
 #include <utility>
 #include <vector>
+
+#include "QorVIO_Records.h"
+#include "board/Export.h"
 
 namespace qor {
 
@@ -19,12 +24,24 @@ constexpr bool isSync(Port port) {
 }
 
 /// "async_in" and so on, as files and tables spell it.
-const char* portName(Port port);
+QORBOARD_API const char* portName(Port port);
 
 /// The library's name for the whole port: "async_in_data" and so on.
-const char* wholePortName(Port port);
+QORBOARD_API const char* wholePortName(Port port);
 
+/// Width of a port in bits.
+QORBOARD_API unsigned widthOf(const QORVIO_CORE_INFO& info, Port port);
+
+/// Of signals of the radix signedDec the top bit is the sign.
 enum class Radix { hex, bin, dec, signedDec };
+
+/// "hex", "bin", "dec" or "signed".
+QORBOARD_API const char* radixName(Radix radix);
+/// Throws WrongUse.
+QORBOARD_API Radix radixNamed(std::string_view text);
+
+/// A synchronous output plays so many steps, one a clock of the design.
+constexpr unsigned stepCount = 16;
 
 struct Signal {
   std::string name;
@@ -35,11 +52,12 @@ struct Signal {
   double scale = 0;                                            ///< what one step is worth; 0 without a scale
   std::string unit{};
   std::string description{};
+  std::size_t core = 0;  ///< which of the cores of its table
 
   unsigned width() const { return static_cast<unsigned>(bits.size()); }
 };
 
-/// The bits as people write them: "5", "7:4", "0:3", or "0,2,5".
-std::string bitsText(const std::vector<unsigned>& bits);
+/// The bits as signals files have them, most significant first: "5", "7:4", "0:3", or "5,2,0".
+QORBOARD_API std::string bitsText(const std::vector<unsigned>& bits);
 
 }  // namespace qor

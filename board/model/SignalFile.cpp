@@ -1,9 +1,12 @@
-// Signals files: what stands in them, and a first one for a core.
+#include "board/model/SignalFile.h"
+
 #include <algorithm>
 #include <charconv>
+#include <cmath>
 
+#include "board/model/CoreAddress.h"
 #include "board/model/Errors.h"
-#include "board/model/SignalTable.h"
+#include "board/model/Letters.h"
 #include "board/model/TomlPlace.h"
 #include "board/model/Value.h"
 
@@ -62,14 +65,24 @@ std::vector<unsigned> bitsOf(const TomlPlace& place) {
   return bits;
 }
 
+bool isTaken(const Signal& signal, std::uint64_t value) {
+  return std::any_of(signal.names.begin(), signal.names.end(),
+                     [&](const auto& each) { return each.second == value; });
+}
+
 void readEnumeration(const TomlPlace& place, Signal& signal) {
-  for (const auto& [name, node] : place.table()) {
+  for (const auto& [key, node] : place.table()) {
+    const TomlPlace entry = place.at(key.str());
+    const std::string name(key.str());
     const auto* number = node.as_integer();
-    if (number == nullptr || number->get() < 0) place.at(name.str()).fail("must be a whole number from 0 on");
+    if (number == nullptr || number->get() < 0) entry.fail("must be a whole number from 0 on");
     const auto value = static_cast<std::uint64_t>(number->get());
     if (signal.width() < 64 && value >> signal.width() != 0)
-      place.at(name.str()).fail("is too wide for " + std::to_string(signal.width()) + " bits");
-    signal.names.emplace_back(std::string(name.str()), value);
+      entry.fail("is too wide for " + std::to_string(signal.width()) + " bits");
+    if (isTaken(signal, value)) entry.fail("has the value of another name: " + std::to_string(value));
+    if (isNumber(name)) entry.fail("can be read as a number");
+    if (name.empty() || hasControls(name)) entry.fail("must be a name without control characters");
+    signal.names.emplace_back(name, value);
   }
 }
 
@@ -81,40 +94,73 @@ Radix radixOf(const TomlPlace& place) {
 }
 
 double scaleOf(const TomlPlace& place) {
-  if (const auto* number = place.node().as_floating_point()) return number->get();
-  if (const auto* number = place.node().as_integer()) return static_cast<double>(number->get());
-  place.fail("must be a number");
+  double scale = 0;
+  if (const auto* number = place.node().as_floating_point())
+    scale = number->get();
+  else if (const auto* whole = place.node().as_integer())
+    scale = static_cast<double>(whole->get());
+  if (!std::isfinite(scale) || scale == 0) place.fail("must be a number other than 0");
+  return scale;
 }
 
-std::string nameOf(const TomlPlace& place, const std::string& text) {
-  const bool forbidden = std::any_of(text.begin(), text.end(), [](char letter) {
-    return static_cast<unsigned char>(letter) <= ' ' ||
-           std::string_view(".=[]").find(letter) != std::string_view::npos;
-  });
-  if (text.empty() || forbidden) place.fail("must be a name without blanks and . = [ ], is \"" + text + "\"");
+std::string nameOf(const TomlPlace& place) {
+  const std::string text = place.text();
+  if (!isSignalName(text)) place.fail("must be letters, digits, _, - and /, is \"" + text + "\"");
   return text;
 }
 
+std::string plainText(const TomlPlace& place) {
+  const std::string text = place.text();
+  if (hasControls(text)) place.fail("must be a text without control characters");
+  return text;
+}
+
+QOR_CORE_REF coreOf(const TomlPlace& place) {
+  try {
+    return parseRef(place.text());
+  } catch (const WrongUse& error) {
+    place.fail(error.what());
+  }
+}
+
+// Which bit would be given two values, if any.
+void requireDistinctBits(const TomlPlace& place, const Signal& signal) {
+  std::vector<unsigned> bits = signal.bits;
+  std::sort(bits.begin(), bits.end());
+  const auto twice = std::adjacent_find(bits.begin(), bits.end());
+  if (!isInput(signal.port) && twice != bits.end())
+    place.fail("names bit " + std::to_string(*twice) + " of an output twice");
+}
+
 Signal readSignal(const TomlPlace& place) {
-  place.requireKeys({"name", "port", "bits", "radix", "enum", "scale", "unit", "description"});
+  place.requireKeys({"name", "port", "bits", "core", "radix", "enum", "scale", "unit", "description"});
   Signal signal;
-  signal.name = nameOf(place.at("name"), place.at("name").text());
+  signal.name = nameOf(place.at("name"));
   signal.port = portNamed(place.at("port"));
   signal.bits = bitsOf(place.at("bits"));
+  requireDistinctBits(place.at("bits"), signal);
   if (place.has("radix")) signal.radix = radixOf(place.at("radix"));
   if (place.has("enum")) readEnumeration(place.at("enum"), signal);
   if (place.has("scale")) signal.scale = scaleOf(place.at("scale"));
-  if (place.has("unit")) signal.unit = place.at("unit").text();
-  if (place.has("description")) signal.description = place.at("description").text();
+  if (place.has("unit")) signal.unit = plainText(place.at("unit"));
+  if (place.has("description")) signal.description = plainText(place.at("description"));
   return signal;
 }
 
-void readSignals(const std::string& path, const toml::node& list, SignalTable& table) {
+void readSignals(const std::string& path, const toml::node& list, bool hasCore, SignalTable& table) {
   if (!list.is_array_of_tables())
     TomlPlace(path, list, "signal").fail("must be tables, each headed [[signal]]");
   for (const toml::node& each : *list.as_array()) {
     const TomlPlace place(path, each, "signal[" + std::to_string(table.signals().size()) + "]");
-    if (!table.add(readSignal(place))) place.at("name").fail("is there already: " + place.at("name").text());
+    Signal signal = readSignal(place);
+    if (place.has("core")) {
+      if (!hasCore && table.cores().empty() && !table.signals().empty())
+        place.at("core").fail("is given, but the signals above have none, nor has the file");
+      signal.core = table.addCore(coreOf(place.at("core")));
+    } else if (!hasCore && !table.cores().empty()) {
+      place.fail("has no core, nor has the file, but the signals above have one");
+    }
+    if (!table.add(std::move(signal))) place.at("name").fail("is there already: " + place.at("name").text());
   }
 }
 
@@ -124,15 +170,9 @@ SignalTable readSignalFile(const std::string& path) {
   const toml::table parsed = readToml(path);
   const TomlPlace root(path, parsed, "");
   root.requireKeys({"core", "signal"});
-  SignalTable table;
-  if (root.has("core")) {
-    try {
-      table.core = parseRef(root.at("core").text());
-    } catch (const WrongUse& error) {
-      root.at("core").fail(error.what());
-    }
-  }
-  if (root.has("signal")) readSignals(path, root.at("signal").node(), table);
+  SignalTable table(path);
+  if (root.has("core")) table.setFirstCore(coreOf(root.at("core")));
+  if (root.has("signal")) readSignals(path, root.at("signal").node(), root.has("core"), table);
   return table;
 }
 
@@ -140,7 +180,7 @@ std::string firstSignalFile(QOR_CORE_REF ref, const QORVIO_CORE_INFO& info) {
   std::string text =
       "# Names for port bits. bits: one bit, a range such as \"7:4\", or a list, most significant first.\n"
       "# Also: radix = \"hex\" (bin, dec, signed), enum = { off = 0 }, scale = 0.5, unit = \"V\",\n"
-      "# description = \"...\".\n"
+      "# core = \"...\" (another one than the file's), description = \"...\".\n"
       "core = \"" +
       refText(ref) + "\"\n";
   for (Port port : ports) {

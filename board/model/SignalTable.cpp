@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <charconv>
 
+#include "board/model/CoreAddress.h"
 #include "board/model/Errors.h"
 
 namespace qor {
@@ -64,7 +65,7 @@ bool parseNumber(std::string_view text, unsigned& number) {
   return error == std::errc() && rest == text.data() + text.size();
 }
 
-// The bits that stand in brackets behind the name.
+// The bits in the brackets after the name. They are no number of their own: a sign would be of the whole only.
 Signal slice(const Signal& whole, std::string_view name, std::string_view inside) {
   const std::size_t colon = inside.find(':');
   unsigned high = 0, low = 0;
@@ -76,6 +77,8 @@ Signal slice(const Signal& whole, std::string_view name, std::string_view inside
     throw WrongUse(whole.name + " has " + std::to_string(whole.width()) +
                    (whole.width() == 1 ? " bit" : " bits") + ": " + std::string(name));
   Signal part{whole.name + "[" + std::string(inside) + "]", whole.port, {}, whole.radix};
+  if (part.radix == Radix::signedDec) part.radix = Radix::dec;
+  part.core = whole.core;
   for (unsigned bit = low;; bit = bit < high ? bit + 1 : bit - 1) {
     part.bits.push_back(whole.bits[bit]);
     if (bit == high) return part;
@@ -83,6 +86,19 @@ Signal slice(const Signal& whole, std::string_view name, std::string_view inside
 }
 
 }  // namespace
+
+std::size_t SignalTable::addCore(QOR_CORE_REF ref) {
+  const auto place =
+      std::find_if(cores_.begin(), cores_.end(), [&](QOR_CORE_REF each) { return isSame(each, ref); });
+  const auto index = static_cast<std::size_t>(place - cores_.begin());
+  if (place == cores_.end()) cores_.push_back(ref);
+  return index;
+}
+
+void SignalTable::setFirstCore(QOR_CORE_REF ref) {
+  if (cores_.empty()) cores_.push_back(ref);
+  cores_.front() = ref;
+}
 
 bool SignalTable::add(Signal signal) {
   auto& places = places_[static_cast<unsigned>(directionOf(signal))];
@@ -92,10 +108,12 @@ bool SignalTable::add(Signal signal) {
   return true;
 }
 
-void SignalTable::addWholePorts(const QORVIO_CORE_INFO& info) {
+void SignalTable::addWholePorts(const QORVIO_CORE_INFO& info, std::size_t core) {
   const std::size_t before = fileSignals_;
+  const std::string prefix = core == 0 ? "" : refText(cores_.at(core)) + "/";
   for (Port port : {Port::asyncOut, Port::syncOut, Port::asyncIn, Port::syncIn}) {
-    Signal whole{wholePortName(port), port};
+    Signal whole{prefix + wholePortName(port), port};
+    whole.core = core;
     for (unsigned bit = 0; bit < widthOf(info, port); ++bit) whole.bits.push_back(bit);
     if (!whole.bits.empty()) add(std::move(whole));
   }
@@ -116,7 +134,8 @@ void SignalTable::failUnknown(std::string_view name, Direction direction) const 
   } else if (const Signal* near = nearest(signals_, name, direction)) {
     hint = " (did you mean " + near->name + "?)";
   }
-  throw WrongUse(std::string("no ") + wordFor(direction) + " of that name" + hint + ": " + std::string(name));
+  throw UnknownSignal(std::string("no ") + wordFor(direction) + " of that name" + hint + ": " +
+                      std::string(name));
 }
 
 Signal SignalTable::find(std::string_view name, Direction direction) const {
@@ -142,31 +161,18 @@ std::vector<Signal> SignalTable::select(const std::vector<std::string>& names, D
   return chosen;
 }
 
-std::vector<std::string> misfits(const SignalTable& table, const QORVIO_CORE_INFO& info) {
+std::vector<std::string> signalsOutsideCore(const SignalTable& table,
+                                            const std::vector<QORVIO_CORE_INFO>& infos) {
   std::vector<std::string> lines;
   for (std::size_t i = 0; i < table.fileSignals(); ++i) {
     const Signal& signal = table.signals()[i];
-    const unsigned width = widthOf(info, signal.port);
+    const unsigned width = widthOf(infos.at(signal.core), signal.port);
     const unsigned highest = *std::max_element(signal.bits.begin(), signal.bits.end());
     if (highest < width) continue;
     lines.push_back(signal.name + ": bit " + std::to_string(highest) + " is beyond " + portName(signal.port) +
                     ", which has " + std::to_string(width) + (width == 1 ? " bit" : " bits"));
   }
   return lines;
-}
-
-unsigned widthOf(const QORVIO_CORE_INFO& info, Port port) {
-  switch (port) {
-    case Port::syncOut:
-      return info.sync_output_count;
-    case Port::syncIn:
-      return info.sync_input_count;
-    case Port::asyncOut:
-      return info.async_output_count;
-    case Port::asyncIn:
-      break;
-  }
-  return info.async_input_count;
 }
 
 }  // namespace qor

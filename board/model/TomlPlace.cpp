@@ -1,24 +1,21 @@
 #include "board/model/TomlPlace.h"
 
 #include <algorithm>
-#include <cerrno>
-#include <filesystem>
-#include <fstream>
-#include <iterator>
 #include <system_error>
 
 #include "board/model/Errors.h"
+#include "os/Files.h"
 
 namespace qor {
 
 toml::table readToml(const std::string& path) {
-  std::error_code none;
-  const int directory = std::filesystem::is_directory(path, none) ? EISDIR : 0;
-  std::ifstream file(path, std::ios::binary);
-  const int error = directory != 0 ? directory : errno;
-  if (directory != 0 || !file)
-    throw WrongUse("cannot read the file " + path + ": " + std::generic_category().message(error));
-  const std::string text{std::istreambuf_iterator<char>(file), {}};
+  constexpr std::size_t largest = std::size_t{16} << 20;
+  std::string text;
+  try {
+    text = os::readFile(path, largest);
+  } catch (const std::system_error& error) {
+    throw WrongUse(error.what());
+  }
   try {
     return toml::parse(text);
   } catch (const toml::parse_error& wrong) {

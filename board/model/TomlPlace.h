@@ -6,12 +6,14 @@
 #include <string_view>
 #include <vector>
 
+#include "board/Export.h"
+
 namespace qor {
 
 /// Reads a file. Throws WrongUse, "FILE:LINE: what is wrong", when it cannot be read or is no TOML.
-toml::table readToml(const std::string& path);
+QORBOARD_API toml::table readToml(const std::string& path);
 
-class TomlPlace {
+class QORBOARD_API TomlPlace {
  public:
   TomlPlace(const std::string& file, const toml::node& node, std::string key)
       : file_(&file), node_(&node), key_(std::move(key)) {}

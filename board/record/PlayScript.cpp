@@ -3,9 +3,11 @@
 #include <algorithm>
 #include <charconv>
 #include <cmath>
-#include <fstream>
+#include <system_error>
 
 #include "board/model/Errors.h"
+#include "board/model/Value.h"
+#include "os/Files.h"
 
 namespace qor {
 namespace {
@@ -13,8 +15,15 @@ namespace {
 using std::chrono::nanoseconds;
 using Fields = std::vector<std::string>;
 
+constexpr std::size_t largestFile = std::size_t{256} << 20;
+
+std::string trimmed(const std::string& text) {
+  const std::size_t first = text.find_first_not_of(" \t"), last = text.find_last_not_of(" \t");
+  return first == text.npos ? "" : text.substr(first, last - first + 1);
+}
+
 // Fields of a line; one may stand in double quotes, with two of them for one.
-Fields fieldsOf(const std::string& line) {
+Fields fieldsOf(std::string_view line) {
   Fields fields(1);
   bool quoted = false;
   for (std::size_t i = 0; i < line.size(); ++i) {
@@ -29,6 +38,7 @@ Fields fieldsOf(const std::string& line) {
       fields.back() += line[i];
     }
   }
+  for (std::string& each : fields) each = trimmed(each);
   return fields;
 }
 
@@ -53,6 +63,7 @@ class Reader {
     // None at all would select every output.
     if (fields.size() == firstValue_) throw WrongUse("names no output");
     script_.signals = signals.select(valuesOf(fields), Direction::output);
+    requireDistinct(script_.signals);
   }
 
   void readRow(const Fields& fields) {
@@ -75,6 +86,14 @@ class Reader {
                        [](const std::string& field) { return field.empty(); });
   }
 
+  static void requireDistinct(const std::vector<Signal>& signals) {
+    std::vector<std::string> names;
+    for (const Signal& each : signals) names.push_back(each.name);
+    std::sort(names.begin(), names.end());
+    const auto twice = std::adjacent_find(names.begin(), names.end());
+    if (twice != names.end()) throw WrongUse("names an output twice: " + *twice);
+  }
+
   Fields valuesOf(const Fields& fields) const {
     return {fields.begin() + static_cast<std::ptrdiff_t>(firstValue_), fields.end()};
   }
@@ -93,25 +112,37 @@ class Reader {
 
 }  // namespace
 
-PlayScript readPlayScript(const std::string& path, const SignalTable& signals) {
-  std::ifstream file(path);
-  if (!file) throw WrongUse("cannot read the file: " + path);
+PlayScript parsePlayScript(std::string_view text, const std::string& path, const SignalTable& signals) {
+  constexpr std::string_view byteOrderMark = "\xEF\xBB\xBF";
+  if (text.substr(0, byteOrderMark.size()) == byteOrderMark) text.remove_prefix(byteOrderMark.size());
   PlayScript script;
   Reader reader(script);
-  std::size_t number = 0;
+  std::size_t number = 0, namesAt = 0;
   const auto failAt = [&](std::size_t line, const char* problem) {
     throw WrongUse(path + ":" + std::to_string(line) + ": " + problem);
   };
-  for (std::string line; std::getline(file, line);) {
+  while (!text.empty()) {
+    const std::string_view line = text.substr(0, text.find('\n'));
+    text.remove_prefix(std::min(line.size() + 1, text.size()));
     ++number;
+    if (line.find_first_not_of(" \t\r") == line.npos) continue;
     try {
-      number == 1 ? reader.readNames(fieldsOf(line), signals) : reader.readRow(fieldsOf(line));
+      namesAt == 0 ? reader.readNames(fieldsOf(line), signals) : reader.readRow(fieldsOf(line));
     } catch (const WrongUse& error) {
       failAt(number, error.what());
     }
+    if (namesAt == 0) namesAt = number;
   }
-  if (script.rows.empty()) failAt(1, "has no row of values below its names");
+  if (script.rows.empty()) failAt(std::max<std::size_t>(namesAt, 1), "has no row of values below its names");
   return script;
+}
+
+PlayScript readPlayScript(const std::string& path, const SignalTable& signals) {
+  try {
+    return parsePlayScript(os::readFile(path, largestFile), path, signals);
+  } catch (const std::system_error& error) {
+    throw WrongUse(error.what());
+  }
 }
 
 }  // namespace qor

@@ -1,12 +1,14 @@
-// A CSV table of output values, as play drives it: names, and below them rows of values.
+/// @file
+/// A CSV table of output values, as play drives it: names, and below them rows of values.
 #pragma once
 
 #include <chrono>
 #include <string>
 #include <vector>
 
+#include "board/Export.h"
+#include "board/model/Bits.h"
 #include "board/model/SignalTable.h"
-#include "board/model/Value.h"
 
 namespace qor {
 
@@ -19,8 +21,13 @@ struct PlayScript {
   bool hasTimes() const { return !times.empty(); }
 };
 
-/// Its first column may be time_s, in seconds, and the one behind that missed, which is passed over: so record writes
-/// them. Throws WrongUse, "FILE:LINE: what is wrong".
-PlayScript readPlayScript(const std::string& path, const SignalTable& signals);
+/// Reads a script from its text; `path` is for messages. Its first column may be time_s, in seconds, and the one after it
+/// missed, which is skipped: so record writes them. A byte order mark, blanks around fields and empty lines are skipped.
+/// Throws WrongUse, "FILE:LINE: what is wrong".
+QORBOARD_API PlayScript parsePlayScript(std::string_view text, const std::string& path,
+                                        const SignalTable& signals);
+
+/// The same of a file, which must be a regular one of 256 MiB at most.
+QORBOARD_API PlayScript readPlayScript(const std::string& path, const SignalTable& signals);
 
 }  // namespace qor

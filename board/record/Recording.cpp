@@ -4,7 +4,6 @@
 
 #include "board/model/Errors.h"
 #include "board/record/Recorder.h"
-#include "os/Stop.h"
 
 namespace qor {
 namespace {
@@ -23,13 +22,14 @@ class Schedule {
     bool isEnd;            ///< nothing is to be polled any more
   };
 
-  Turn await(const os::Stop& stop) {
+  Turn await(const StopFunction& stop) {
     const bool isPeriodic = limits_.period.count() != 0;
-    if (isPeriodic) stop.sleepUntil(begin_ + std::min(slotBegin(next_), timeLimit()));
+    const Clock::time_point due = isPeriodic ? begin_ + std::min(slotBegin(next_), timeLimit()) : begin_;
+    const bool goesOn = sleepUntil(due, stop);
     const nanoseconds woken = std::min<nanoseconds>(Clock::now() - begin_, timeLimit());
     const std::uint64_t missed = isPeriodic ? missedBy(woken) : 0;
     next_ += missed + 1;
-    return {woken, missed, stop.asked() || woken == timeLimit()};
+    return {woken, missed, !goesOn || woken == timeLimit()};
   }
 
  private:
@@ -48,9 +48,8 @@ class Schedule {
   std::uint64_t next_ = 0;
 };
 
-void runPolls(Recorder& recorder, SampleWriter& writer, const Limits& limits, const OnSample& onSample,
-              Recorded& recorded) {
-  const os::Stop stop;
+void runPolls(Poller& poller, Recorder& recorder, SampleWriter& writer, const Limits& limits,
+              const StopFunction& stop, const OnSample& onSample, Recorded& recorded) {
   Schedule schedule(limits);
   while (limits.samples == 0 || recorded.samples < limits.samples) {
     const auto [now, missed, isEnd] = schedule.await(stop);
@@ -60,13 +59,54 @@ void runPolls(Recorder& recorder, SampleWriter& writer, const Limits& limits, co
       recorded.missed += missed;
       return;
     }
-    recorder.read();
+    poller.poll();
     recorder.write(nanosecond, missed);
     ++recorded.samples;
     recorded.missed += missed;
     if (onSample) onSample(recorded, now);
   }
 }
+
+// Keeps the samples in arrays.
+class ArrayWriter : public SampleWriter {
+ public:
+  ArrayWriter(Samples& samples, std::size_t expected) : samples_(samples), expected_(expected) {}
+
+  void begin(const std::vector<Signal>& inputs, const std::vector<QOR_CORE_REF>&) override {
+    inputs_ = inputs;
+    samples_.nanoseconds.reserve(expected_);
+    samples_.missed.reserve(expected_);
+    for (const Signal& each : inputs) {
+      SampledInput& input = samples_.inputs.emplace_back(SampledInput{byteCount(each.width()), {}, {}});
+      input.values.reserve(expected_ * input.bytesEach);
+      input.moves.reserve(expected_);
+    }
+  }
+
+  void add(const Poll& poll) override {
+    samples_.nanoseconds.push_back(static_cast<std::int64_t>(poll.nanoseconds));
+    samples_.missed.push_back(poll.missed);
+    for (std::size_t i = 0; i < inputs_.size(); ++i) {
+      SampledInput& input = samples_.inputs[i];
+      input.values.insert(input.values.end(), poll.values[i].begin(), poll.values[i].end());
+      input.moves.push_back(
+          poll.moved[i] != 0 ? movesOf(activityOf(inputs_[i], poll.samples[inputs_[i].core])) : 0);
+    }
+  }
+
+  void addMissed(std::uint64_t, std::uint64_t) override {}
+  void end() override {}
+
+ private:
+  static unsigned char movesOf(const Activity& activity) {
+    return static_cast<unsigned char>((activity.up ? 1 : 0) + (activity.down ? 2 : 0) +
+                                      (activity.syncUp ? 4 : 0) + (activity.syncDown ? 8 : 0));
+  }
+
+  Samples& samples_;
+  std::size_t expected_;
+  std::vector<Signal> inputs_;
+};
 
 }  // namespace
 
@@ -78,19 +118,37 @@ std::string summary(const Recorded& recorded, const std::string& path) {
   return text;
 }
 
-Recorded recordTo(const std::string& path, CoreSession& core, const std::vector<Signal>& signals,
-                  const Limits& limits, const OnSample& onSample) {
+void record(SampleWriter& writer, Poller& poller, const std::vector<Signal>& inputs, const Limits& limits,
+            Recorded& recorded, const StopFunction& stop, const OnSample& onSample) {
+  Recorder recorder(poller, inputs, writer);
+  try {
+    runPolls(poller, recorder, writer, limits, stop, onSample, recorded);
+  } catch (const Failure&) {  // what was recorded until then is worth keeping
+    writer.end();
+    throw;
+  }
+  writer.end();
+}
+
+Recorded recordTo(const std::string& path, Poller& poller, const std::vector<Signal>& inputs,
+                  const Limits& limits, const StopFunction& stop, const OnSample& onSample) {
   const std::unique_ptr<SampleWriter> writer = sampleWriter(path);
-  Recorder recorder(core, signals, *writer);
   Recorded recorded;
   try {
-    runPolls(recorder, *writer, limits, onSample, recorded);
-  } catch (const Failure& failure) {  // what was recorded until then is worth keeping
-    writer->end();
+    record(*writer, poller, inputs, limits, recorded, stop, onSample);
+  } catch (const Failure& failure) {
     throw Failure(std::string(failure.what()) + "; kept " + summary(recorded, path));
   }
-  writer->end();
   return recorded;
+}
+
+Samples recordToArrays(Poller& poller, const std::vector<Signal>& inputs, const Limits& limits,
+                       const StopFunction& stop) {
+  Samples samples;
+  ArrayWriter writer(samples, limits.samples);
+  Recorded recorded;
+  record(writer, poller, inputs, limits, recorded, stop);
+  return samples;
 }
 
 }  // namespace qor

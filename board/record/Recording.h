@@ -1,4 +1,5 @@
-// One recording: its polls in step with a period, and its file, whole whatever ends it.
+/// @file
+/// One recording: its polls in step with a period, and what it writes, whole whatever ends it.
 #pragma once
 
 #include <chrono>
@@ -7,7 +8,10 @@
 #include <string>
 #include <vector>
 
-#include "board/session/CoreSession.h"
+#include "board/Export.h"
+#include "board/record/Poller.h"
+#include "board/record/SampleWriter.h"
+#include "board/session/Stop.h"
 
 namespace qor {
 
@@ -23,14 +27,38 @@ struct Recorded {
 };
 
 /// "N samples in PATH", and how many polls were missed if any were.
-std::string summary(const Recorded& recorded, const std::string& path);
+QORBOARD_API std::string summary(const Recorded& recorded, const std::string& path);
 
-/// Told of every sample, with the time since the recording began.
+/// Called after every sample, with the time since the recording began.
 using OnSample = std::function<void(const Recorded& recorded, std::chrono::nanoseconds now)>;
 
-/// Samples the signals to a file, by the ending of its path, until a limit is reached or Ctrl-C comes. When the link
-/// fails, closes what was recorded until then and throws Failure, "why; kept" and the summary.
-Recorded recordTo(const std::string& path, CoreSession& core, const std::vector<Signal>& signals,
-                  const Limits& limits, const OnSample& onSample = {});
+/// Samples the inputs until a limit is reached or `stop` says so. When the link fails, ends the writer with what was
+/// recorded until then, adds to `recorded`, and throws Failure.
+QORBOARD_API void record(SampleWriter& writer, Poller& poller, const std::vector<Signal>& inputs,
+                         const Limits& limits, Recorded& recorded, const StopFunction& stop = {},
+                         const OnSample& onSample = {});
+
+/// The same to a file, by the ending of its path; a Failure then says "why; kept" and the summary.
+QORBOARD_API Recorded recordTo(const std::string& path, Poller& poller, const std::vector<Signal>& inputs,
+                               const Limits& limits, const StopFunction& stop = {},
+                               const OnSample& onSample = {});
+
+/// The samples of one input, one after another.
+struct SampledInput {
+  std::size_t bytesEach;             ///< of a value
+  Bytes values;                      ///< as many values as there are samples
+  std::vector<unsigned char> moves;  ///< one a sample: 1 rose, 2 fell, 4 sync rose, 8 sync fell, added
+};
+
+struct Samples {
+  std::vector<std::int64_t> nanoseconds;  ///< since the recording began, one a sample
+  std::vector<std::uint64_t> missed;      ///< polls that were missed before the sample
+  std::vector<SampledInput> inputs;
+};
+
+/// The same to arrays, which are allocated at once where `limits` says how many samples there will be. Throws Failure,
+/// and then nothing is kept.
+QORBOARD_API Samples recordToArrays(Poller& poller, const std::vector<Signal>& inputs, const Limits& limits,
+                                    const StopFunction& stop = {});
 
 }  // namespace qor

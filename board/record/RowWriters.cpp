@@ -3,7 +3,9 @@
 
 #include <nlohmann/json.hpp>
 
-#include "board/record/SampleWriter.h"
+#include "board/model/Value.h"
+#include "board/record/OutputFile.h"
+#include "board/record/Writers.h"
 
 namespace qor {
 namespace {
@@ -75,7 +77,7 @@ class CsvWriter : public SampleWriter {
  public:
   explicit CsvWriter(const std::string& path) : file_(path) {}
 
-  void begin(const std::vector<Signal>& signals, const std::string&) override {
+  void begin(const std::vector<Signal>& signals, const std::vector<QOR_CORE_REF>&) override {
     signals_ = signals;
     file_.text() += "time_s,missed";
     for (const Signal& each : signals) {
@@ -90,7 +92,7 @@ class CsvWriter : public SampleWriter {
     appendPlace(poll.nanoseconds, poll.missed);
     file_.text() += row_.line();
     file_.text() += '\n';
-    file_.spill();
+    file_.spill(poll.nanoseconds);
   }
 
   // A line whose cells are empty.
@@ -124,7 +126,7 @@ class JsonLinesWriter : public SampleWriter {
  public:
   explicit JsonLinesWriter(const std::string& path) : file_(path) {}
 
-  void begin(const std::vector<Signal>& signals, const std::string&) override {
+  void begin(const std::vector<Signal>& signals, const std::vector<QOR_CORE_REF>&) override {
     signals_ = signals;
     for (const Signal& each : signals) row_.add(',' + jsonText(each.name) + ':');
   }
@@ -134,7 +136,7 @@ class JsonLinesWriter : public SampleWriter {
     appendPlace(poll.nanoseconds, poll.missed);
     file_.text() += row_.line();
     file_.text() += "}\n";
-    file_.spill();
+    file_.spill(poll.nanoseconds);
   }
 
   void addMissed(std::uint64_t nanoseconds, std::uint64_t missed) override {

@@ -1,6 +1,11 @@
 // Value change dumps: one variable a signal; one "moved" bit a signal, for activity between polls; a count of missed
 // polls, unknown (x) from the poll before them to the poll after.
-#include "board/record/SampleWriter.h"
+#include <algorithm>
+
+#include "board/model/CoreAddress.h"
+#include "board/model/Value.h"
+#include "board/record/OutputFile.h"
+#include "board/record/Writers.h"
 
 namespace qor {
 namespace {
@@ -8,7 +13,7 @@ namespace {
 // Viewers take brackets for bits of a vector, and dots for scopes.
 std::string vcdName(std::string name) {
   for (char& letter : name)
-    if (letter == '.' || letter == '[' || letter == ']' || letter == ':') letter = '_';
+    if (letter == '.' || letter == '[' || letter == ']' || letter == ':' || letter == '/') letter = '_';
   return name;
 }
 
@@ -16,15 +21,13 @@ class VcdWriter : public SampleWriter {
  public:
   explicit VcdWriter(const std::string& path) : file_(path) {}
 
-  void begin(const std::vector<Signal>& signals, const std::string& core) override {
+  // A scope for each core with signals; what is of the recording is in the last one.
+  void begin(const std::vector<Signal>& signals, const std::vector<QOR_CORE_REF>& cores) override {
     signals_ = signals;
     for (std::size_t i = 0; i <= 2 * signals.size(); ++i) ids_.push_back(idOf(i));
-    std::string& text = file_.text();
-    text += "$version qorvio $end\n$timescale 1 ns $end\n$scope module core_" + vcdName(core) + " $end\n";
-    for (std::size_t i = 0; i < signals.size(); ++i) variable(signals[i].width(), 2 * i, signals[i].name);
-    for (std::size_t i = 0; i < signals.size(); ++i) variable(1, 2 * i + 1, signals[i].name + "_moved");
-    variable(32, 2 * signals.size(), "missed_polls");
-    text += "$upscope $end\n$enddefinitions $end\n";
+    file_.text() += "$version qorvio $end\n$timescale 1 ns $end\n";
+    for (std::size_t core = 0; core < cores.size(); ++core) scope(core, cores[core]);
+    file_.text() += "$enddefinitions $end\n";
   }
 
   void add(const Poll& poll) override {
@@ -41,7 +44,7 @@ class VcdWriter : public SampleWriter {
     last_ = poll.nanoseconds;
     // A poll that shows nothing new needs no time stamp; the last one gets its own at the end.
     if (file_.text().size() == stamped) file_.text().resize(before);
-    file_.spill();
+    file_.spill(poll.nanoseconds);
   }
 
   void addMissed(std::uint64_t nanoseconds, std::uint64_t count) override {
@@ -64,6 +67,26 @@ class VcdWriter : public SampleWriter {
       number /= 94;
     } while (number-- != 0);
     return id;
+  }
+
+  void scope(std::size_t core, QOR_CORE_REF ref) {
+    const bool isLast = core == lastCore();
+    const bool isUsed =
+        std::any_of(signals_.begin(), signals_.end(), [&](const Signal& each) { return each.core == core; });
+    if (!isUsed && !isLast) return;
+    file_.text() += "$scope module core_" + vcdName(refText(ref)) + " $end\n";
+    for (std::size_t i = 0; i < signals_.size(); ++i)
+      if (signals_[i].core == core) variable(signals_[i].width(), 2 * i, signals_[i].name);
+    for (std::size_t i = 0; i < signals_.size(); ++i)
+      if (signals_[i].core == core) variable(1, 2 * i + 1, signals_[i].name + "_moved");
+    if (isLast) variable(32, 2 * signals_.size(), "missed_polls");
+    file_.text() += "$upscope $end\n";
+  }
+
+  std::size_t lastCore() const {
+    std::size_t last = 0;
+    for (const Signal& each : signals_) last = std::max(last, each.core);
+    return last;
   }
 
   void variable(unsigned width, std::size_t number, const std::string& name) {

@@ -1,10 +1,12 @@
-// A cable that counts what goes through another one.
+/// @file
+/// A cable that counts what goes through another one.
 #pragma once
 
 #include <cstdint>
 #include <memory>
 
 #include "QorJtag_Host.h"
+#include "board/Export.h"
 
 namespace qor {
 
@@ -15,7 +17,7 @@ struct Traffic {
   std::uint64_t idle = 0;   ///< TCKs in Run-Test/Idle
 };
 
-class CountingCable : public QorRT::Qor_Cable {
+class QORBOARD_API CountingCable : public QorRT::Qor_Cable {
  public:
   /// Counts into `traffic`, which must outlive the cable.
   CountingCable(std::unique_ptr<QorRT::Qor_Cable> cable, Traffic& traffic)

@@ -1,10 +1,9 @@
 #include "board/session/Link.h"
 
-#include <array>
-#include <charconv>
 #include <utility>
 
 #include "QorVIO_Core.h"
+#include "board/model/CoreAddress.h"
 #include "board/model/Errors.h"
 
 namespace qor {
@@ -59,7 +58,8 @@ std::unique_ptr<QorRT::Qor_Cable> openCable(const std::string& url) {
   }
 }
 
-Link::Link(std::unique_ptr<QorRT::Qor_Cable> cable) : session_(QorJtag_session_openCable(std::move(cable))) {
+Link::Link(std::unique_ptr<QorRT::Qor_Cable> cable, std::string url)
+    : session_(QorJtag_session_openCable(std::move(cable))), url_(std::move(url)) {
   listen();
 }
 
@@ -97,24 +97,18 @@ std::vector<FoundCore> findCores(Link& link) {
   return cores;
 }
 
-std::string refText(QOR_CORE_REF ref) {
-  return std::to_string(ref.device_index) + "." + std::to_string(ref.user_chain_number) + "." +
-         std::to_string(ref.core_index);
+QOR_CORE_REF firstVioCore(Link& link) {
+  const std::vector<FoundCore> cores = findCores(link);
+  for (const FoundCore& core : cores)
+    if (core.isVio()) return core.ref;
+  throw Failure("no VIO core on this board: " + std::to_string(cores.size()) + " cores of other types, " +
+                std::to_string(link.devices().size()) + " devices");
 }
 
-QOR_CORE_REF parseRef(const std::string& text) {
-  std::array<unsigned, 3> parts{};
-  const char* next = text.data();
-  const char* const end = next + text.size();
-  bool good = true;
-  for (std::size_t i = 0; i < parts.size(); ++i) {
-    if (i != 0) good = good && next != end && *next++ == '.';
-    const auto [rest, error] = std::from_chars(next, end, parts[i]);
-    good = good && error == std::errc();
-    next = rest;
-  }
-  if (!good || next != end) throw WrongUse("not a core address DEVICE.CHAIN.INDEX: " + text);
-  return {parts[0], parts[1], parts[2]};
+QORVIO_CORE_INFO readInfo(Link& link, QOR_CORE_REF ref) {
+  QORVIO_CORE_INFO info{};
+  link.check(QorVIO_getInfo(link.session(), ref, &info));
+  return info;
 }
 
 }  // namespace qor

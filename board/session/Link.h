@@ -1,4 +1,5 @@
-// The session with a board, as RAII, and its failures as exceptions.
+/// @file
+/// The session with a board, as RAII, and its failures as exceptions.
 #pragma once
 
 #include <memory>
@@ -7,22 +8,24 @@
 
 #include "QorJtag_Host.h"
 #include "QorVIO.h"
+#include "board/Export.h"
 
 namespace qor {
 
 /// Throws Failure, "cannot open the cable URL: why".
-std::unique_ptr<QorRT::Qor_Cable> openCable(const std::string& url);
+QORBOARD_API std::unique_ptr<QorRT::Qor_Cable> openCable(const std::string& url);
 
 /// Keeps the session's messages, and throws them as Failure.
-class Link {
+class QORBOARD_API Link {
  public:
-  /// Opens a session on the cable.
-  explicit Link(std::unique_ptr<QorRT::Qor_Cable> cable);
+  /// Opens a session on the cable. `url` is only kept: what is remembered of the board is kept under it.
+  explicit Link(std::unique_ptr<QorRT::Qor_Cable> cable, std::string url = {});
   Link(const Link&) = delete;
   Link& operator=(const Link&) = delete;
   ~Link();
 
   unsigned session() const { return session_; }
+  const std::string& url() const { return url_; }
   std::vector<QorRT::Qor_Device> devices() const;
 
   /// Throws Failure with the session's message, for a return code that is not 0.
@@ -35,22 +38,24 @@ class Link {
   void listen();
 
   unsigned session_;
+  std::string url_;
   std::string message_;
 };
 
-/// One core that answers behind a user chain.
+/// One core of a hub.
 struct FoundCore {
   QOR_CORE_REF ref;
   QORVIO_CORE_INFO info;  ///< of a core of another type, the first five fields
   bool isVio() const { return info.core_type == 9; }
 };
 
-/// Every core behind every hub of the chain, in address order. Hubs that are not there are no failure.
-std::vector<FoundCore> findCores(Link& link);
+/// Every core of every hub on the chain, in address order. User registers without a hub are no failure; any other one is.
+QORBOARD_API std::vector<FoundCore> findCores(Link& link);
 
-/// "device.chain.index".
-std::string refText(QOR_CORE_REF ref);
-/// Throws WrongUse.
-QOR_CORE_REF parseRef(const std::string& text);
+/// The first VIO core. Throws Failure when there is none.
+QORBOARD_API QOR_CORE_REF firstVioCore(Link& link);
+
+/// Reads the core's status word afresh; the core need not be set up. Throws Failure.
+QORBOARD_API QORVIO_CORE_INFO readInfo(Link& link, QOR_CORE_REF ref);
 
 }  // namespace qor

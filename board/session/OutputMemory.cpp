@@ -1,66 +1,56 @@
 #include "board/session/OutputMemory.h"
 
-#include <fcntl.h>
-#include <sys/file.h>
-#include <unistd.h>
-#include <cctype>
-#include <cerrno>
-#include <cstdint>
-#include <cstdio>
+#include <algorithm>
+#include <chrono>
 #include <cstdlib>
 #include <filesystem>
-#include <fstream>
+#include <system_error>
 
 #include <nlohmann/json.hpp>
 
 #include "board/model/Digits.h"
+#include "board/model/Errors.h"
+#include "board/model/Value.h"
+#include "os/FileLock.h"
+#include "os/Files.h"
+#include "os/Folder.h"
 
 namespace qor {
 namespace {
 
 namespace fs = std::filesystem;
 
-// As much of the key as can be read in a file name, and a hash (FNV-1a) of all of it.
+constexpr std::chrono::seconds lockTimeout(2);
+constexpr std::size_t largestFile = 1 << 20;
+
+// The key in characters that every file system takes; a long one in several folders, since a name has 255 at most.
 std::string fileName(const std::string& key) {
-  constexpr std::size_t longest = 80;
-  std::uint64_t hash = 0xCBF29CE484222325;
+  constexpr std::size_t longest = 200;
   std::string name;
+  std::size_t begin = 0;
   for (const char letter : key) {
-    hash = (hash ^ static_cast<unsigned char>(letter)) * 0x100000001B3;
-    const bool isPlain =
-        std::isalnum(static_cast<unsigned char>(letter)) != 0 || letter == '.' || letter == '-';
-    if (name.size() < longest) name += isPlain ? letter : '_';
+    const bool isPlain = (letter >= 'a' && letter <= 'z') || (letter >= 'A' && letter <= 'Z') ||
+                         (letter >= '0' && letter <= '9') || letter == '.' || letter == '-';
+    const auto byte = static_cast<unsigned char>(letter);
+    if (name.size() - begin > longest) begin = (name += "_/").size();
+    name += isPlain ? std::string(1, letter) : "%" + hexText({byte}, 8);
   }
-  char digits[20];
-  std::snprintf(digits, sizeof digits, "-%016llx", static_cast<unsigned long long>(hash));
-  return name + digits + ".json";
+  return name + ".json";
 }
 
-// One file a core, named after where it is.
-std::string pathFor(const std::string& key) {
-  if (key.empty()) return {};
-  const char* const state = std::getenv("XDG_STATE_HOME");
-  const char* const home = std::getenv("HOME");
-  fs::path folder;
-  if (state != nullptr && *state != '\0') {
-    folder = state;
-  } else if (home != nullptr) {
-    folder = fs::path(home) / ".local" / "state";
-  } else {
-    return {};
-  }
-  return (folder / "qorvio" / fileName(key)).string();
+const char* variable(const char* name) {
+  const char* const text = std::getenv(name);
+  return text != nullptr ? text : "";
 }
 
-// The image that the file holds; zeros when it does not fit the port.
-Bytes imageIn(const nlohmann::json& file, const char* port, unsigned width) {
-  Bytes image((width + 7) / 8);
-  const auto entry = file.find(port);
-  if (entry == file.end() || !entry->is_string()) return image;
-  const auto number = numberOf(entry->get<std::string>(), 16);
-  if (!number || bitLength(*number) > width) return image;
-  std::copy_n(number->begin(), std::min(number->size(), image.size()), image.begin());
-  return image;
+// The number of a file, as an image of the port; nothing when there is none that fits.
+std::optional<Bytes> imageIn(const nlohmann::json& file, const char* key, unsigned width) {
+  const auto entry = file.find(key);
+  if (entry == file.end() || !entry->is_string()) return std::nullopt;
+  std::optional<Bytes> number = numberOf(entry->get<std::string>(), 16, width);
+  if (!number || bitLength(*number) > width) return std::nullopt;
+  number->resize(byteCount(width));
+  return number;
 }
 
 std::string textOf(const Bytes& image) {
@@ -72,84 +62,106 @@ void overlay(Bytes& image, const Bytes& bits, const Bytes& mask) {
     image[i] = static_cast<unsigned char>((image[i] & ~mask[i]) | (bits[i] & mask[i]));
 }
 
-// Until its end, the only one that changes files of the folder; where the file system cannot tell, one of several.
-class FolderLock {
- public:
-  explicit FolderLock(const fs::path& folder)
-      : folder_(open(folder.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC)) {
-    while (folder_ >= 0 && flock(folder_, LOCK_EX) != 0 && errno == EINTR) continue;
-  }
-  FolderLock(const FolderLock&) = delete;
-  FolderLock& operator=(const FolderLock&) = delete;
-  ~FolderLock() {
-    if (folder_ >= 0) close(folder_);
-  }
-
- private:
-  int folder_;
-};
-
 }  // namespace
 
-OutputMemory::Images::Images(const QORVIO_CORE_INFO& info)
-    : asyncOut((info.async_output_count + 7) / 8), syncOut((info.sync_output_count + 7) / 8) {}
-
-OutputMemory::OutputMemory(const std::string& key, const QORVIO_CORE_INFO& info)
-    : path_(pathFor(key)), info_(info), now_(remembered()), given_(info) {}
-
-OutputMemory::~OutputMemory() {
-  save();
+std::string userStateFolder() {
+  const std::string state = variable("XDG_STATE_HOME"), home = variable("HOME");
+  if (!state.empty()) return (fs::path(state) / "qorvio").string();
+  if (!home.empty()) return (fs::path(home) / ".local" / "state" / "qorvio").string();
+  return {};
 }
 
-void OutputMemory::set(const Signal& signal, const Bytes& value) {
-  for (unsigned i = 0; i < signal.width(); ++i) {
-    setBit(now_.of(signal.port), signal.bits[i], bitAt(value.data(), i));
-    setBit(given_.of(signal.port), signal.bits[i], 1);
+OutputMemory::Images::Images(const QORVIO_CORE_INFO& info) {
+  async.values = async.known = Bytes(byteCount(info.async_output_count));
+  sync.values = sync.known = Bytes(byteCount(info.sync_output_count));
+}
+
+OutputMemory::OutputMemory(const QORVIO_CORE_INFO& info, bool isNew) : info_(info), now_(info), given_(info) {
+  for (Image* each : {&now_.async, &now_.sync})
+    std::fill(each->known.begin(), each->known.end(), static_cast<unsigned char>(isNew ? 0xFF : 0));
+}
+
+OutputMemory::OutputMemory(const QORVIO_CORE_INFO& info, const std::string& folder, const std::string& key)
+    : path_((fs::path(folder) / fileName(key)).string()), info_(info), now_(info), given_(info) {
+  if (os::isWritableFolder(fs::path(path_).parent_path().string())) now_ = remembered();
+}
+
+OutputMemory::~OutputMemory() {
+  try {
+    save();
+  } catch (const std::exception&) {
+    return;  // those who want to know call save()
+  }
+}
+
+std::optional<Bytes> OutputMemory::lastGiven(const Signal& output) const {
+  const Image& image = now_.of(output.port);
+  Bytes value(byteCount(output.width()));
+  for (unsigned i = 0; i < output.width(); ++i) {
+    if (bitAt(image.known, output.bits[i]) == 0) return std::nullopt;
+    setBit(value, i, bitAt(image.values, output.bits[i]));
+  }
+  return value;
+}
+
+void OutputMemory::set(const Signal& output, const Bytes& value) {
+  for (unsigned i = 0; i < output.width(); ++i) {
+    for (Images* each : {&now_, &given_}) {
+      setBit(each->of(output.port).values, output.bits[i], bitAt(value, i));
+      setBit(each->of(output.port).known, output.bits[i], 1);
+    }
   }
   isChanged_ = true;
 }
 
 OutputMemory::Images OutputMemory::remembered() const {
   Images images(info_);
-  std::ifstream file(path_);
-  const auto json = nlohmann::json::parse(file, nullptr, false);
+  std::string text;
+  try {
+    text = os::readFile(path_, largestFile);
+  } catch (const std::system_error&) {
+    return images;
+  }
+  const auto json = nlohmann::json::parse(text, nullptr, false);
   if (!json.is_object()) return images;
-  images.asyncOut = imageIn(json, "async_out", info_.async_output_count);
-  images.syncOut = imageIn(json, "sync_out", info_.sync_output_count);
+  const auto fill = [&](Image& image, const std::string& port, unsigned width) {
+    const auto values = imageIn(json, port.c_str(), width),
+               known = imageIn(json, (port + "_known").c_str(), width);
+    if (values && known) image = {*values, *known};
+  };
+  fill(images.async, "async_out", info_.async_output_count);
+  fill(images.sync, "sync_out", info_.sync_output_count);
   return images;
 }
 
 void OutputMemory::save() {
   if (!isChanged_ || path_.empty()) return;
+  const fs::path folder = fs::path(path_).parent_path();
+  std::error_code failed;
+  fs::create_directories(folder, failed);
+  if (!os::isWritableFolder(folder.string())) return;
   try {
     merge();
-  } catch (const std::exception&) {
-    return;  // what the command did stands; only the next toggle starts from older values
+  } catch (const std::system_error& error) {
+    const bool isLocked = error.code() == std::errc::timed_out;
+    throw Failure("cannot remember what the outputs were given, in " + path_ + ": " +
+                  (isLocked ? "another program keeps the folder locked" : error.code().message()));
   }
 }
 
 void OutputMemory::merge() {
-  std::error_code failed;
-  const fs::path folder = fs::path(path_).parent_path();
-  fs::create_directories(folder, failed);
-  const FolderLock lock(folder);
+  const os::FileLock lock((fs::path(path_).parent_path() / ".lock").string(), lockTimeout);
   Images images = remembered();
-  overlay(images.asyncOut, now_.asyncOut, given_.asyncOut);
-  overlay(images.syncOut, now_.syncOut, given_.syncOut);
-  const nlohmann::json json{{"async_out", textOf(images.asyncOut)}, {"sync_out", textOf(images.syncOut)}};
-  const std::string fresh = path_ + "." + std::to_string(getpid());  // of this run alone
-  bool written = false;
-  {
-    std::ofstream file(fresh);
-    file << json.dump() << '\n';
-    written = static_cast<bool>(file.flush());
+  for (Port port : {Port::asyncOut, Port::syncOut}) {
+    const Image& given = given_.of(port);
+    overlay(images.of(port).values, given.values, given.known);
+    overlay(images.of(port).known, given.known, given.known);
   }
-  failed.clear();
-  if (written) fs::rename(fresh, path_, failed);
-  if (!written || failed) {
-    fs::remove(fresh, failed);
-    return;
-  }
+  const nlohmann::ordered_json json{{"async_out", textOf(images.async.values)},
+                                    {"async_out_known", textOf(images.async.known)},
+                                    {"sync_out", textOf(images.sync.values)},
+                                    {"sync_out_known", textOf(images.sync.known)}};
+  os::replaceFile(path_, json.dump() + "\n");
   now_ = images;
   given_ = Images(info_);
   isChanged_ = false;

@@ -13,6 +13,7 @@
 #include "FaultyCable.h"
 #include "Sim.h"
 #include "board/model/Errors.h"
+#include "board/session/LocalCore.h"
 
 namespace {
 
@@ -45,11 +46,12 @@ class Recording : public testing::TestWithParam<FileKind> {
   // Between two samples there was time for the polls that were missed between them.
   qor::Recorded record(const qor::Limits& limits) {
     const qor::Signal counter{"counter", qor::Port::asyncIn, {0, 1, 2, 3, 4, 5, 6, 7}};
-    return qor::recordTo(path_, core_, {counter}, limits, [&](const qor::Recorded& so, nanoseconds now) {
-      EXPECT_GE(now - last_, static_cast<std::int64_t>(so.missed - missed_) * limits.period);
-      last_ = now;
-      missed_ = so.missed;
-    });
+    return qor::recordTo(
+        path_, poller_, {counter}, limits, {}, [&](const qor::Recorded& so, nanoseconds now) {
+          EXPECT_GE(now - last_, static_cast<std::int64_t>(so.missed - missed_) * limits.period);
+          last_ = now;
+          missed_ = so.missed;
+        });
   }
 
   std::string text() const {
@@ -61,7 +63,8 @@ class Recording : public testing::TestWithParam<FileKind> {
                             ("recording" + std::to_string(getpid()) + '.' + GetParam().ending);
   qorsim::FaultyCable* const link_ = new qorsim::FaultyCable(qorsim::demoBoard().cable());
   qor::Link session_{std::unique_ptr<QorRT::Qor_Cable>(link_)};
-  qor::CoreSession core_{session_, {1, 1, 0}, ""};
+  qor::LocalCore core_{session_, {1, 1, 0}};
+  qor::Poller poller_{{&core_}};
   nanoseconds last_{0};
   std::uint64_t missed_ = 0;
 };

@@ -2,8 +2,8 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "board/model/SignalTable.h"
-#include "board/record/InputWatch.h"
+#include "board/Board.h"
+#include "tools/qorvio/InputWatch.h"
 #include "tools/qorvio/terminal/Screen.h"
 #include "tools/qorvio/terminal/Table.h"
 
@@ -79,16 +79,12 @@ TEST(Table, LaysOutAgainWhatWasSetOrAllWhenAColumnGrows) {
 
 // The demo board loops the outputs of its first core back.
 TEST(InputWatch, NamesTheInputsThatLookDifferent) {
-  qor::Link link(qor::openCable("sim:"));
-  qor::CoreSession core(link, {0, 1, 0}, "");
-  qor::SignalTable signals;
-  signals.addWholePorts(core.info());
-  const auto write = [&](const char* output, unsigned char value) {
-    core.write({qor::level(signals.find(output, Direction::output), {value})});
-  };
-  qor::InputWatch watch(core, {signals.find("async_in_data[0]", Direction::input),
-                               signals.find("async_in_data[1]", Direction::input),
-                               signals.find("sync_in_data", Direction::input)});
+  qor::Board board("sim:");
+  const qor::SignalTable& signals = board.signals();
+  const auto write = [&](const char* output, unsigned char value) { board.write({{output, value}}); };
+  qor::tool::InputWatch watch(board.poller(), {signals.find("async_in_data[0]", Direction::input),
+                                               signals.find("async_in_data[1]", Direction::input),
+                                               signals.find("sync_in_data", Direction::input)});
   watch.poll();
   EXPECT_THAT(watch.takeChanged(), ElementsAre(0, 1, 2));
   watch.poll();
@@ -103,10 +99,10 @@ TEST(InputWatch, NamesTheInputsThatLookDifferent) {
   EXPECT_THAT(watch.takeChanged(), ElementsAre(2));
   watch.poll();
   EXPECT_THAT(watch.takeChanged(), IsEmpty());
-  EXPECT_EQ(watch.sinceStart().asyncUp[0], 2);
-  EXPECT_EQ(watch.sinceStart().syncUp[0], 0x80);
+  EXPECT_EQ(watch.sinceStart(watch.inputs()[2]).asyncUp[0], 2);
+  EXPECT_EQ(watch.sinceStart(watch.inputs()[2]).syncUp[0], 0x80);
   watch.clear();
-  EXPECT_EQ(watch.sinceStart().asyncUp[0], 0);
+  EXPECT_EQ(watch.sinceStart(watch.inputs()[2]).asyncUp[0], 0);
   EXPECT_THAT(watch.takeChanged(), ElementsAre(0, 1, 2));
 }
 

@@ -71,10 +71,10 @@ CORE   TYPE    VERSION  ASYNC OUT  SYNC OUT  ASYNC IN  SYNC IN
 
 @test "write takes every spelling of a value, and tells it in one exchange" {
   signals_file
-  run qorvio --signals bench.toml --json write mode=off mode=fast 'async_out_data[7:4]=0b1010' 'sync_out_data=0d200' \
+  run qorvio --signals bench.toml --json write mode=fast 'async_out_data[7:4]=0b1010' 'sync_out_data=0d200' \
     'sync_out_data[0].pulsetrain=0,1,0'
   [ "$status" -eq 0 ]
-  [ "$(tr -d ' \n' <<<"$output")" = '[{"name":"mode","width":2,"steps":["0"]},{"name":"mode","width":2,"steps":["2"]},{"name":"async_out_data[7:4]","width":4,"steps":["A"]},{"name":"sync_out_data","width":8,"steps":["C8"]},{"name":"sync_out_data[0]","width":1,"steps":["0","1","0","0","0","0","0","0","0","0","0","0","0","0","0","0"]}]' ]
+  [ "$(tr -d ' \n' <<<"$output")" = '[{"name":"mode","width":2,"steps":["2"]},{"name":"async_out_data[7:4]","width":4,"steps":["A"]},{"name":"sync_out_data","width":8,"steps":["C8"]},{"name":"sync_out_data[0]","width":1,"steps":["0","1","0","0","0","0","0","0","0","0","0","0","0","0","0","0"]}]' ]
 }
 
 @test "a signals file names, checks and is begun by the tool" {
@@ -108,7 +108,9 @@ CORE   TYPE    VERSION  ASYNC OUT  SYNC OUT  ASYNC IN  SYNC IN
   fails 2 "a rate is 0.001 to 1000000000 a second: 1e-12" play never.csv --rate 1e-12
   fails 2 "a rate is 0.01 to 1000 a second: 2000" watch --rate 2000
   fails 2 "no such command: frob" frob
+  fails 2 "an output is given two values: async_out_data" write async_out_data=1 ASYNC_OUT_DATA=2
   signals_file
+  fails 2 "bench.toml: the signals are for core 0.1.0, asked for is: 1.1.0" --signals bench.toml --core 1.1.0 read
   sed -i 's/"async_in"/"asynk_in"/' bench.toml
   fails 2 'bench.toml:9: signal[1].port: must be async_out, sync_out, async_in or sync_in, is "asynk_in"' \
     --signals bench.toml read

@@ -8,9 +8,11 @@ setup() {
   export XDG_STATE_HOME=$PWD QORVIO_CORE=0.1.0 QORVIO_CABLE=lossy:6
 }
 
-remembers() {  # remembers ASYNC SYNC: what the file holds, which is the only one in its folder
-  cat qorvio/*
-  [ "$(cat qorvio/*)" = "{\"async_out\":\"$1\",\"sync_out\":\"$2\"}" ]
+remembers() {  # remembers ASYNC KNOWN SYNC KNOWN: what the file holds, which is the only one in its folder
+  local file
+  file=$(find qorvio -name '*.json')
+  cat "$file"
+  [ "$(cat "$file")" = "{\"async_out\":\"$1\",\"async_out_known\":\"$2\",\"sync_out\":\"$3\",\"sync_out_known\":\"$4\"}" ]
 }
 
 @test "an interrupted press releases its output, and leaves alone what others gave meanwhile" {
@@ -19,11 +21,11 @@ remembers() {  # remembers ASYNC SYNC: what the file holds, which is the only on
   pid=$!
   catches_interrupt
   "$QORVIO_LOSSY" toggle 'async_out_data[3]'
-  remembers F7 00
+  remembers F7 FF 00 00
   kill -INT $pid
   wait $pid
   [ "$(tr -d ' \n' <told)" = '[{"name":"async_out_data[0]","width":1,"steps":["0"]}]' ]
-  remembers F6 00
+  remembers F6 FF 00 00
 }
 
 @test "a command that is killed remembers what it gave before, and at a cable with a long name" {
@@ -31,13 +33,13 @@ remembers() {  # remembers ASYNC SYNC: what the file holds, which is the only on
   "$QORVIO_LOSSY" press 'async_out_data[1]' --for 1h 3>&- &
   pid=$!
   catches_interrupt
-  until compgen -G 'qorvio/*.json'; do
+  until [ -n "$(find qorvio -name '*.json')" ]; do
     kill -0 $pid || return 1
     sleep 0.05
   done
   kill -KILL $pid
   wait $pid || true
-  remembers 02 00
+  remembers 02 02 00 00
 }
 
 @test "a command that fails remembers what it gave before" {
@@ -46,5 +48,13 @@ remembers() {  # remembers ASYNC SYNC: what the file holds, which is the only on
   run "$QORVIO_LOSSY" play steps.csv
   [ "$status" -eq 1 ]
   [ "$output" = "qorvio: device 0, user chain 1, core 0: the link is down" ]
-  remembers 04 01
+  remembers 04 FF 01 01
+}
+
+@test "toggle needs to know what the output was given, by whom ever" {
+  run "$QORVIO_LOSSY" toggle 'sync_out_data[2]'
+  [ "$status" -eq 2 ]
+  [ "$output" = "qorvio: it is not known what this output was last given, say it by --assume 0 or 1: sync_out_data[2]" ]
+  [ "$("$QORVIO_LOSSY" toggle 'sync_out_data[2]' --assume 1)" = "sync_out_data[2] = 0" ]
+  [ "$("$QORVIO_LOSSY" toggle 'sync_out_data[2]')" = "sync_out_data[2] = 1" ]
 }

@@ -1,4 +1,4 @@
-// NAME=VALUE as the command line gives it.
+// What was written, as JSON.
 #pragma once
 
 #include <string>
@@ -6,9 +6,6 @@
 #include "tools/qorvio/Context.h"
 
 namespace qor::tool {
-
-/// "NAME=VALUE", or "NAME.pulsetrain=V0,V1,...". Throws WrongUse.
-Assignment parseAssignment(const SignalTable& signals, const std::string& text);
 
 /// With --json, tells on stdout what was written.
 void printWritten(const Context& context, const std::vector<Assignment>& assignments);

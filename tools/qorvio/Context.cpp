@@ -3,8 +3,10 @@
 #include <cstdlib>
 #include <filesystem>
 
+#include "board/model/CoreAddress.h"
 #include "board/model/Errors.h"
 #include "board/model/TomlPlace.h"
+#include "board/session/OutputMemory.h"
 
 namespace qor::tool {
 namespace {
@@ -12,19 +14,6 @@ namespace {
 void fillFromEnvironment(std::string& value, const char* variable) {
   const char* const text = std::getenv(variable);
   if (value.empty() && text != nullptr) value = text;
-}
-
-// A simulated board in this process is new in every run: nothing of its outputs is worth remembering.
-std::string memoryKey(const std::string& cable, QOR_CORE_REF ref) {
-  return cable.rfind("sim:", 0) == 0 ? "" : cable + " " + refText(ref);
-}
-
-QOR_CORE_REF firstVioCore(Link& link) {
-  const std::vector<FoundCore> cores = findCores(link);
-  for (const FoundCore& core : cores)
-    if (core.isVio()) return core.ref;
-  throw Failure("no VIO core on this board: " + std::to_string(cores.size()) + " cores of other types, " +
-                std::to_string(link.devices().size()) + " devices");
 }
 
 }  // namespace
@@ -49,41 +38,34 @@ void Settings::complete() {
 }
 
 Link& Context::link() {
+  if (board_) return board_->link();
   if (link_) return *link_;
   std::unique_ptr<QorRT::Qor_Cable> cable = openCable(settings.cable);
   if (traffic_ != nullptr) cable = std::make_unique<CountingCable>(std::move(cable), *traffic_);
-  link_ = std::make_unique<Link>(std::move(cable));
+  link_ = std::make_unique<Link>(std::move(cable), settings.cable);
   return *link_;
 }
 
 QOR_CORE_REF Context::coreRef() {
-  if (core_) return core_->ref();
   if (!settings.core.empty()) return parseRef(settings.core);
-  if (file().core) return *file().core;
-  return firstVioCore(link());
+  return file().cores().empty() ? firstVioCore(link()) : file().cores().front();
 }
 
-CoreSession& Context::core() {
-  if (!core_) {
-    const QOR_CORE_REF ref = coreRef();
-    core_ = std::make_unique<CoreSession>(link(), ref, memoryKey(settings.cable, ref));
-  }
-  return *core_;
+Board& Context::board() {
+  if (board_) return *board_;
+  BoardOptions options;
+  if (!settings.core.empty()) options.core = parseRef(settings.core);
+  options.forceCore = settings.forceCore;
+  options.stateFolder = userStateFolder();
+  const SignalTable& signals = file();
+  link();
+  board_ = std::make_unique<Board>(std::move(link_), signals, std::move(options));
+  return *board_;
 }
 
 const SignalTable& Context::file() {
   if (!file_) file_ = settings.signals.empty() ? SignalTable() : readSignalFile(settings.signals);
   return *file_;
-}
-
-const SignalTable& Context::signals() {
-  if (signals_) return *signals_;
-  SignalTable table = file();
-  const std::vector<std::string> wrong = misfits(table, core().info());
-  if (!wrong.empty()) throw WrongUse(settings.signals + ": " + wrong.front());
-  table.addWholePorts(core().info());
-  signals_ = std::move(table);
-  return *signals_;
 }
 
 }  // namespace qor::tool

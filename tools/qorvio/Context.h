@@ -5,10 +5,8 @@
 #include <optional>
 #include <string>
 
-#include "board/model/SignalTable.h"
-#include "board/session/CoreSession.h"
+#include "board/Board.h"
 #include "board/session/CountingCable.h"
-#include "board/session/Link.h"
 
 namespace qor::tool {
 
@@ -18,6 +16,7 @@ struct Settings {
   std::string cable;
   std::string core;
   std::string signals;
+  bool forceCore = false;  ///< --core counts though the signals file is for another one
   bool json = false;
   bool quiet = false;
 
@@ -29,13 +28,17 @@ class Context {
  public:
   Settings settings;
 
+  /// The session with the board, without setting up a core.
   Link& link();
 
   /// Has the cable's traffic counted, from its opening on. `traffic` outlives the context.
   void countTraffic(Traffic& traffic) { traffic_ = &traffic; }
 
-  /// The core that was named, or that the signals file names, or the first VIO core. Set up.
-  CoreSession& core();
+  /// The board: the core that was named, or those of the signals file, or the first VIO core. Set up.
+  Board& board();
+
+  /// Its first core.
+  Core& core() { return board().core(); }
 
   /// Where core() will be, without setting it up.
   QOR_CORE_REF coreRef();
@@ -43,15 +46,14 @@ class Context {
   /// The signals file, empty without one. Needs no board.
   const SignalTable& file();
 
-  /// The signals file with the whole ports of the core.
-  const SignalTable& signals();
+  /// The signals file with the whole ports of the cores.
+  const SignalTable& signals() { return board().signals(); }
 
  private:
   Traffic* traffic_ = nullptr;
   std::unique_ptr<Link> link_;
-  std::unique_ptr<CoreSession> core_;
+  std::unique_ptr<Board> board_;
   std::optional<SignalTable> file_;
-  std::optional<SignalTable> signals_;
 };
 
 }  // namespace qor::tool

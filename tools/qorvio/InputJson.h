@@ -5,7 +5,8 @@
 
 #include <nlohmann/json.hpp>
 
-#include "board/session/CoreSession.h"
+#include "board/model/Sample.h"
+#include "board/model/Value.h"
 
 namespace qor::tool {
 

@@ -47,6 +47,7 @@ void addSettings(CLI::App& app, qor::tool::Settings& settings) {
   app.add_option("--core", settings.core, "the core, else the first VIO core (QORVIO_CORE)")
       ->type_name("DEVICE.CHAIN.INDEX");
   app.add_option("--signals", settings.signals, "names for its bits (QORVIO_SIGNALS)")->type_name("FILE");
+  app.add_flag("--force-core", settings.forceCore, "use --core though the signals file is for another core");
   app.add_flag("--json", settings.json, "results as JSON");
   app.add_flag("--quiet", settings.quiet, "no progress, no remarks");
   app.parse_complete_callback([&settings] { settings.complete(); });

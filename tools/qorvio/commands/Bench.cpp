@@ -21,8 +21,8 @@ struct Figures {
   Traffic traffic;
 };
 
-Figures measure(CoreSession& core, unsigned polls, Traffic& traffic) {
-  Sample sample = core.emptySample();
+Figures measure(Core& core, unsigned polls, Traffic& traffic) {
+  Sample sample = emptySample(core.info());
   core.read(sample);  // what a first read sets up is not a poll's
   traffic = {};
   Figures figures;

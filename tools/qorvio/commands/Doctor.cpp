@@ -5,6 +5,7 @@
 
 #include <nlohmann/json.hpp>
 
+#include "board/model/CoreAddress.h"
 #include "board/model/Errors.h"
 #include "os/Stop.h"
 #include "tools/qorvio/commands/Commands.h"
@@ -64,9 +65,8 @@ std::string hubs(QorRT::Qor_Cable& cable) {
   return "hubs behind " + found + seen;
 }
 
-std::string layout(CoreSession& core) {
-  QORVIO_CORE_INFO again{};
-  core.link().check(QorVIO_getInfo(core.link().session(), core.ref(), &again));
+std::string layout(Link& link, const Core& core) {
+  const QORVIO_CORE_INFO again = readInfo(link, core.ref());
   const QORVIO_CORE_INFO& info = core.info();
   if (again.async_input_count != info.async_input_count || again.sync_input_count != info.sync_input_count ||
       again.async_output_count != info.async_output_count ||
@@ -82,7 +82,7 @@ std::string layout(CoreSession& core) {
 }
 
 // Writes a pattern and its opposite, and puts back what the outputs were last known to hold.
-std::string loop(CoreSession& core) {
+std::string loop(Core& core) {
   const unsigned width = std::min(core.info().async_output_count, core.info().async_input_count);
   if (width == 0) return "nothing to compare: no asynchronous port in both directions";
   Signal outputs{"async_out_data", Port::asyncOut}, inputs{"async_in_data", Port::asyncIn};
@@ -90,8 +90,8 @@ std::string loop(CoreSession& core) {
     outputs.bits.push_back(bit);
     inputs.bits.push_back(bit);
   }
-  const Bytes before = core.lastWritten(outputs);
-  Sample sample = core.emptySample();
+  const Bytes before = core.lastGiven(outputs).value_or(Bytes(byteCount(width)));
+  Sample sample = emptySample(core.info());
   Bytes pattern((width + 7) / 8), value;
   bool follows = true;
   const os::Stop stop;  // whoever interrupts it finds the outputs put back
@@ -129,10 +129,12 @@ std::vector<Check> checksOf(Context& context, std::unique_ptr<QorRT::Qor_Cable>&
          return counted(findCores(context.link()).size(), "core");
        }},
       {"status word", "choose a VIO core with --core; qorvio scan shows them",
-       [&] { return "core " + refText(context.core().ref()) + ", " + layout(context.core()); }},
+       [&] {
+         return "core " + refText(context.core().ref()) + ", " + layout(context.link(), context.core());
+       }},
       {"read", "is the clock of the design running?",
        [&] {
-         Sample sample = context.core().emptySample();
+         Sample sample = emptySample(context.core().info());
          context.core().read(sample);
          return std::string("inputs delivered, CRC right");
        }},

@@ -1,7 +1,9 @@
 // pulse, toggle, press: what one does to a bit at the bench.
 #include <chrono>
+#include <optional>
 
 #include "board/model/Duration.h"
+#include "board/model/Errors.h"
 #include "os/Stop.h"
 #include "tools/qorvio/Assignments.h"
 #include "tools/qorvio/commands/Commands.h"
@@ -21,18 +23,18 @@ struct PressOptions {
 };
 
 void write(Context& context, const Assignment& assignment) {
-  context.core().write({assignment});
+  context.board().give({assignment});
+  context.board().rememberOutputs();
   printWritten(context, {assignment});
 }
 
 void press(Context& context, const PressOptions& options) {
   const std::chrono::nanoseconds time = parseDuration(options.time);
   const Signal signal = context.signals().find(options.name, Direction::output);
-  Assignment down = toggle(context.core(), signal);  // asks for one bit
-  down.steps = {{1}};
+  requireBit(signal);
   const os::Stop stop;  // whoever interrupts it finds the output released
-  context.core().write({down});
-  context.core().rememberOutputs();
+  context.board().give({level(signal, {1})});
+  context.board().rememberOutputs();
   stop.sleepUntil(std::chrono::steady_clock::now() + time);
   write(context, level(signal, {0}));
 }
@@ -46,24 +48,36 @@ void addPulse(CLI::App& app, Context& context) {
   command->add_option("--at", options->at, "the step at which it rises: 0 to 14");
   command->footer("Example:\n  qorvio pulse sync_out_data[5] --width 3");
   command->callback([&context, options] {
-    write(context,
-          pulse(context.signals().find(options->name, Direction::output), options->at, options->width));
+    const Signal signal = context.signals().find(options->name, Direction::output);
+    write(context, pulseOf(signal, {options->width, options->at}));
   });
 }
 
 void addToggle(CLI::App& app, Context& context) {
-  auto name = std::make_shared<std::string>();
+  struct Options {
+    std::string name;
+    std::optional<bool> assumed;
+  };
+  auto options = std::make_shared<Options>();
   CLI::App* command =
       app.add_subcommand("toggle", "one output bit to the opposite of what it was given last");
-  command->add_option("NAME", *name, "the output bit")->required();
+  command->add_option("NAME", options->name, "the output bit")->required();
+  command->add_option("--assume", options->assumed,
+                      "what it was given last, where that is not known: 0 or 1");
   command->footer(
       "Outputs cannot be read back: what they were given is remembered from run to run.\n\n"
       "Example:\n  qorvio toggle async_out_data[0]");
-  command->callback([&context, name] {
-    const Assignment toggled = toggle(context.core(), context.signals().find(*name, Direction::output));
-    write(context, toggled);
+  command->callback([&context, options] {
+    const Signal signal = context.signals().find(options->name, Direction::output);
+    const Core& core = context.board().core(signal.core);
+    requireBit(signal);
+    if (!core.lastGiven(signal) && !options->assumed)
+      throw WrongUse("it is not known what this output was last given, say it by --assume 0 or 1: " +
+                     signal.name);
+    const Assignment assignment = toggled(core, signal, options->assumed);
+    write(context, assignment);
     if (!context.settings.json && !context.settings.quiet)
-      std::printf("%s = %u\n", toggled.signal.name.c_str(), static_cast<unsigned>(toggled.steps[0][0]));
+      std::printf("%s = %u\n", signal.name.c_str(), static_cast<unsigned>(assignment.steps[0][0]));
   });
 }
 

@@ -2,6 +2,7 @@
 
 #include <nlohmann/json.hpp>
 
+#include "board/model/CoreAddress.h"
 #include "board/model/CoreFields.h"
 #include "tools/qorvio/commands/Commands.h"
 #include "tools/qorvio/terminal/Table.h"
@@ -26,9 +27,7 @@ void addInfo(CLI::App& app, Context& context) {
   command->footer("Example:\n  qorvio --core 1.1.0 info");
   command->callback([&context] {
     const QOR_CORE_REF ref = context.coreRef();
-    QORVIO_CORE_INFO info{};
-    context.link().check(QorVIO_getInfo(context.link().session(), ref, &info));
-    print(info, ref, context.settings.json);
+    print(readInfo(context.link(), ref), ref, context.settings.json);
   });
 }
 

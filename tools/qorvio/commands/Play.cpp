@@ -14,8 +14,6 @@ namespace {
 using Clock = std::chrono::steady_clock;
 using std::chrono::nanoseconds;
 
-constexpr std::size_t stepCount = 16;
-
 struct PlayOptions {
   std::string file;
   double rate = 0;
@@ -49,7 +47,7 @@ bool canBurst(const PlayScript& script) {
 }
 
 // The rows from `first` on, as many as one exchange takes: with several, the last one stays.
-std::vector<Assignment> assignmentsOf(const PlayScript& script, std::size_t first, std::size_t count) {
+std::vector<Assignment> rowsFrom(const PlayScript& script, std::size_t first, std::size_t count) {
   std::vector<Assignment> assignments;
   for (std::size_t column = 0; column < script.signals.size(); ++column) {
     Assignment each{script.signals[column], {}};
@@ -60,7 +58,7 @@ std::vector<Assignment> assignmentsOf(const PlayScript& script, std::size_t firs
   return assignments;
 }
 
-Played playRows(CoreSession& core, const PlayScript& script, const Timing& timing) {
+Played playRows(Board& board, const PlayScript& script, const Timing& timing) {
   const std::size_t atOnce = timing.isAsap() && canBurst(script) ? stepCount : 1;
   const os::Stop stop;
   Played played;
@@ -71,7 +69,7 @@ Played playRows(CoreSession& core, const PlayScript& script, const Timing& timin
     stop.sleepUntil(due);
     if (stop.asked()) break;
     const std::size_t count = std::min(atOnce, script.rows.size() - played.rows);
-    core.write(assignmentsOf(script, played.rows, count));
+    board.give(rowsFrom(script, played.rows, count));
     played.rows += count;
     ++played.exchanges;
   }
@@ -95,7 +93,7 @@ void play(Context& context, const PlayOptions& options) {
   if (script.hasTimes() && options.rate != 0)
     throw WrongUse("the rows have times of their own and take no --rate: " + options.file);
   const Timing timing(script, period);
-  const Played played = playRows(context.core(), script, timing);
+  const Played played = playRows(context.board(), script, timing);
   if (context.settings.json || !context.settings.quiet)
     print(played, !timing.isAsap(), context.settings.json);
 }

@@ -43,9 +43,9 @@ void set(Context& context, const SetOptions& options) {
   const Signal port = wholePort(context.core().info(), options.port, Direction::output);
   const Bytes value = parseValue(port, options.value);
   if (options.mask.empty()) {
-    context.core().write({level(port, value)});
+    context.board().give({level(port, value)});
   } else {
-    context.core().write({masked(port, value, parseValue(port, options.mask))});
+    context.board().give({masked(port, value, parseValue(port, options.mask))});
   }
 }
 
@@ -56,7 +56,7 @@ void get(Context& context, const std::string& name) {
   SignalTable all;
   all.addWholePorts(info);
   if (name.empty()) ports = all.select({}, Direction::input);
-  Sample sample = context.core().emptySample();
+  Sample sample = emptySample(info);
   context.core().read(sample);
   nlohmann::ordered_json json = nlohmann::ordered_json::array();
   Table table({"PORT", "WIDTH", "VALUE", "UP", "DOWN", "SYNC UP", "SYNC DOWN"});

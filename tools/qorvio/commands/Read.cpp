@@ -1,8 +1,8 @@
 #include <cstdio>
 
-#include "board/record/Activity.h"
 #include "tools/qorvio/InputJson.h"
 #include "tools/qorvio/commands/Commands.h"
+#include "tools/qorvio/terminal/Arrow.h"
 #include "tools/qorvio/terminal/Table.h"
 
 namespace qor::tool {
@@ -13,16 +13,17 @@ struct ReadOptions {
   std::string radix;
 };
 
-void printJson(const std::vector<Signal>& signals, const Sample& sample, const Radix* radix) {
+void printJson(const std::vector<Signal>& signals, const std::vector<Sample>& samples, const Radix* radix) {
   nlohmann::ordered_json json = nlohmann::ordered_json::array();
-  for (const Signal& each : signals) json.push_back(jsonOf(each, sample, radix));
+  for (const Signal& each : signals) json.push_back(jsonOf(each, samples[each.core], radix));
   std::printf("%s\n", json.dump(2).c_str());
 }
 
-void printTable(const std::vector<Signal>& signals, const Sample& sample, const Radix* radix) {
+void printTable(const std::vector<Signal>& signals, const std::vector<Sample>& samples, const Radix* radix) {
   Table table({"NAME", "VALUE", "ACTIVITY", "SYNC"});
   Bytes value;
   for (const Signal& each : signals) {
+    const Sample& sample = samples[each.core];
     extract(each, sample.values(each.port), value);
     const Activity activity = activityOf(each, sample);
     const char* const both = arrow(activity.up, activity.down);
@@ -37,9 +38,10 @@ void read(Context& context, const ReadOptions& options) {
   Radix radix{};
   if (!options.radix.empty()) radix = radixNamed(options.radix);
   const std::vector<Signal> signals = context.signals().select(options.names, Direction::input);
-  Sample sample = context.core().emptySample();
-  context.core().read(sample);
-  (context.settings.json ? printJson : printTable)(signals, sample, options.radix.empty() ? nullptr : &radix);
+  Subscription inputs(context.board().poller(), signals);
+  context.board().poller().poll();
+  (context.settings.json ? printJson : printTable)(signals, inputs.look(),
+                                                   options.radix.empty() ? nullptr : &radix);
 }
 
 }  // namespace

@@ -5,6 +5,7 @@
 #include "board/model/Errors.h"
 #include "board/record/Recording.h"
 #include "os/StandardStreams.h"
+#include "os/Stop.h"
 #include "tools/qorvio/commands/Commands.h"
 
 namespace qor::tool {
@@ -62,19 +63,21 @@ class Progress {
   nanoseconds drawn_{0};
 };
 
-Recorded recordWithProgress(CoreSession& core, const std::vector<Signal>& signals, const std::string& path,
+Recorded recordWithProgress(Board& board, const std::vector<Signal>& signals, const std::string& path,
                             const Limits& limits, bool wanted) {
   Progress progress(wanted, limits);
-  return recordTo(path, core, signals, limits,
-                  [&](const Recorded& recorded, nanoseconds now) { progress.show(recorded.samples, now); });
+  const os::Stop stop;
+  return recordTo(
+      path, board.poller(), signals, limits, [&stop] { return stop.asked(); },
+      [&](const Recorded& recorded, nanoseconds now) { progress.show(recorded.samples, now); });
 }
 
 void record(Context& context, const RecordOptions& options) {
   const Limits limits = limitsOf(options);
-  CoreSession& core = context.core();
   const std::vector<Signal> signals = context.signals().select(options.names, Direction::input);
   const Settings& settings = context.settings;
-  const Recorded recorded = recordWithProgress(core, signals, options.out, limits, !settings.quiet);
+  const Recorded recorded =
+      recordWithProgress(context.board(), signals, options.out, limits, !settings.quiet);
   if (settings.json) {
     std::printf("{\"samples\": %llu, \"missed\": %llu}\n", static_cast<unsigned long long>(recorded.samples),
                 static_cast<unsigned long long>(recorded.missed));

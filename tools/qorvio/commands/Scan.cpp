@@ -2,6 +2,7 @@
 
 #include <nlohmann/json.hpp>
 
+#include "board/model/CoreAddress.h"
 #include "board/model/CoreFields.h"
 #include "tools/qorvio/commands/Commands.h"
 #include "tools/qorvio/terminal/Table.h"

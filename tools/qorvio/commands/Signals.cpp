@@ -2,6 +2,7 @@
 
 #include <nlohmann/json.hpp>
 
+#include "board/model/CoreAddress.h"
 #include "board/model/Errors.h"
 #include "tools/qorvio/commands/Commands.h"
 #include "tools/qorvio/terminal/Table.h"
@@ -12,13 +13,14 @@ namespace {
 nlohmann::ordered_json jsonOf(const Signal& signal) {
   nlohmann::ordered_json names = nlohmann::ordered_json::object();
   for (const auto& [name, value] : signal.names) names[name] = value;
+  const nlohmann::ordered_json scale = signal.scale != 0 ? nlohmann::ordered_json(signal.scale) : nullptr;
   return {{"name", signal.name},
           {"port", portName(signal.port)},
           {"width", signal.width()},
-          {"bits", signal.bits},
+          {"bits", std::vector<unsigned>(signal.bits.rbegin(), signal.bits.rend())},
           {"radix", radixName(signal.radix)},
           {"enum", names},
-          {"scale", signal.scale},
+          {"scale", scale},
           {"unit", signal.unit},
           {"description", signal.description}};
 }
@@ -34,22 +36,32 @@ void list(const std::vector<Signal>& signals, bool asJson) {
   std::printf("%s", asJson ? (json.dump(2) + "\n").c_str() : table.text().c_str());
 }
 
+std::string coresOf(Context& context) {
+  std::string text = refText(context.coreRef());
+  for (std::size_t i = 1; i < context.file().cores().size(); ++i)
+    text += ", " + refText(context.file().cores()[i]);
+  return text;
+}
+
 void check(Context& context) {
   if (context.settings.signals.empty()) throw WrongUse("no signals file to check: use --signals FILE");
-  const std::vector<std::string> wrong = misfits(context.file(), context.core().info());
+  std::vector<QORVIO_CORE_INFO> infos{readInfo(context.link(), context.coreRef())};
+  for (std::size_t i = 1; i < context.file().cores().size(); ++i)
+    infos.push_back(readInfo(context.link(), context.file().cores()[i]));
+  const std::string cores = coresOf(context);
+  const std::vector<std::string> wrong = signalsOutsideCore(context.file(), infos);
   if (context.settings.json) {
     std::printf(
         "%s\n",
-        nlohmann::json{{"signals", context.file().fileSignals()}, {"misfits", wrong}}.dump(2).c_str());
+        nlohmann::json{{"signals", context.file().fileSignals()}, {"outside", wrong}}.dump(2).c_str());
   } else {
     for (const std::string& each : wrong) std::printf("%s\n", each.c_str());
   }
   if (!wrong.empty())
-    throw WrongUse("signals do not fit core " + refText(context.core().ref()) + ": " +
-                   std::to_string(wrong.size()) + " of " + std::to_string(context.file().fileSignals()));
+    throw WrongUse("signals do not fit core " + cores + ": " + std::to_string(wrong.size()) + " of " +
+                   std::to_string(context.file().fileSignals()));
   if (!context.settings.json && !context.settings.quiet)
-    std::printf("%zu signals, all fit core %s\n", context.file().fileSignals(),
-                refText(context.core().ref()).c_str());
+    std::printf("%zu signals, all fit core %s\n", context.file().fileSignals(), cores.c_str());
 }
 
 }  // namespace

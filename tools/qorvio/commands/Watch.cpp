@@ -3,11 +3,11 @@
 
 #include "board/model/Duration.h"
 #include "board/model/Errors.h"
-#include "board/record/InputWatch.h"
 #include "os/StandardStreams.h"
 #include "os/Stop.h"
 #include "os/Terminal.h"
 #include "tools/qorvio/InputJson.h"
+#include "tools/qorvio/InputWatch.h"
 #include "tools/qorvio/commands/Commands.h"
 #include "tools/qorvio/terminal/Screen.h"
 #include "tools/qorvio/terminal/WatchTables.h"
@@ -170,8 +170,9 @@ void printJson(InputWatch& watch, Frames& frames) {
   const Clock::time_point begin = Clock::now();
   print(watch, frames, [&] {
     for (std::size_t i : watch.takeChanged()) {
-      nlohmann::ordered_json entry = jsonOf(watch.inputs()[i], watch.sample());
-      addActivity(entry, watch.inputs()[i], watch.sinceStart(), "_since_start");
+      const Signal& input = watch.inputs()[i];
+      nlohmann::ordered_json entry = jsonOf(input, watch.sample(input));
+      addActivity(entry, input, watch.sinceStart(input), "_since_start");
       entries[i] = entry.dump();
     }
     const auto time = std::chrono::duration_cast<std::chrono::microseconds>(Clock::now() - begin);
@@ -185,12 +186,12 @@ void printJson(InputWatch& watch, Frames& frames) {
 
 void runWatch(Context& context, const WatchOptions& options) {
   const Clock::duration period = periodOf(options.rate, 0.01, 1000);
-  InputWatch watch(context.core(), context.signals().select(options.names, Direction::input));
+  InputWatch watch(context.board().poller(), context.signals().select(options.names, Direction::input));
   Frames frames(period, options.frames);
   if (context.settings.json) return printJson(watch, frames);
   if (!os::isTerminal(os::Stream::input) || !os::isTerminal(os::Stream::output))
     return printTables(watch, frames);
-  runOnTerminal(watch, OutputTable(context.core(), context.signals()), frames);
+  runOnTerminal(watch, OutputTable(context.board()), frames);
 }
 
 }  // namespace

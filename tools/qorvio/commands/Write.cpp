@@ -16,9 +16,11 @@ void addWrite(CLI::App& app, Context& context) {
       "NAME.pulsetrain=V0,V1,... plays up to 16 values, one a clock of the design; the last one stays.\n\n"
       "Example:\n  qorvio write async_out_data=5A sync_out_data[2].pulsetrain=0,1,0");
   command->callback([&context, texts] {
-    std::vector<Assignment> assignments;
-    for (const std::string& text : *texts) assignments.push_back(parseAssignment(context.signals(), text));
-    context.core().write(assignments);
+    std::vector<Drive> drives;
+    for (const std::string& text : *texts) drives.push_back(parseDrive(text));
+    const std::vector<Assignment> assignments = assignmentsOf(drives, context.signals());
+    context.board().give(assignments);
+    context.board().rememberOutputs();
     printWritten(context, assignments);
   });
 }

@@ -1,6 +1,6 @@
 #include "tools/qorvio/terminal/WatchTables.h"
 
-#include "board/record/Activity.h"
+#include "tools/qorvio/terminal/Arrow.h"
 
 namespace qor::tool {
 
@@ -13,8 +13,9 @@ const std::vector<std::string>& InputTable::lines(InputWatch& watch) {
   Bytes value;
   for (std::size_t i : watch.takeChanged()) {
     const Signal& input = watch.inputs()[i];
-    extract(input, watch.sample().values(input.port), value);
-    const Activity now = activityOf(input, watch.sample()), ever = activityOf(input, watch.sinceStart());
+    extract(input, watch.sample(input).values(input.port), value);
+    const Activity now = activityOf(input, watch.sample(input)),
+                   ever = activityOf(input, watch.sinceStart(input));
     table_.set(i + 1, {input.name, shown(input, value), arrow(now.up, now.down),
                        input.port == Port::syncIn ? arrow(now.syncUp, now.syncDown) : "",
                        arrow(ever.up, ever.down)});
@@ -22,9 +23,8 @@ const std::vector<std::string>& InputTable::lines(InputWatch& watch) {
   return table_.lines();
 }
 
-OutputTable::OutputTable(CoreSession& core, const SignalTable& signals)
-    : core_(core), table_({"  OUTPUT", "LAST GIVEN"}) {
-  for (const Signal& each : signals.select({}, Direction::output)) addBits(signals, each);
+OutputTable::OutputTable(Board& board) : board_(board), table_({"  OUTPUT", "LAST GIVEN"}) {
+  for (const Signal& each : board.signals().select({}, Direction::output)) addBits(board.signals(), each);
   for (std::size_t i = 0; i < outputs_.size(); ++i) {
     table_.add({});
     format(i);
@@ -46,21 +46,23 @@ void OutputTable::choose(std::size_t index) {
 
 void OutputTable::format(std::size_t index) {
   const Signal& output = outputs_[index];
-  table_.set(index + 1,
-             {(index == chosen_ ? "> " : "  ") + output.name, shown(output, core_.lastWritten(output))});
+  const std::optional<Bytes> last = board_.lastGiven(output);
+  table_.set(index + 1, {(index == chosen_ ? "> " : "  ") + output.name, last ? shown(output, *last) : "?"});
 }
 
 void OutputTable::toggleChosen() {
-  if (!outputs_.empty()) write(toggle(core_, outputs_[chosen_]));
+  if (outputs_.empty()) return;
+  // Where the last value is not known, the table shows what a first key makes of it.
+  write(toggled(board_.core(outputs_[chosen_].core), outputs_[chosen_], false));
 }
 
 void OutputTable::pulseChosen() {
-  if (!outputs_.empty()) write(pulse(outputs_[chosen_], 0, 1));
+  if (!outputs_.empty()) write(pulseOf(outputs_[chosen_], {}));
 }
 
 void OutputTable::write(const Assignment& assignment) {
-  core_.write({assignment});
-  core_.rememberOutputs();
+  board_.give({assignment});
+  board_.rememberOutputs();
   for (std::size_t i = 0; i < outputs_.size(); ++i) format(i);  // one bit may have several names
 }
 

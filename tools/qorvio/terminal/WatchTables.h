@@ -4,8 +4,8 @@
 #include <string>
 #include <vector>
 
-#include "board/model/SignalTable.h"
-#include "board/record/InputWatch.h"
+#include "board/Board.h"
+#include "tools/qorvio/InputWatch.h"
 #include "tools/qorvio/terminal/Table.h"
 
 namespace qor::tool {
@@ -24,8 +24,8 @@ class InputTable {
 /// Outputs bit by bit, one of them chosen, with the values that they were last given.
 class OutputTable {
  public:
-  /// The core must outlive it.
-  OutputTable(CoreSession& core, const SignalTable& signals);
+  /// The board must outlive it.
+  explicit OutputTable(Board& board);
 
   const std::vector<std::string>& lines() { return table_.lines(); }
 
@@ -48,7 +48,7 @@ class OutputTable {
   void format(std::size_t index);
   void write(const Assignment& assignment);
 
-  CoreSession& core_;
+  Board& board_;
   std::vector<Signal> outputs_;
   std::size_t chosen_ = 0;
   Table table_;

@@ -5,14 +5,14 @@
 #include <utility>
 #include <vector>
 
-#include "board/session/CoreSession.h"
+#include "board/record/Poller.h"
 
-namespace qor {
+namespace qor::tool {
 
 class InputWatch {
  public:
-  /// The core must outlive it.
-  InputWatch(CoreSession& core, std::vector<Signal> inputs);
+  /// The poller must outlive it.
+  InputWatch(Poller& poller, std::vector<Signal> inputs);
 
   /// Reads all inputs, for the next frame. Throws Failure, with the frame before as it was.
   void poll();
@@ -20,14 +20,14 @@ class InputWatch {
   /// Forgets what moved since the start.
   void clear();
 
-  const std::vector<Signal>& inputs() const { return inputs_; }
+  const std::vector<Signal>& inputs() const { return now_.inputs(); }
   std::uint64_t frames() const { return frames_; }
 
-  /// The frame.
-  const Sample& sample() const { return sample_; }
+  /// The frame of the input's core.
+  const Sample& sample(const Signal& input) const { return (*frame_)[input.core]; }
 
-  /// Its activity flags are those of all frames since the start or the last clear(); it has no values.
-  const Sample& sinceStart() const { return sinceStart_; }
+  /// Its activity flags are those of all frames since the start or the last clear().
+  const Sample& sinceStart(const Signal& input) const { return sinceStart_.pending()[input.core]; }
 
   /// Which inputs differ, in value or activity, from what they were at the call before: every one at first. An input
   /// may be named twice.
@@ -35,18 +35,14 @@ class InputWatch {
 
  private:
   void markAll();
-  void addActivity();
-  void findChanged();
 
-  CoreSession& core_;
-  std::vector<Signal> inputs_;
-  Sample next_;
-  Sample sample_;
-  Sample sinceStart_;
-  Bytes asyncDiffers_, syncDiffers_;
+  Poller& poller_;
+  Subscription now_;
+  Subscription sinceStart_;
+  const std::vector<Sample>* frame_;
   std::vector<std::size_t> changed_;
-  bool isCleared_ = false;
+  bool isCleared_ = true;
   std::uint64_t frames_ = 0;
 };
 
-}  // namespace qor
+}  // namespace qor::tool
