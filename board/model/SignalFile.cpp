@@ -184,11 +184,14 @@ std::string firstSignalFile(QOR_CORE_REF ref, const QORVIO_CORE_INFO& info) {
       "core = \"" +
       refText(ref) + "\"\n";
   for (Port port : ports) {
-    for (unsigned bit = 0; bit < widthOf(info, port); ++bit) {
-      const std::string number = std::to_string(bit), name = portName(port);
-      text.append("\n[[signal]]\nname = \"").append(name).append("_").append(number);
-      text.append("\"\nport = \"").append(name).append("\"\nbits = ").append(number).append("\n");
-    }
+    const unsigned width = widthOf(info, port);
+    if (width == 0) continue;
+    const std::string bits = width == 1 ? "0" : "\"" + std::to_string(width - 1) + ":0\"";
+    text.append("\n[[signal]]\nname = \"")
+        .append(portName(port))
+        .append("\"\nport = \"")
+        .append(portName(port));
+    text.append("\"\nbits = ").append(bits).append("\n");
   }
   return text;
 }

@@ -24,7 +24,7 @@ namespace qor {
 /// Throws WrongUse, "FILE:LINE: KEY: what is wrong".
 QORBOARD_API SignalTable readSignalFile(const std::string& path);
 
-/// A first signals file for a core: one bit signals for each port, ready to be renamed.
+/// A first signals file for a core: a signal for each port, ready to be renamed and divided.
 QORBOARD_API std::string firstSignalFile(QOR_CORE_REF ref, const QORVIO_CORE_INFO& info);
 
 }  // namespace qor

@@ -1,26 +1,21 @@
 #include "board/model/TomlPlace.h"
 
 #include <algorithm>
-#include <system_error>
+#include <stdexcept>
 
+#include "QorJtag_Host.h"
 #include "board/model/Errors.h"
-#include "os/Files.h"
 
 namespace qor {
 
 toml::table readToml(const std::string& path) {
-  constexpr std::size_t largest = std::size_t{16} << 20;
-  std::string text;
   try {
-    text = os::readFile(path, largest);
-  } catch (const std::system_error& error) {
-    throw WrongUse(error.what());
-  }
-  try {
-    return toml::parse(text);
+    return toml::parse(QorRT::readTomlText(path));
   } catch (const toml::parse_error& wrong) {
     throw WrongUse(path + ":" + std::to_string(wrong.source().begin.line) + ": " +
                    std::string(wrong.description()));
+  } catch (const std::runtime_error& error) {
+    throw WrongUse(error.what());
   }
 }
 

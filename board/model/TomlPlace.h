@@ -10,7 +10,7 @@
 
 namespace qor {
 
-/// Reads a file. Throws WrongUse, "FILE:LINE: what is wrong", when it cannot be read or is no TOML.
+/// Reads a file within the bounds of QorRT::readTomlText(). Throws WrongUse, "FILE:LINE: what is wrong", when it cannot be read or is no TOML.
 QORBOARD_API toml::table readToml(const std::string& path);
 
 class QORBOARD_API TomlPlace {

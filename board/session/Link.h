@@ -8,6 +8,7 @@
 
 #include "QorJtag_Host.h"
 #include "QorVIO.h"
+#include "QorVIO_CoreFields.h"
 #include "board/Export.h"
 
 namespace qor {

@@ -1,7 +1,7 @@
 #include <string>
-#include <utility>
 
 #include "QorVIO.h"
+#include "QorVIO_CoreFields.h"
 #include "src/api/CallFrame.h"
 #include "src/api/CoreAccess.h"
 
@@ -12,21 +12,6 @@ namespace {
 constexpr const char* noRecord = "Arg. to function QorVIO_getCoreInfo() failed:coreInfo!=0";
 constexpr const char* noMap = "Arg. to function QorVIO_getCoreInfo() failed:*coreInfo!=0";
 constexpr const char* wrongType = "QorVIO_getCoreInfo() for the wrong core type or non-existant core.";
-
-constexpr std::pair<const char*, unsigned QORVIO_CORE_INFO::*> namedFields[] = {
-    {"manufacturer_id", &QORVIO_CORE_INFO::manufacturer_id},
-    {"core_type", &QORVIO_CORE_INFO::core_type},
-    {"core_major_version", &QORVIO_CORE_INFO::core_major_version},
-    {"core_minor_version", &QORVIO_CORE_INFO::core_minor_version},
-    {"core_revision", &QORVIO_CORE_INFO::core_revision},
-    {"cg_major_version", &QORVIO_CORE_INFO::cg_major_version},
-    {"cg_minor_version", &QORVIO_CORE_INFO::cg_minor_version},
-    {"cg_minor_version_alpha", &QORVIO_CORE_INFO::cg_minor_version_alpha},
-    {"async_input_count", &QORVIO_CORE_INFO::async_input_count},
-    {"sync_input_count", &QORVIO_CORE_INFO::sync_input_count},
-    {"async_output_count", &QORVIO_CORE_INFO::async_output_count},
-    {"sync_output_count", &QORVIO_CORE_INFO::sync_output_count},
-};
 
 QORVIO_CORE_INFO readVioInfo(unsigned session, QOR_CORE_REF coreRef) {
   Qor_ByteBuffer statusWord = statusBuffer();
@@ -68,8 +53,8 @@ unsigned QorVIO_getCoreInfo(unsigned session, QOR_CORE_REF coreRef,
     QorJtagTargetLock lock(session, lockTimeout);
     QORVIO_CORE_INFO info = readVioInfo(session, coreRef);
     std::string text;
-    for (auto [key, field] : namedFields)
-      (*coreInfo)->insert_or_assign(key, Qor_NumberUtil::uInt2DecStr(info.*field, text));
+    for (const QorVIO_CoreField& each : QorVIO_coreFields)
+      (*coreInfo)->insert_or_assign(each.name, Qor_NumberUtil::uInt2DecStr(info.*each.member, text));
     return callSucceeded;
   });
 }

@@ -80,9 +80,9 @@ TEST(SignalFile, NamesSeveralCores) {
 TEST(Files, ThatAreNoneAreRefusedWithoutWaiting) {
   const File file("");
   std::filesystem::remove(file.path);
-  EXPECT_EQ(problemOfSignals(file.path), "cannot read the file " + file.path + ": No such file or directory");
+  EXPECT_EQ(problemOfSignals(file.path), " cannot be opened: No such file or directory");
   ASSERT_EQ(mkfifo(file.path.c_str(), 0600), 0);
-  EXPECT_EQ(problemOfSignals(file.path), "cannot read the file " + file.path + ": Invalid argument");
+  EXPECT_EQ(problemOfSignals(file.path), " cannot be opened: it is not a regular file");
   EXPECT_EQ(problemOf(file.path, [](const std::string& path) { qor::readPlayScript(path, {}); }),
             "cannot read the file " + file.path + ": Invalid argument");
 }

@@ -87,10 +87,10 @@ CORE   TYPE    VERSION  ASYNC OUT  SYNC OUT  ASYNC IN  SYNC IN
   [ "${lines[3]}" = "volts   0 V       ·         ·" ]
   qorvio --core 1.1.0 signals init >first.toml
   run qorvio --signals first.toml signals check
-  [ "$output" = "40 signals, all fit core 1.1.0" ]
+  [ "$output" = "4 signals, all fit core 1.1.0" ]
   run qorvio --signals first.toml --core 0.1.0 signals check
   [ "$status" -eq 2 ]
-  [ "${lines[0]}" = "async_in_8: bit 8 is beyond async_in, which has 8 bits" ]
+  [ "${lines[0]}" = "async_in: bit 15 is beyond async_in, which has 8 bits" ]
 }
 
 @test "wrong use says what is wrong, and ends with 2" {

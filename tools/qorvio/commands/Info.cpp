@@ -3,7 +3,6 @@
 #include <nlohmann/json.hpp>
 
 #include "board/model/CoreAddress.h"
-#include "board/model/CoreFields.h"
 #include "tools/qorvio/commands/Commands.h"
 #include "tools/qorvio/terminal/Table.h"
 
@@ -13,7 +12,7 @@ namespace {
 void print(const QORVIO_CORE_INFO& info, QOR_CORE_REF ref, bool asJson) {
   nlohmann::ordered_json json{{"core", refText(ref)}};
   Table table({"FIELD", refText(ref)});
-  for (const CoreField& field : coreFields) {
+  for (const QorRT::QorVIO_CoreField& field : QorRT::QorVIO_coreFields) {
     json[field.name] = info.*field.member;
     table.add({field.name, std::to_string(info.*field.member)});
   }

@@ -3,7 +3,6 @@
 #include <nlohmann/json.hpp>
 
 #include "board/model/CoreAddress.h"
-#include "board/model/CoreFields.h"
 #include "tools/qorvio/commands/Commands.h"
 #include "tools/qorvio/terminal/Table.h"
 
@@ -20,8 +19,8 @@ std::string hexadecimal(unsigned number) {
 
 json jsonOf(const FoundCore& core) {
   json entry{{"core", refText(core.ref)}};
-  for (const CoreField& field : coreFields) {
-    if (!core.isVio() && !field.generic) break;
+  for (const QorRT::QorVIO_CoreField& field : QorRT::QorVIO_coreFields) {
+    if (!core.isVio() && !field.isGeneric) break;
     entry[field.name] = core.info.*field.member;
   }
   return entry;

@@ -1,17 +1,20 @@
-// The twelve fields of a core's information by name.
+/// @file
+/// The twelve fields of a core's information by name, as QorVIO_getCoreInfo() names them.
 #pragma once
 
 #include "QorVIO_Records.h"
 
-namespace qor {
+namespace QorRT {
 
-struct CoreField {
-  const char* name;
-  unsigned QORVIO_CORE_INFO::*member;
-  bool generic;  ///< cores of other types have it too
+/// One of them.
+struct QorVIO_CoreField {
+  const char* name;                    ///< the entry of the map
+  unsigned QORVIO_CORE_INFO::*member;  ///< the field of the record
+  bool isGeneric;                      ///< cores of other types have it too
 };
 
-inline constexpr CoreField coreFields[] = {
+/// All of them, in the order of the record.
+inline constexpr QorVIO_CoreField QorVIO_coreFields[] = {
     {"manufacturer_id", &QORVIO_CORE_INFO::manufacturer_id, true},
     {"core_type", &QORVIO_CORE_INFO::core_type, true},
     {"core_major_version", &QORVIO_CORE_INFO::core_major_version, true},
@@ -26,4 +29,4 @@ inline constexpr CoreField coreFields[] = {
     {"sync_output_count", &QORVIO_CORE_INFO::sync_output_count, false},
 };
 
-}  // namespace qor
+}  // namespace QorRT
