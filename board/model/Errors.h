@@ -32,6 +32,12 @@ class QORBOARD_API Failure : public Error {
   using Error::Error;
 };
 
+/// A file could not be written: nothing more of it is worth keeping.
+class QORBOARD_API FileFailure : public Failure {
+ public:
+  using Failure::Failure;
+};
+
 /// What was waited for did not come in time; the text says what was seen last.
 class QORBOARD_API Timeout : public Error {
  public:

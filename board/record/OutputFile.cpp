@@ -28,7 +28,7 @@ void OutputFile::close() {
 }
 
 void OutputFile::fail() const {
-  throw Failure("cannot write the file " + path_ + ": " + std::generic_category().message(errno));
+  throw FileFailure("cannot write the file " + path_ + ": " + std::generic_category().message(errno));
 }
 
 }  // namespace qor

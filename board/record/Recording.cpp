@@ -123,6 +123,8 @@ void record(SampleWriter& writer, Poller& poller, const std::vector<Signal>& inp
   Recorder recorder(poller, inputs, writer);
   try {
     runPolls(poller, recorder, writer, limits, stop, onSample, recorded);
+  } catch (const FileFailure&) {
+    throw;
   } catch (const Failure&) {  // what was recorded until then is worth keeping
     writer.end();
     throw;
@@ -136,6 +138,8 @@ Recorded recordTo(const std::string& path, Poller& poller, const std::vector<Sig
   Recorded recorded;
   try {
     record(*writer, poller, inputs, limits, recorded, stop, onSample);
+  } catch (const FileFailure&) {
+    throw;
   } catch (const Failure& failure) {
     throw Failure(std::string(failure.what()) + "; kept " + summary(recorded, path));
   }
