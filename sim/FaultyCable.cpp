@@ -176,7 +176,7 @@ void FaultyCable::pass(const std::vector<QorRT::Qor_Scan>& scans, PassingExchang
     const QorRT::Qor_Scan& scan = scans[i];
     const Bits& sent = exchange[i].sent;
     if (!exchange[i].reachesChip) continue;
-    if (scan.kind == Kind::ir) whole_->scanIr(scan.device, scan.userChain);
+    if (scan.kind == Kind::ir) whole_->scanIr(scan.device, scan.userChain, scan.always);
     if (scan.kind == Kind::dr)
       numbers[i] = whole_->scanDr(scan.device, pack(sent), sent.size(), scan.capture);
     if (scan.kind == Kind::idle) whole_->idle(scan.cycles);

@@ -3,7 +3,7 @@
 
 namespace QorRT {
 
-std::unique_ptr<Qor_Cable> openSimulatedCable(const std::string& boardFile) {
+std::unique_ptr<Qor_Cable> openSimulatedCable(const std::string& boardFile, StopFunction) {
   return (boardFile.empty() ? qorsim::demoBoard() : qorsim::boardFile(boardFile)).cable();
 }
 

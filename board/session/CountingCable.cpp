@@ -21,7 +21,7 @@ std::size_t CountingCable::forward(const Qor_Scan& scan) {
     case Qor_Scan::Kind::ir:
       ++traffic_.scans;
       traffic_.bits += devices()[scan.device].irLength;
-      cable_->scanIr(scan.device, scan.userChain);
+      cable_->scanIr(scan.device, scan.userChain, scan.always);
       break;
     case Qor_Scan::Kind::dr:
       ++traffic_.scans;

@@ -24,15 +24,17 @@ using QorJtag_MessageHandler = std::function<void(unsigned type, const char* tex
 /// Opens a session on the cable that the URL names: "sim:", "sim:BOARD.toml", "rbb:HOST:PORT",
 /// "openocd:HOST:PORT" or "openocd:?config=FILE"; behind the last three may stand "?board=FILE" and
 /// "timeout=SECONDS", with "&" between. Returns its handle. Throws, and opens nothing, when the URL is malformed
-/// or of an unknown kind, or its cable cannot be opened. Of a server, every wait is bounded; a connection that
-/// breaks fails one call, and the next call opens it anew.
+/// or of an unknown kind, or its cable cannot be opened. Of a server, every exchange has a deadline: the time of
+/// the URL (5 s) and what its bits take at 20 kHz. A connection that breaks fails one call, and the next call opens
+/// it anew.
 extern "C" QOR_API unsigned QorJtag_session_open(const char* cableUrl);
 
 namespace QorRT {
 
-/// Opens the cable of a URL without a session, for a host that puts a cable of its own around it. Throws as
+/// Opens the cable of a URL without a session, for a host that puts a cable of its own around it or has a `stop`
+/// function, which is called by the thread that waits and must be of use as long as the cable. Throws as
 /// QorJtag_session_open() does.
-QOR_API std::unique_ptr<Qor_Cable> openCable(const char* url);
+QOR_API std::unique_ptr<Qor_Cable> openCable(const char* url, StopFunction stop = {});
 
 /// The text of a TOML file, for a host that parses files of its own: at most 1 MB, with no more than 16 levels of
 /// nesting, so that its parser needs little of the stack. Throws runtime_error, "FILE: what is wrong" or "FILE:LINE:

@@ -1,6 +1,7 @@
 #include <stdexcept>
 #include <string>
 #include <string_view>
+#include <utility>
 
 #include "QorJtag_Host.h"
 #include "platform/jtag/cable/Qor_CableFactories.h"
@@ -10,7 +11,7 @@ namespace {
 
 struct CableKind {
   std::string_view name;
-  std::unique_ptr<Qor_Cable> (*open)(const std::string& rest);
+  std::unique_ptr<Qor_Cable> (*open)(const std::string& rest, StopFunction stop);
 };
 
 constexpr CableKind cableKinds[] = {
@@ -27,7 +28,7 @@ std::string knownKinds() {
 
 }  // namespace
 
-std::unique_ptr<Qor_Cable> openCable(const char* url) {
+std::unique_ptr<Qor_Cable> openCable(const char* url, StopFunction stop) {
   if (url == nullptr) throw std::logic_error("the cable URL is null");
   const std::string_view text(url);
   if (text.empty()) throw std::logic_error("the cable URL is empty");
@@ -37,7 +38,7 @@ std::unique_ptr<Qor_Cable> openCable(const char* url) {
   }
   const std::string_view name = text.substr(0, colon);
   for (const CableKind& kind : cableKinds) {
-    if (kind.name == name) return kind.open(std::string(text.substr(colon + 1)));
+    if (kind.name == name) return kind.open(std::string(text.substr(colon + 1)), std::move(stop));
   }
   throw std::logic_error("the cable URL \"" + std::string(text) + "\" is of the unknown kind \"" +
                          std::string(name) + "\"; known: " + knownKinds());

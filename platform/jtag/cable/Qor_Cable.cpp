@@ -24,7 +24,7 @@ void requireCaptures(const std::vector<Qor_Scan>& scans) {
 
 Qor_Cable::~Qor_Cable() = default;
 
-void Qor_Cable::scanIr(unsigned device, unsigned userChain) {
+void Qor_Cable::scanIr(unsigned device, unsigned userChain, bool always) {
   requireDevice(device);
   if (userChain < 1 || userChain > userChainCount) {
     throw std::logic_error("device " + std::to_string(device) + " has no user chain " +
@@ -33,6 +33,7 @@ void Qor_Cable::scanIr(unsigned device, unsigned userChain) {
   Qor_Scan scan{Qor_Scan::Kind::ir};
   scan.device = device;
   scan.userChain = userChain;
+  scan.always = always;
   queue(std::move(scan));
 }
 

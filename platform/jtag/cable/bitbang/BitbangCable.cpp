@@ -6,11 +6,12 @@
 
 #include "platform/jtag/cable/Qor_CableFactories.h"
 #include "platform/jtag/cable/wire/ChainProbe.h"
+#include "platform/jtag/cable/wire/Stream.h"
 
 namespace QorRT {
 namespace {
 
-constexpr char ask = 'R', quit = 'Q';
+constexpr char ask = 'R', quit = 'Q', releaseResets = 'r';
 
 // '0' to '7': TCK, TMS and TDI as the bits of a number.
 char pins(bool tck, unsigned char each) {
@@ -40,22 +41,19 @@ std::vector<unsigned char> packed(std::string_view answers) {
 
 }  // namespace
 
-std::unique_ptr<Qor_Cable> openBitbangCable(const std::string& rest) {
-  WireUrl url = parseWireUrl("rbb", rest);
+std::unique_ptr<Qor_Cable> openBitbangCable(const std::string& rest, StopFunction stop) {
+  WireUrl url = parseWireUrl("rbb", rest, {"board", "timeout"});
   if (url.endpoint.host.empty()) throw std::logic_error("the cable URL \"rbb:" + rest + "\" names no server");
-  if (!url.config.empty())
-    throw std::logic_error("the cable URL \"rbb:" + rest +
-                           "\" has the option \"config\", which needs openocd:");
-  return std::make_unique<BitbangCable>(std::move(url));
+  return std::make_unique<BitbangCable>(std::move(url), std::move(stop));
 }
 
-BitbangCable::BitbangCable(WireUrl url) : url_(std::move(url)) {
+BitbangCable::BitbangCable(WireUrl url, StopFunction stop) : WireCable(std::move(url), std::move(stop)) {
   open();
 }
 
 BitbangCable::~BitbangCable() {
   try {
-    if (stream_) stream_->exchange(std::string(1, quit), 0);
+    if (stream_) stream_->exchange(std::string(1, quit), 0, deadlineOf(0));
   } catch (const std::exception&) {  // the server has gone first
   }
 }
@@ -64,24 +62,27 @@ void BitbangCable::disconnect() noexcept {
   stream_.reset();
 }
 
+// The client before may have left a reset asserted.
 std::vector<WireDevice> BitbangCable::connect() {
-  stream_ = std::make_unique<TcpStream>(url_.endpoint, url_.timeout);
-  TckSequence idcodes;
+  TckSequence idcodes, irs;
   idcodes.reset();
   idcodes.scanDr(idcodeProbe(), true);
-  std::vector<Qor_Device> found = idcodesIn(packed(send(idcodes)));
-  TckSequence irs;
   irs.scanIr(irProbe(), true);
-  const std::size_t irBits = readIrLengths(found, packed(send(irs)));
-  std::vector<WireDevice> devices = describedDevices(found, url_.board);
-  requireIrBits(devices, irBits);
+  const Deadline deadline = deadlineOf(idcodes.tcks().size() + irs.tcks().size());
+  stream_ = std::make_unique<Stream>(url().endpoint, deadline, stop());
+  std::vector<Qor_Device> found =
+      idcodesIn(packed(send(releaseResets + charactersOf(idcodes), idcodes.captureCount(), deadline)));
+  const std::vector<unsigned char> irCapture = packed(send(charactersOf(irs), irs.captureCount(), deadline));
+  readIrLengths(found, irCapture);
+  std::vector<WireDevice> devices = describedDevices(found, board());
+  requireIrs(devices, irCapture);
   return devices;
 }
 
-void BitbangCable::exchange(std::vector<Qor_Scan>& scans) {
+void BitbangCable::exchange(std::vector<Qor_Scan>& scans, const Deadline& deadline) {
   TckSequence sequence;
   for (const Qor_Scan& scan : scans) append(sequence, scan);
-  const std::string answers = send(sequence);
+  const std::string answers = send(charactersOf(sequence), sequence.captureCount(), deadline);
   std::string_view left = answers;
   for (Qor_Scan& scan : scans) {
     if (!scan.capture) continue;
@@ -91,9 +92,10 @@ void BitbangCable::exchange(std::vector<Qor_Scan>& scans) {
   }
 }
 
-void BitbangCable::append(TckSequence& sequence, const Qor_Scan& scan) const {
+void BitbangCable::append(TckSequence& sequence, const Qor_Scan& scan) {
   switch (scan.kind) {
     case Qor_Scan::Kind::ir:
+      if (isSelected(scan)) return;
       return sequence.scanIr(
           chainIrScan(devices(), scan.device, wireDevices()[scan.device].userOpcodes[scan.userChain - 1]));
     case Qor_Scan::Kind::dr:
@@ -105,12 +107,11 @@ void BitbangCable::append(TckSequence& sequence, const Qor_Scan& scan) const {
 }
 
 // The answers to the captures, without the one that says that all has run.
-std::string BitbangCable::send(const TckSequence& sequence) {
-  std::string answers =
-      stream_->exchange(charactersOf(sequence), sequence.captureCount() + 1, timeOf(sequence.tcks().size()));
+std::string BitbangCable::send(const std::string& text, std::size_t captureCount, const Deadline& deadline) {
+  std::string answers = stream_->exchange(text, captureCount + 1, deadline);
   const std::size_t odd = answers.find_first_not_of("01");
   if (odd != answers.npos) {
-    throw std::runtime_error(url_.endpoint.text() + " answered with the byte " +
+    throw std::runtime_error(url().endpoint.text() + " answered with the byte " +
                              std::to_string(static_cast<unsigned char>(answers[odd])) +
                              " where 0 or 1 was due");
   }

@@ -5,29 +5,27 @@
 #include <string>
 #include <vector>
 
-#include "QorExport.h"
 #include "platform/jtag/cable/bitbang/TckSequence.h"
 #include "platform/jtag/cable/wire/WireCable.h"
-#include "platform/jtag/cable/wire/WireUrl.h"
 
 namespace QorRT {
 
-/// A queue is one exchange, and has run when it is over: it ends with a question.
-class QOR_API BitbangCable : public WireCable {
+/// A queue is one exchange, and has run when it is over: it ends with a question. The server has one client, so an
+/// instruction stays selected.
+class BitbangCable : public WireCable {
  public:
   /// Throws runtime_error when the server cannot be reached or no chain that fits the board file answers.
-  explicit BitbangCable(WireUrl url);
+  BitbangCable(WireUrl url, StopFunction stop);
   ~BitbangCable() override;
 
  private:
   std::vector<WireDevice> connect() override;
-  void exchange(std::vector<Qor_Scan>& scans) override;
+  void exchange(std::vector<Qor_Scan>& scans, const Deadline& deadline) override;
   void disconnect() noexcept override;
-  void append(TckSequence& sequence, const Qor_Scan& scan) const;
-  std::string send(const TckSequence& sequence);
+  void append(TckSequence& sequence, const Qor_Scan& scan);
+  std::string send(const std::string& text, std::size_t captureCount, const Deadline& deadline);
 
-  WireUrl url_;
-  std::unique_ptr<TcpStream> stream_;  // null without a connection
+  std::unique_ptr<Stream> stream_;  // null without a connection
 };
 
 }  // namespace QorRT

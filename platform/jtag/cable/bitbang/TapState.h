@@ -1,7 +1,6 @@
 // The state machine of a TAP, as the standard draws it: pure functions, for cables that drive TMS themselves.
 #pragma once
 
-#include "QorExport.h"
 
 namespace QorRT {
 
@@ -36,9 +35,9 @@ struct TmsPath {
 constexpr TmsPath tmsReset{0x1F, 5};
 
 /// The state after one TCK.
-QOR_API TapState nextState(TapState state, bool tms);
+TapState nextState(TapState state, bool tms);
 
 /// The shortest way from one state to another; none from a state to itself.
-QOR_API TmsPath tmsPath(TapState from, TapState to);
+TmsPath tmsPath(TapState from, TapState to);
 
 }  // namespace QorRT

@@ -5,13 +5,12 @@
 #include <vector>
 
 #include "ChainScan.h"
-#include "QorExport.h"
 #include "platform/jtag/cable/bitbang/TapState.h"
 
 namespace QorRT {
 
 /// Grows at its end, and knows in which state its last TCK leaves the chain. It begins in Run-Test/Idle.
-class QOR_API TckSequence {
+class TckSequence {
  public:
   /// The bits of one TCK: TDI and TMS at its rising edge, and whether TDO is wanted there.
   static constexpr unsigned char tdi = 1, tms = 2, capture = 4;

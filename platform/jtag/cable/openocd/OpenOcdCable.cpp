@@ -1,6 +1,5 @@
 #include "platform/jtag/cable/openocd/OpenOcdCable.h"
 
-#include <algorithm>
 #include <random>
 #include <stdexcept>
 #include <utility>
@@ -15,9 +14,8 @@ constexpr char endOfText = 0x1A;
 // A command of several megabytes is never answered.
 constexpr std::size_t longestCommand = 1 << 20;
 
-std::size_t tcksOf(const Qor_Scan& scan) {
-  return scan.kind == Qor_Scan::Kind::idle ? scan.cycles : scan.bitCount + 32;
-}
+constexpr std::size_t mostText = 1 << 16;  // bytes of an answer that is no capture
+constexpr Seconds startUp{10};             // for a server that looks for its adapter
 
 // A scan of no device or of another than the last IR scan's would end the server.
 void requireOrder(const std::vector<Qor_Scan>& scans) {
@@ -41,16 +39,19 @@ std::vector<Qor_Device> headsOf(const std::vector<OpenOcdTap>& taps) {
 
 }  // namespace
 
-std::unique_ptr<Qor_Cable> openOpenOcdCable(const std::string& rest) {
-  WireUrl url = parseWireUrl("openocd", rest);
-  if (url.endpoint.host.empty() == url.config.empty())
+std::unique_ptr<Qor_Cable> openOpenOcdCable(const std::string& rest, StopFunction stop) {
+  const bool ours = rest.empty() || rest.front() == '?';
+  WireUrl url = parseWireUrl("openocd", rest,
+                             ours ? std::vector<std::string>{"board", "config", "timeout"}
+                                  : std::vector<std::string>{"board", "timeout"});
+  if (ours && url.config.empty())
     throw std::logic_error("the cable URL \"openocd:" + rest +
                            "\" must name a server, HOST:PORT, or a configuration to start one, ?config=FILE");
-  return std::make_unique<OpenOcdCable>(std::move(url));
+  return std::make_unique<OpenOcdCable>(std::move(url), std::move(stop));
 }
 
-OpenOcdCable::OpenOcdCable(WireUrl url)
-    : url_(std::move(url)), procedure_("qor_" + std::to_string(std::random_device()())) {
+OpenOcdCable::OpenOcdCable(WireUrl url, StopFunction stop)
+    : WireCable(std::move(url), std::move(stop)), muteLog_("qor_" + std::to_string(std::random_device()())) {
   open();
 }
 
@@ -62,62 +63,82 @@ OpenOcdCable::~OpenOcdCable() {
 // somebody else's is left as it was, if it still answers.
 void OpenOcdCable::disconnect() noexcept {
   try {
-    if (answers_ && !server_) ask("catch {rename " + procedure_ + " {}}\n" + loudCommand());
+    if (answers_ && connection_)
+      ask("catch {rename " + muteLog_ + " {}}\n" + restoreLogLevel(), mostText, deadlineOf(0));
   } catch (const std::exception&) {  // it has gone first
   }
   answers_ = false;
-  stream_.reset();
+  stream_ = nullptr;
+  connection_.reset();
   server_.reset();
-  known_.clear();
 }
 
 std::vector<WireDevice> OpenOcdCable::connect() {
-  stream_ = reach();
+  if (!url().config.empty()) return startServer();
+  const Deadline deadline = deadlineOf(0);
+  connection_ = std::make_unique<Stream>(url().endpoint, deadline, stop());
+  stream_ = connection_.get();
+  ask("proc " + muteLog_ + " {} {" + muteLog() + "}\n" + muteLog_, mostText, deadline);
+  return requireChain(deadline);
+}
+
+std::vector<WireDevice> OpenOcdCable::startServer() {
+  const Deadline deadline(url().timeout + startUp);
+  server_ = std::make_unique<OpenOcdServer>(url().config, stop());
+  stream_ = &server_->stream();
   try {
-    ask(silenceCommand());
-    taps_ = tapsIn(ask("capture scan_chain"));
-  } catch (const std::runtime_error&) {
-    if (server_) server_->requireRunning();
-    throw;
+    ask("debug_level -3", mostText, deadline);
+  } catch (const std::runtime_error& error) {
+    server_->explain(error.what());
   }
-  requireTaps(taps_, url_.board);
-  return describedDevices(headsOf(taps_), url_.board);
+  return requireChain(deadline);
 }
 
-std::unique_ptr<TcpStream> OpenOcdCable::reach() {
-  if (url_.config.empty()) return std::make_unique<TcpStream>(url_.endpoint, url_.timeout);
-  server_ = std::make_unique<OpenOcdServer>(url_.config);
-  return server_->connect(url_.timeout);
+std::vector<WireDevice> OpenOcdCable::requireChain(const Deadline& deadline) {
+  taps_ = tapsIn(ask("capture scan_chain", mostText, deadline));
+  requireTaps(taps_, board());
+  if (server_) server_->requireNoDoubt();
+  if (ask(checkCommand(taps_), mostText, deadline) != "0")
+    throw std::runtime_error("an IR of the chain does not capture what the server's configuration says");
+  return describedDevices(headsOf(taps_), board());
 }
 
-void OpenOcdCable::exchange(std::vector<Qor_Scan>& scans) {
+void OpenOcdCable::exchange(std::vector<Qor_Scan>& scans, const Deadline& deadline) {
   requireOrder(scans);
-  std::string commands;
-  std::size_t tcks = 0;
+  std::vector<OpenOcdStep> steps;
+  std::size_t size = 0;
   auto first = scans.begin();  // of those whose commands are not sent yet
   for (auto scan = scans.begin(); scan != scans.end(); ++scan) {
-    appendStep(commands, taps_, wireDevices(), *scan);
-    tcks += tcksOf(*scan);
-    if (commands.size() < longestCommand && scan + 1 != scans.end()) continue;
-    CaptureReader captures(ask(commandFor(commands), tcks));
-    for (; first != scan + 1; ++first)
-      if (first->capture) first->in = captures.next(first->bitCount);
-    captures.finish();
-    commands.clear();
-    tcks = 0;
+    if (!isLeftOut(*scan)) {
+      steps.push_back({stepCommand(taps_, wireDevices(), *scan), scan->capture ? scan->bitCount : 0});
+      size += steps.back().command.size();
+    }
+    if (size < longestCommand && scan + 1 != scans.end()) continue;
+    runBatch(steps, first, scan + 1, deadline);
+    first = scan + 1;
+    steps.clear();
+    size = 0;
   }
 }
 
-// A server parses a procedure once: who polls sends the same queue again and again.
-std::string OpenOcdCable::commandFor(const std::string& commands) {
-  if (commands == known_) return procedure_;
-  known_ = commands;
-  return procedureOf(procedure_, commands) + "\n" + procedure_;
+// Who has a server alone knows what is selected, and has muted its log for good.
+bool OpenOcdCable::isLeftOut(const Qor_Scan& scan) {
+  return server_ && scan.kind == Qor_Scan::Kind::ir && isSelected(scan);
 }
 
-std::string OpenOcdCable::ask(const std::string& command, std::size_t tcks) {
+void OpenOcdCable::runBatch(const std::vector<OpenOcdStep>& steps, Scans first, Scans end,
+                            const Deadline& deadline) {
+  if (steps.empty()) return;
+  const std::string start = server_ ? "" : muteLog_ + "\n";
+  CaptureReader captures(ask(start + batchOf(steps), mostAnswer(steps), deadline));
+  for (; first != end; ++first)
+    if (first->capture) first->in = captures.next(first->bitCount);
+  captures.finish();
+}
+
+std::string OpenOcdCable::ask(const std::string& command, std::size_t most, const Deadline& deadline) {
   answers_ = false;
-  std::string answer = stream_->ask(command + endOfText, endOfText, timeOf(tcks));
+  std::string answer = stream_->ask(command + endOfText, endOfText, most, deadline);
   answers_ = true;
   return answer;
 }

@@ -1,73 +1,50 @@
 #include "platform/jtag/cable/openocd/OpenOcdServer.h"
 
-#include <fcntl.h>
-#include <signal.h>
-#include <spawn.h>
-#include <sys/wait.h>
-#include <unistd.h>
-
 #include <algorithm>
 #include <array>
-#include <cerrno>
-#include <chrono>
+#include <boost/asio/buffer.hpp>
+#include <boost/asio/local/connect_pair.hpp>
+#include <boost/asio/local/stream_protocol.hpp>
+#include <boost/process/child.hpp>
+#include <boost/process/environment.hpp>
+#include <boost/process/extend.hpp>
+#include <boost/process/group.hpp>
+#include <boost/process/io.hpp>
+#include <boost/process/pipe.hpp>
+#include <filesystem>
+#include <sstream>
 #include <stdexcept>
-#include <system_error>
+#include <string_view>
 #include <thread>
+#include <utility>
+#include <vector>
+
+#include "platform/jtag/cable/wire/StreamLink.h"
 
 namespace QorRT {
 namespace {
 
-using std::chrono::milliseconds, std::chrono::steady_clock;
+namespace process = boost::process;
+using Local = boost::asio::local::stream_protocol;
+using std::chrono::milliseconds;
 
-constexpr milliseconds glance{20}, startUp{10000}, lastWords{200}, farewell{1500};
+constexpr milliseconds pollInterval{5}, exitGrace{200}, stopTimeout{1000};
+constexpr std::size_t logBytes = 16384;  // what is kept of its log
+constexpr std::string_view doubt = "Warn : Bypassing JTAG setup events due to errors";
 
-[[noreturn]] void fail(const std::string& what, int error) {
-  throw std::runtime_error(what + ": " + std::generic_category().message(error));
-}
-
-// Runs openocd with its arguments until it ends, or until nobody holds the other end of the pipe at 3 any more: so
-// that it ends with its host, however that ends.
-constexpr const char* keeper = R"(
-trap "" INT QUIT
-openocd "$@" 3<&- &
-server=$!
-{ read -r _; kill $server; sleep 0.5; kill -9 $server; } <&3 >/dev/null 2>&1 &
-watch=$!
-wait $server
-kill -9 $watch
-)";
-
-/// What the new process gets instead of what its host has: files, signals.
-class SpawnSettings {
- public:
-  SpawnSettings(int log, int pipe) {
-    posix_spawn_file_actions_init(&files_);
-    posix_spawn_file_actions_addopen(&files_, STDIN_FILENO, "/dev/null", O_RDONLY, 0);
-    posix_spawn_file_actions_adddup2(&files_, log, STDOUT_FILENO);
-    posix_spawn_file_actions_adddup2(&files_, log, STDERR_FILENO);
-    posix_spawn_file_actions_adddup2(&files_, pipe, 3);
-    posix_spawnattr_init(&attributes_);
-    sigset_t none, all;
-    sigemptyset(&none);
-    sigfillset(&all);
-    posix_spawnattr_setsigmask(&attributes_, &none);
-    posix_spawnattr_setsigdefault(&attributes_, &all);
-    posix_spawnattr_setflags(&attributes_, POSIX_SPAWN_SETSIGMASK | POSIX_SPAWN_SETSIGDEF);
+/// A program that inherits nothing but its standard streams.
+struct InheritNothing : process::extend::handler {
+  template <class Executor>
+  void on_exec_setup(Executor&) const {
+    os::inheritNothing();
   }
-  ~SpawnSettings() {
-    posix_spawnattr_destroy(&attributes_);
-    posix_spawn_file_actions_destroy(&files_);
-  }
-  SpawnSettings(const SpawnSettings&) = delete;
-  SpawnSettings& operator=(const SpawnSettings&) = delete;
-
-  const posix_spawn_file_actions_t* files() const { return &files_; }
-  const posix_spawnattr_t* attributes() const { return &attributes_; }
-
- private:
-  posix_spawn_file_actions_t files_{};
-  posix_spawnattr_t attributes_{};
 };
+
+std::string programPath(const std::string& name) {
+  for (const auto& folder : boost::this_process::path())
+    if (std::filesystem::is_regular_file(folder / name)) return (folder / name).string();
+  throw std::runtime_error(name + " cannot be found in the folders of PATH");
+}
 
 // Quoted for Tcl, whatever the name is.
 std::string quoted(const std::string& text) {
@@ -79,100 +56,128 @@ std::string quoted(const std::string& text) {
   return result + '"';
 }
 
-// The arguments as the system wants them.
-template <std::size_t count>
-int spawnShell(pid_t& process, const SpawnSettings& settings, std::array<std::string, count> arguments) {
-  std::array<char*, count + 1> pointers{};
-  std::transform(arguments.begin(), arguments.end(), pointers.begin(),
-                 [](std::string& each) { return each.data(); });
-  return posix_spawn(&process, "/bin/sh", settings.files(), settings.attributes(), pointers.data(), environ);
+/// Two sockets that are connected to each other: one for us, one for a program.
+Socket pairOf(Socket& ours) {
+  Local::socket first(ours.get_executor()), second(ours.get_executor());
+  boost::asio::local::connect_pair(first, second);
+  keepPrivate(ours, first, Local());
+  Socket theirs(ours.get_executor());
+  keepPrivate(theirs, second, Local());
+  return theirs;
 }
+
+bool startsWith(std::string_view line, std::string_view start) {
+  return line.substr(0, start.size()) == start;
+}
+
+/// What the lines of a log say of a failure.
+class Complaints {
+ public:
+  void add(std::string line) {
+    line.erase(line.find_last_not_of(" \t\r") + 1);
+    if (startsWith(line, "Error: ")) errors_.push_back(line.substr(7));
+    if (startsWith(line, doubt)) errors_.push_back(line.substr(7));
+    for (const char* const start :
+         {"Error:", "Warn :", "Info :", "Debug:", "Open On-Chip", "Licensed under", "For bug", "\t"})
+      if (startsWith(line, start)) return;
+    if (!line.empty()) others_.push_back(std::move(line));
+  }
+
+  /// The errors or, without any, the last lines.
+  std::string text() const {
+    const std::vector<std::string>& lines = errors_.empty() ? others_ : errors_;
+    std::string text;
+    for (std::size_t i = lines.size() - std::min(lines.size(), mostLines); i < lines.size(); ++i)
+      text.append(text.empty() ? "" : "; ").append(lines[i]);
+    return text;
+  }
+
+ private:
+  static constexpr std::size_t mostLines = 4;
+
+  std::vector<std::string> errors_, others_;
+};
 
 }  // namespace
 
-OpenOcdServer::OpenOcdServer(const std::string& configFile) : log_(std::tmpfile()) {
-  if (!log_) fail("no temporary file", errno);
-  fcntl(fileno(log_.get()), F_SETFL, O_APPEND);  // the server shares our place in it
-  std::array<int, 2> ends{};
-  if (pipe2(ends.data(), O_CLOEXEC) != 0) fail("no pipe", errno);
-  const std::string ports = "bindto 127.0.0.1; telnet_port disabled; gdb_port disabled; tcl_port 0";
-  const SpawnSettings settings(fileno(log_.get()), ends[0]);
-  const int error = spawnShell<8>(
-      process_, settings, {"sh", "-c", keeper, "openocd", "-c", ports, "-c", "source " + quoted(configFile)});
-  close(ends[0]);
-  lifeline_ = ends[1];
-  if (error == 0) return;
-  close(lifeline_);
-  fail("openocd cannot be started", error);
-}
+struct OpenOcdServer::Process {
+  explicit Process(boost::asio::io_context& io) : log(io) {}
 
-OpenOcdServer::~OpenOcdServer() {
-  close(lifeline_);
-  const auto end = steady_clock::now() + farewell;
-  while (runs() && steady_clock::now() < end) std::this_thread::sleep_for(glance);
-}
-
-std::unique_ptr<TcpStream> OpenOcdServer::connect(TcpStream::Seconds patience) {
-  const auto end = steady_clock::now() + startUp;
-  while (runs()) {
-    if (const std::string port = tclPort(); !port.empty())
-      return std::make_unique<TcpStream>(Endpoint{"127.0.0.1", port}, patience);
-    if (steady_clock::now() >= end) throw std::runtime_error("openocd opens no port; it says: " + errors());
-    std::this_thread::sleep_for(glance);
+  // Reads the log whenever the connection is served, so that the server never waits for it.
+  void drain() {
+    log.async_read_some(boost::asio::buffer(block),
+                        [this](boost::system::error_code error, std::size_t count) {
+                          if (error) return;
+                          text.append(block.data(), count);
+                          if (text.size() > 2 * logBytes) text.erase(0, text.size() - logBytes);
+                          drain();
+                        });
   }
-  throw std::runtime_error("openocd has ended; it says: " + errors());
+
+  Socket log;
+  std::array<char, 4096> block{};
+  std::string text;  // the end of the log
+  process::child child;
+};
+
+OpenOcdServer::OpenOcdServer(const std::string& configFile, StopFunction stop)
+    : stream_(std::make_unique<Stream::Link>(), "openocd", std::move(stop)),
+      process_(std::make_unique<Process>(stream_.link().io)) {
+  Socket talk = pairOf(stream_.link().socket), log = pairOf(process_->log);
+  process::pipe in(os::privateCopy(talk.native_handle()), -1), out(-1, talk.release()),
+      errors(-1, log.release());
+  const std::string ports = "bindto 127.0.0.1; telnet_port disabled; gdb_port disabled; tcl_port pipe";
+  process::group ownGroup;  // Ctrl-C in the terminal is for the host alone
+  std::error_code error;
+  process_->child = process::child(programPath("openocd"), "-c", ports, "-c", "source " + quoted(configFile),
+                                   process::std_in<in, process::std_out> out, process::std_err > errors,
+                                   ownGroup, InheritNothing(), error);
+  if (error) throw std::runtime_error("openocd cannot be started: " + error.message());
+  ownGroup.detach();
+  process_->drain();
 }
 
-// It closes its connections a moment before it ends.
-void OpenOcdServer::requireRunning() {
-  const auto end = steady_clock::now() + lastWords;
-  while (runs() && steady_clock::now() < end) std::this_thread::sleep_for(glance);
-  if (!runs()) throw std::runtime_error("openocd has ended; it says: " + errors());
+// The end of its input ends it, though a copy of this process may have the sockets too.
+OpenOcdServer::~OpenOcdServer() {
+  boost::system::error_code ignored;
+  stream_.link().socket.shutdown(Socket::shutdown_both, ignored);
+  std::error_code none;
+  if (!endsWithin(stopTimeout)) process_->child.terminate(none);
+  process_->log.close(ignored);
+  stream_.link().io.restart();
+  stream_.link().io.poll();  // the reading of the log refers to us
 }
 
 // A host that ignores SIGCHLD has nobody to wait for: that tells the same.
-bool OpenOcdServer::runs() {
-  if (process_ >= 0 && waitpid(process_, nullptr, WNOHANG) != 0) process_ = -1;
-  return process_ >= 0;
+bool OpenOcdServer::endsWithin(milliseconds time) {
+  const auto end = Deadline::Clock::now() + time;
+  std::error_code none;
+  while (process_->child.running(none)) {
+    if (Deadline::Clock::now() >= end) return false;
+    std::this_thread::sleep_for(pollInterval);
+    stream_.link().io.restart();
+    stream_.link().io.poll();
+  }
+  return true;
 }
 
-// As its log tells it; empty as long as it does not.
-std::string OpenOcdServer::tclPort() const {
-  constexpr std::string_view before = "Listening on port ", behind = " for tcl connections";
-  for (const std::string& line : logLines()) {
-    const std::size_t start = line.find(before), end = line.find(behind);
-    if (start != line.npos && end != line.npos)
-      return line.substr(start + before.size(), end - start - before.size());
-  }
-  return "";
+void OpenOcdServer::explain(const std::string& seen) {
+  throw std::runtime_error((endsWithin(exitGrace) ? "openocd has ended" : seen) + "; it says: " + errors());
 }
 
-// What its log tells of errors, or else the last line.
-std::string OpenOcdServer::errors() const {
-  constexpr std::string_view mark = "Error: ";
-  std::string errors, last;
-  for (const std::string& line : logLines()) {
-    if (line.rfind(mark, 0) == 0) errors.append(errors.empty() ? "" : "; ").append(line.substr(mark.size()));
-    if (!line.empty()) last = line;
-  }
-  return errors.empty() ? last : errors;
+void OpenOcdServer::requireNoDoubt() {
+  const std::string said = errors();
+  if (process_->text.find(doubt) != std::string::npos)
+    throw std::runtime_error("openocd does not trust its chain; it says: " + said);
 }
 
-// The whole lines that are there, without the blanks at their ends.
-std::vector<std::string> OpenOcdServer::logLines() const {
-  std::vector<std::string> lines;
-  std::string text;
-  std::rewind(log_.get());
-  for (int each = std::fgetc(log_.get()); each != EOF; each = std::fgetc(log_.get())) {
-    if (each != '\n') {
-      text += static_cast<char>(each);
-      continue;
-    }
-    text.erase(text.find_last_not_of(" \r") + 1);
-    lines.push_back(std::move(text));
-    text.clear();
-  }
-  return lines;
+std::string OpenOcdServer::errors() {
+  stream_.link().io.restart();
+  stream_.link().io.poll();
+  Complaints complaints;
+  std::istringstream lines(process_->text);
+  for (std::string line; std::getline(lines, line);) complaints.add(std::move(line));
+  return complaints.text();
 }
 
 }  // namespace QorRT

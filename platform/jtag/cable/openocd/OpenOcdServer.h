@@ -1,51 +1,44 @@
 // An OpenOCD server of our own.
 #pragma once
 
-#include <sys/types.h>
-
-#include <cstdio>
 #include <memory>
 #include <string>
-#include <vector>
 
-#include "QorExport.h"
-#include "platform/jtag/cable/wire/TcpStream.h"
+#include "platform/jtag/cable/wire/Stream.h"
 
 namespace QorRT {
 
-/// Runs from its construction to its destruction, or to the end of this process, whichever way it ends. Its Tcl port
-/// is a free loopback port, its other ports are closed, unless the configuration sets them.
-class QOR_API OpenOcdServer {
+/// Runs from its construction to its destruction, or to the end of this process, whichever way that ends. It is spoken
+/// to by its standard streams: there is no port that somebody else could use, unless the configuration opens one.
+class OpenOcdServer {
  public:
-  /// Throws runtime_error when no server can be started. What is wrong with the configuration file shows when
-  /// the server ends; see connect().
-  explicit OpenOcdServer(const std::string& configFile);
+  /// Throws runtime_error when openocd cannot be started. What is wrong with the configuration file shows when the
+  /// server ends; see explain().
+  OpenOcdServer(const std::string& configFile, StopFunction stop);
   ~OpenOcdServer();
   OpenOcdServer(const OpenOcdServer&) = delete;
   OpenOcdServer& operator=(const OpenOcdServer&) = delete;
 
-  /// A connection to its Tcl port, as soon as it takes one. Throws runtime_error, with the last errors of the
-  /// server's log, when it ends instead, or when it takes too long. `patience` is the connection's.
-  std::unique_ptr<TcpStream> connect(TcpStream::Seconds patience);
+  /// It takes Tcl commands and gives their results, as its Tcl port would.
+  Stream& stream() { return stream_; }
 
-  /// After a broken connection: throws, as connect() does, when the server has ended or ends now.
-  void requireRunning();
+  /// The errors in its log or, without any, its last words.
+  std::string errors();
 
-  /// The port of connect(); empty as long as the server does not listen.
-  std::string tclPort() const;
+  /// After a failure of its stream that says `seen`: throws runtime_error with that, or that the server has ended, and
+  /// errors().
+  [[noreturn]] void explain(const std::string& seen);
+
+  /// Throws runtime_error when the server was in doubt about its chain when it started.
+  void requireNoDoubt();
 
  private:
-  bool runs();
-  std::string errors() const;
-  std::vector<std::string> logLines() const;
+  struct Process;
 
-  struct CloseFile {
-    void operator()(std::FILE* file) const { std::fclose(file); }
-  };
+  bool endsWithin(std::chrono::milliseconds time);
 
-  std::unique_ptr<std::FILE, CloseFile> log_;  // has no name, and goes with us
-  int lifeline_ = -1;   // of a pipe: the server ends when it is closed, by us or by our end
-  pid_t process_ = -1;  // of the shell that keeps the server; -1 when it has ended
+  Stream stream_;
+  std::unique_ptr<Process> process_;
 };
 
 }  // namespace QorRT

@@ -13,6 +13,8 @@ namespace {
 constexpr std::size_t fieldBits = 256;
 
 constexpr std::string_view digitsOf = "0123456789abcdef", blanks = " \n\r\t";
+constexpr std::string_view captureCharacters = "0123456789abcdefABCDEF \n\r\t";
+constexpr std::size_t mostErrorBytes = 4096;
 
 std::size_t bytesFor(std::size_t bitCount) {
   return (bitCount + 7) / 8;
@@ -111,11 +113,16 @@ void appendField(std::string& text, const unsigned char* bits, std::size_t bitCo
   }
 }
 
-void appendDrScan(std::string& commands, const std::string& tap, const Qor_Scan& scan) {
-  commands.append(scan.capture ? "append r { } [drscan " : "drscan ").append(tap);
+std::string drScan(const std::string& tap, const Qor_Scan& scan) {
+  std::string command = "drscan " + tap;
   for (std::size_t done = 0; done < scan.bitCount; done += fieldBits)
-    appendField(commands, scan.out.data() + done / 8, std::min(fieldBits, scan.bitCount - done));
-  commands.append(scan.capture ? "]\n" : "\n");
+    appendField(command, scan.out.data() + done / 8, std::min(fieldBits, scan.bitCount - done));
+  return command;
+}
+
+std::string irScan(const OpenOcdTap& tap, std::uint64_t opcode) {
+  const std::uint64_t all = tap.irLength >= 64 ? ~std::uint64_t{0} : (std::uint64_t{1} << tap.irLength) - 1;
+  return "irscan " + tap.name + " " + std::to_string(opcode & all);
 }
 
 unsigned digitValue(char digit) {
@@ -171,44 +178,59 @@ void requireTaps(const std::vector<OpenOcdTap>& taps, const std::vector<DeviceEn
   for (std::size_t i = 0; i < board.size(); ++i) requirePlace(taps, i, board[i].tap);
 }
 
-void appendStep(std::string& commands, const std::vector<OpenOcdTap>& taps,
-                const std::vector<WireDevice>& devices, const Qor_Scan& scan) {
+std::string stepCommand(const std::vector<OpenOcdTap>& taps, const std::vector<WireDevice>& devices,
+                        const Qor_Scan& scan) {
   switch (scan.kind) {
-    case Qor_Scan::Kind::ir: {
-      const WireDevice& device = devices[scan.device];
-      const std::uint64_t all =
-          device.head.irLength >= 64 ? ~std::uint64_t{0} : (std::uint64_t{1} << device.head.irLength) - 1;
-      commands.append("irscan ").append(taps[scan.device].name).append(" ");
-      commands.append(std::to_string(device.userOpcodes[scan.userChain - 1] & all)).append("\n");
-      return;
-    }
+    case Qor_Scan::Kind::ir:
+      return irScan(taps[scan.device], devices[scan.device].userOpcodes[scan.userChain - 1]);
     case Qor_Scan::Kind::dr:
-      return appendDrScan(commands, taps[scan.device].name, scan);
+      return drScan(taps[scan.device].name, scan);
     case Qor_Scan::Kind::idle:
-      commands.append("runtest ").append(std::to_string(scan.cycles)).append("\n");
-      return;
+      break;
   }
+  return "runtest " + std::to_string(scan.cycles);
+}
+
+std::string checkCommand(const std::vector<OpenOcdTap>& taps) {
+  std::string command = "catch {";
+  for (const OpenOcdTap& tap : taps) command += irScan(tap, noOpcode) + "\n";
+  return command + "}";
 }
 
 // The server keeps the level itself, for all its clients.
-std::string silenceCommand() {
+std::string muteLog() {
   return "if {![info exists ::qor_log_level]} {set ::qor_log_level [lindex [debug_level] 1]}\ndebug_level -3";
 }
 
-std::string loudCommand() {
+std::string restoreLogLevel() {
   return "if {[info exists ::qor_log_level]} {debug_level $::qor_log_level; unset ::qor_log_level}";
 }
 
-std::string procedureOf(const std::string& name, const std::string& commands) {
-  return "proc " + name + " {} {" + silenceCommand() + "\nif {[catch {set r ok\n" + commands +
-         "set r} m]} {set m \"failed $m\"}\nset m}";
+// The result of a script is that of its last command: mostly nothing else captures, and no variable is needed.
+std::string batchOf(const std::vector<OpenOcdStep>& steps) {
+  std::string script;
+  std::size_t captures = 0;
+  for (const OpenOcdStep& step : steps) captures += step.capturedBits > 0 ? 1 : 0;
+  const bool lastAlone = captures == 1 && steps.back().capturedBits > 0;
+  for (const OpenOcdStep& step : steps) {
+    const bool kept = step.capturedBits > 0 && !lastAlone;
+    script.append(kept ? "append r { } [" : "").append(step.command).append(kept ? "]\n" : "\n");
+  }
+  return lastAlone ? script : "set r ok\n" + script + "set r";
+}
+
+std::size_t mostAnswer(const std::vector<OpenOcdStep>& steps) {
+  std::size_t most = mostErrorBytes;
+  for (const OpenOcdStep& step : steps) most += step.capturedBits / 4 + step.capturedBits / fieldBits + 8;
+  return most;
 }
 
 CaptureReader::CaptureReader(std::string answer) : answer_(std::move(answer)) {
-  const std::string_view first = word();
-  if (first == "failed")
-    throw std::runtime_error("the server could not run the scans" + detail(answer_.substr(place_)));
-  if (first != "ok") throw std::runtime_error("the server answered \"" + answer_.substr(0, 200) + "\"");
+  if (word() != "ok") place_ = 0;
+  const std::string said = answer_.substr(place_);
+  const bool captured = said.find_first_not_of(captureCharacters) == said.npos;
+  if (!captured || answer_.empty())
+    throw std::runtime_error("the server could not run the scans" + detail(said));
 }
 
 std::vector<unsigned char> CaptureReader::next(std::size_t bitCount) {

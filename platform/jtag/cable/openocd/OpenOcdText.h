@@ -5,7 +5,6 @@
 #include <string_view>
 #include <vector>
 
-#include "QorExport.h"
 #include "Qor_Cable.h"
 #include "platform/jtag/cable/wire/WireDevice.h"
 
@@ -27,33 +26,44 @@ struct OpenOcdTap {
 
 /// The enabled TAPs in the server's table of its scan chain, the one nearest to TDO first. Throws runtime_error
 /// for a table that is none.
-QOR_API std::vector<OpenOcdTap> tapsIn(const std::string& table);
+std::vector<OpenOcdTap> tapsIn(const std::string& table);
 
 /// Throws runtime_error when a TAP answers with an unexpected IDCODE or is not of the configuration, or when the board
 /// file names another TAP at its place.
-QOR_API void requireTaps(const std::vector<OpenOcdTap>& taps, const std::vector<DeviceEntry>& board);
+void requireTaps(const std::vector<OpenOcdTap>& taps, const std::vector<DeviceEntry>& board);
 
-/// Appends the commands of one step; what its scan returns is appended to the variable `r` if it captures.
-QOR_API void appendStep(std::string& commands, const std::vector<OpenOcdTap>& taps,
-                        const std::vector<WireDevice>& devices, const Qor_Scan& scan);
+/// The command of one step, whose result is what it captures.
+std::string stepCommand(const std::vector<OpenOcdTap>& taps, const std::vector<WireDevice>& devices,
+                        const Qor_Scan& scan);
 
-/// Silences the server's log, which would hold every answer, and gives it back the level that it had. Clients may
-/// do both in any order: the last one to speak leaves it loud.
+/// Commands that select BYPASS in one TAP after the other: the server compares what each IR captures with its
+/// configuration.
+std::string checkCommand(const std::vector<OpenOcdTap>& taps);
+
+/// Silence the server's log, which would get every answer, and give it back the level that it had. Clients may do both
+/// in any order: the last one restores the level.
 /// @{
-QOR_API std::string silenceCommand();
-QOR_API std::string loudCommand();
+std::string muteLog();
+std::string restoreLogLevel();
 /// @}
 
-/// Puts commands of appendStep() into a procedure that silences the log and answers "ok" and every capture, or
-/// what failed.
-QOR_API std::string procedureOf(const std::string& name, const std::string& commands);
+struct OpenOcdStep {
+  std::string command;
+  std::size_t capturedBits;  ///< 0 when its result does not matter
+};
 
-/// The captures in the answer of such a procedure, taken in order. Throws runtime_error for whatever is no such answer.
-class QOR_API CaptureReader {
+/// Steps as one script. Its result is what they capture, after "ok" if more than the last step counts.
+std::string batchOf(const std::vector<OpenOcdStep>& steps);
+
+/// The bytes of its longest result, or of what is said of an error.
+std::size_t mostAnswer(const std::vector<OpenOcdStep>& steps);
+
+/// The captures in the result of a batch, taken in order. Throws runtime_error for whatever is no such result.
+class CaptureReader {
  public:
   explicit CaptureReader(std::string answer);
 
-  /// The next `bitCount` bits, in fields as appendStep() asks for them.
+  /// The next `bitCount` bits, in fields as stepCommand() asks for them.
   std::vector<unsigned char> next(std::size_t bitCount);
 
   /// Throws when there is more.

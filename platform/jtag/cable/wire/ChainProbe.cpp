@@ -67,7 +67,7 @@ ChainScan irProbe() {
   return probe;
 }
 
-std::size_t readIrLengths(std::vector<Qor_Device>& devices, const Bytes& captured) {
+void readIrLengths(std::vector<Qor_Device>& devices, const Bytes& captured) {
   const std::ptrdiff_t total = lastZero(captured);
   if (total <= 0 || total > static_cast<std::ptrdiff_t>(mostIrBits) || !bitAt(captured, 0))
     throw std::runtime_error(
@@ -80,7 +80,20 @@ std::size_t readIrLengths(std::vector<Qor_Device>& devices, const Bytes& capture
   starts.push_back(static_cast<std::size_t>(total));
   for (std::size_t i = 0; i < devices.size(); ++i)
     devices[i].irLength = clear ? static_cast<unsigned>(starts[i + 1] - starts[i]) : 0;
-  return static_cast<std::size_t>(total);
+}
+
+void requireIrs(const std::vector<WireDevice>& devices, const Bytes& captured) {
+  const auto total = static_cast<std::size_t>(lastZero(captured));
+  std::size_t start = 0;
+  for (std::size_t i = 0; i < devices.size(); ++i) {
+    if (start + 1 >= total || !bitAt(captured, start) || bitAt(captured, start + 1))
+      throw std::runtime_error("the IR of device " + std::to_string(i) +
+                               " does not begin with 1 and 0 where the board file has it");
+    start += devices[i].head.irLength;
+  }
+  if (start != total)
+    throw std::runtime_error("the IRs of the chain have " + std::to_string(total) +
+                             " bits together, the board file says " + std::to_string(start));
 }
 
 }  // namespace QorRT

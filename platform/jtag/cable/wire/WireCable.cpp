@@ -2,45 +2,72 @@
 
 #include <algorithm>
 #include <stdexcept>
-#include <utility>
 
 namespace QorRT {
 namespace {
+
+constexpr double slowestTck = 20000;  // Hz
 
 bool sameDevice(const WireDevice& before, const WireDevice& now) {
   return before.head.idcode == now.head.idcode && before.head.irLength == now.head.irLength;
 }
 
+// With room for the walk through the states, and for the other devices.
+std::size_t tcksOf(const Qor_Scan& scan) {
+  return scan.kind == Qor_Scan::Kind::idle ? scan.cycles : scan.bitCount + 32;
+}
+
 }  // namespace
+
+WireCable::WireCable(WireUrl url, StopFunction stop)
+    : url_(std::move(url)),
+      stop_(std::move(stop)),
+      board_(url_.board.empty() ? std::vector<DeviceEntry>() : boardDevices(url_.board)) {}
 
 void WireCable::open() {
   try {
     keep(connect());
     connected_ = true;
   } catch (...) {
-    disconnect();
+    giveUp();
     throw;
   }
 }
 
 void WireCable::run(std::vector<Qor_Scan>& scans) {
   if (!connected_) open();
+  std::size_t tcks = 0;
+  for (const Qor_Scan& scan : scans) tcks += tcksOf(scan);
   try {
-    exchange(scans);
+    exchange(scans, deadlineOf(tcks));
   } catch (...) {
-    connected_ = false;
-    disconnect();
+    giveUp();
     throw;
   }
 }
 
-// What stands on the chain stays as it was first found.
+Deadline WireCable::deadlineOf(std::size_t tcks) const {
+  return Deadline(url_.timeout + Seconds(static_cast<double>(tcks) / slowestTck));
+}
+
+bool WireCable::isSelected(const Qor_Scan& ir) {
+  const std::pair<unsigned, unsigned> wanted(ir.device, ir.userChain);
+  return std::exchange(selected_, wanted) == wanted && !ir.always;
+}
+
+void WireCable::giveUp() noexcept {
+  connected_ = false;
+  selected_.reset();
+  disconnect();
+}
+
+// The chain stays as it was first found.
 void WireCable::keep(std::vector<WireDevice> found) {
   if (devices_.empty()) {
     for (const WireDevice& device : found) heads_.push_back(device.head);
     devices_ = std::move(found);
   } else if (!std::equal(devices_.begin(), devices_.end(), found.begin(), found.end(), sameDevice)) {
-    throw std::runtime_error("another chain stands behind the cable than when it was opened");
+    throw std::runtime_error("the cable leads to another chain than when it was opened");
   }
 }
 

@@ -83,15 +83,6 @@ std::vector<WireDevice> describedDevices(const std::vector<Qor_Device>& found,
   return devices;
 }
 
-void requireIrBits(const std::vector<WireDevice>& devices, std::size_t bitCount) {
-  std::size_t sum = 0;
-  for (const WireDevice& device : devices) sum += device.head.irLength;
-  if (sum != bitCount) {
-    throw std::runtime_error("the IRs of the chain have " + std::to_string(bitCount) +
-                             " bits together, the board file says " + std::to_string(sum));
-  }
-}
-
 std::string idcodeText(unsigned idcode) {
   std::array<char, 9> digits{};
   std::snprintf(digits.data(), digits.size(), "%08X", idcode);

@@ -4,7 +4,6 @@
 #include <string>
 #include <vector>
 
-#include "QorExport.h"
 #include "Qor_Cable.h"
 #include "platform/jtag/cable/boardfile/DeviceEntry.h"
 
@@ -18,20 +17,17 @@ struct WireDevice {
 /// The devices of a board file, the one nearest to TDO first; of a simulated board's file, what is known of it
 /// from outside. Throws runtime_error, "FILE:LINE: KEY: what is wrong".
 /// @{
-QOR_API std::vector<DeviceEntry> boardDevices(const std::string& path);
-QOR_API std::vector<DeviceEntry> boardDevicesOf(const std::string& text, const std::string& file);
+std::vector<DeviceEntry> boardDevices(const std::string& path);
+std::vector<DeviceEntry> boardDevicesOf(const std::string& text, const std::string& file);
 /// @}
 
 /// Lays what the board file says over what was found on the chain: names, IR lengths, opcodes. Throws
 /// runtime_error when they contradict each other: another number of devices, another IDCODE or IR length, an
 /// opcode that the IR has no room for. An IR length found as 0 is an unknown one, and must be in the file.
-QOR_API std::vector<WireDevice> describedDevices(const std::vector<Qor_Device>& found,
-                                                 const std::vector<DeviceEntry>& entries);
-
-/// Throws runtime_error when the IR lengths do not add up to what the chain has.
-QOR_API void requireIrBits(const std::vector<WireDevice>& devices, std::size_t bitCount);
+std::vector<WireDevice> describedDevices(const std::vector<Qor_Device>& found,
+                                         const std::vector<DeviceEntry>& entries);
 
 /// "0A5F1093".
-QOR_API std::string idcodeText(unsigned idcode);
+std::string idcodeText(unsigned idcode);
 
 }  // namespace QorRT

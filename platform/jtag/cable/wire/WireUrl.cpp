@@ -1,8 +1,10 @@
 #include "platform/jtag/cable/wire/WireUrl.h"
 
+#include <algorithm>
 #include <charconv>
 #include <stdexcept>
 #include <string_view>
+#include <utility>
 
 namespace QorRT {
 namespace {
@@ -38,30 +40,51 @@ Endpoint endpointOf(const std::string& text) {
   return {host, text.substr(colon + 1)};
 }
 
+// False for a "%" without two hexadecimal digits after it.
+bool decode(std::string& text) {
+  std::string plain;
+  for (std::size_t i = 0; i < text.size(); ++i) {
+    unsigned byte = static_cast<unsigned char>(text[i]);
+    if (text[i] == '%') {
+      const char* const digits = text.data() + i + 1;
+      const char* const end = text.data() + std::min(i + 3, text.size());
+      if (end - digits != 2 || std::from_chars(digits, end, byte, 16).ptr != end) return false;
+      i += 2;
+    }
+    plain += static_cast<char>(byte);
+  }
+  text = std::move(plain);
+  return true;
+}
+
+std::string listOf(const std::vector<std::string>& names) {
+  std::string list;
+  for (const std::string& name : names) list.append(list.empty() ? "" : ", ").append(name);
+  return list;
+}
+
 }  // namespace
 
-WireUrl parseWireUrl(const std::string& kind, const std::string& rest) {
-  auto [server, options] = split(rest, '?');
+WireUrl parseWireUrl(const std::string& kind, const std::string& rest,
+                     const std::vector<std::string>& options) {
+  auto [server, left] = split(rest, '?');
   WireUrl url;
   if (!server.empty() && (url.endpoint = endpointOf(server)).host.empty())
     fail(kind, rest, "names no server: HOST:PORT is due, with a port of 1 to 65535");
-  while (!options.empty()) {
-    const auto [option, others] = split(options, '&');
-    const auto [name, value] = split(option, '=');
+  while (!left.empty()) {
+    const auto [option, others] = split(left, '&');
+    auto [name, value] = split(option, '=');
     double seconds = 0;
-    if (value.empty())
-      fail(kind, rest, "gives the option \"" + name + "\" no value");
-    else if (name == "board")
-      url.board = boardDevices(value);
-    else if (name == "config")
-      url.config = value;
-    else if (name != "timeout")
-      fail(kind, rest, "has the unknown option \"" + name + "\"; known: board, config, timeout");
-    else if (!isTimeout(value, seconds))
+    if (std::find(options.begin(), options.end(), name) == options.end())
+      fail(kind, rest, "has the unknown option \"" + name + "\"; known: " + listOf(options));
+    if (value.empty()) fail(kind, rest, "gives the option \"" + name + "\" no value");
+    if (!decode(value)) fail(kind, rest, "has a \"%\" without two hexadecimal digits after it");
+    if (name == "board") url.board = value;
+    if (name == "config") url.config = value;
+    if (name == "timeout" && !isTimeout(value, seconds))
       fail(kind, rest, "has a timeout that is not 0 to 3600 seconds");
-    else
-      url.timeout = TcpStream::Seconds(seconds);
-    options = others;
+    if (name == "timeout") url.timeout = Seconds(seconds);
+    left = others;
   }
   return url;
 }
