@@ -2,6 +2,7 @@
 // the texts of a Tcl port.
 #include <gtest/gtest.h>
 
+#include "QorJtag_Host.h"
 #include "platform/jtag/cable/openocd/OpenOcdText.h"
 #include "platform/jtag/cable/wire/ChainProbe.h"
 #include "platform/jtag/cable/wire/WireUrl.h"
@@ -15,26 +16,33 @@ using QorRT::DeviceEntry;
 using QorRT::OpenOcdTap;
 using QorRT::Qor_Device;
 using QorRT::Qor_Scan;
+using QorRT::WireDevice;
 using Bytes = std::vector<unsigned char>;
 
 TEST(WireUrls, NameAServerAndOptions) {
-  const QorRT::WireUrl url = QorRT::parseWireUrl("rbb", "[::1]:9000?timeout=0.5&config=my.cfg");
-  EXPECT_EQ(url.endpoint.host, "::1");
-  EXPECT_EQ(url.endpoint.port, "9000");
+  const std::vector<std::string> options{"board", "config", "timeout"};
+  const QorRT::WireUrl url =
+      QorRT::parseWireUrl("rbb", "[::1]:9000?timeout=0.5&config=a%26b%3d%C3%A4.cfg&board=none.toml", options);
+  EXPECT_EQ(url.endpoint.text() + " " + url.config + " " + url.board, "::1:9000 a&b=\xC3\xA4.cfg none.toml");
   EXPECT_EQ(url.timeout.count(), 0.5);
-  EXPECT_EQ(url.config, "my.cfg");
   const std::pair<const char*, const char*> bad[] = {
       {"host", "names no server: HOST:PORT is due, with a port of 1 to 65535"},
       {":1", "names no server: HOST:PORT is due, with a port of 1 to 65535"},
       {"host:65536", "names no server: HOST:PORT is due, with a port of 1 to 65535"},
       {"host:1?board", "gives the option \"board\" no value"},
+      {"host:1?board=%2", "has a \"%\" without two hexadecimal digits after it"},
+      {"host:1?board=%2g", "has a \"%\" without two hexadecimal digits after it"},
       {"host:1?speed=3", "has the unknown option \"speed\"; known: board, config, timeout"},
       {"host:1?timeout=0", "has a timeout that is not 0 to 3600 seconds"},
       {"host:1?timeout=1s", "has a timeout that is not 0 to 3600 seconds"},
   };
   for (const auto& [rest, problem] : bad)
-    EXPECT_EQ(thrownBy([rest = rest] { QorRT::parseWireUrl("rbb", rest); }),
+    EXPECT_EQ(thrownBy([&options, rest = rest] { QorRT::parseWireUrl("rbb", rest, options); }),
               "logic: the cable URL \"rbb:" + std::string(rest) + "\" " + problem);
+  for (const std::string start : {"rbb:host:1?config=a", "openocd:host:1?config=a"})
+    EXPECT_EQ(
+        thrownBy([&] { QorRT::openCable(start.c_str()); }),
+        "logic: the cable URL \"" + start + "\" has the unknown option \"config\"; known: board, timeout");
 }
 
 // What an idle chain of that many bits shows a probe of ones: its own bits, then the probe.
@@ -44,40 +52,53 @@ Bytes behind(const std::string& wire, std::size_t bitCount) {
   return bytesOf(all);
 }
 
-std::string chainSeen(const std::string& idcodes, const std::string& irs) {
+// The devices, with the IR lengths of the capture or, where it leaves them open, of the board file.
+std::string chainSeen(const std::string& idcodes, const std::string& irs, const std::string& board) {
   std::string text;
   const std::string thrown = thrownBy([&] {
-    std::vector<Qor_Device> devices = QorRT::idcodesIn(behind(idcodes, QorRT::idcodeProbe().bitCount));
-    EXPECT_EQ(QorRT::readIrLengths(devices, behind(irs + "0", QorRT::irProbe().bitCount)), irs.size());
-    for (const Qor_Device& device : devices)
-      text += QorRT::idcodeText(device.idcode) + "/" + std::to_string(device.irLength) + " ";
+    std::vector<Qor_Device> found = QorRT::idcodesIn(behind(idcodes, QorRT::idcodeProbe().bitCount));
+    const Bytes captured = behind(irs + "0", QorRT::irProbe().bitCount);
+    QorRT::readIrLengths(found, captured);
+    std::vector<WireDevice> devices(found.size());
+    if (!board.empty()) devices = QorRT::describedDevices(found, QorRT::boardDevicesOf(board, "b.toml"));
+    if (!board.empty()) QorRT::requireIrs(devices, captured);
+    for (std::size_t i = 0; i < found.size(); ++i)
+      text += QorRT::idcodeText(found[i].idcode) + "/" +
+              std::to_string(std::max(found[i].irLength, devices[i].head.irLength)) + " ";
   });
   return thrown == "nothing" ? text : thrown;
 }
 
-TEST(Probes, TellWhatStandsOnAChainOrHowTdoIsStuck) {
+TEST(Probes, ShowWhatIsOnAChainOrHowTdoIsStuck) {
   const std::string fpga = bitsOf(0x0A5F1093, 32), cpld = bitsOf(0x1234567B, 32);
-  EXPECT_EQ(chainSeen(fpga + "0" + cpld,
-                      "100000"
-                      "1000"
-                      "10000000"),
-            "0A5F1093/6 00000000/4 1234567B/8 ");
-  EXPECT_EQ(chainSeen(fpga, "110011"), "0A5F1093/6 ");
-  EXPECT_EQ(chainSeen(fpga + cpld,
-                      "101000"
-                      "1000"),
-            "0A5F1093/0 1234567B/0 ");  // read in two ways
-  EXPECT_EQ(chainSeen("", ""), "runtime: no device answers on the chain, TDO is all ones");
-  EXPECT_EQ(chainSeen(std::string(QorRT::idcodeProbe().bitCount, '0'), ""),
-            "runtime: no device answers on the chain, TDO is all zeros");
-  std::string noise;
-  while (noise.size() < QorRT::idcodeProbe().bitCount) noise += fpga;
-  EXPECT_EQ(chainSeen(noise, ""),
-            "runtime: the chain has no end: after 65 devices TDO does not bring back what TDI was given");
+  const std::size_t probe = QorRT::idcodeProbe().bitCount;
   const std::string silent =
       "runtime: the instruction registers of the chain do not answer: TDO brings back no 1 and 0";
-  EXPECT_EQ(chainSeen(fpga, "000000"), silent);
-  EXPECT_EQ(chainSeen(fpga, std::string(QorRT::mostIrBits + 1, '1')), silent);
+  const auto lengths = [](unsigned first, unsigned second) {
+    return "[[device]]\nir_length=" + std::to_string(first) +
+           "\n[[device]]\nir_length=" + std::to_string(second);
+  };
+  std::string noise;
+  while (noise.size() < probe) noise += fpga;
+  const struct {
+    std::string idcodes, irs, board, seen;
+  } cases[] = {
+      {fpga + "0" + cpld, "100000100010000000", "", "0A5F1093/6 00000000/4 1234567B/8 "},
+      {fpga, "110011", "", "0A5F1093/6 "},
+      {fpga + cpld, "1010001000", "", "0A5F1093/0 1234567B/0 "},  // read in two ways
+      {fpga + cpld, "1010001000", lengths(6, 4), "0A5F1093/6 1234567B/4 "},
+      {fpga + cpld, "1010001000", lengths(6, 5),
+       "runtime: the IRs of the chain have 10 bits together, the board file says 11"},
+      {fpga + cpld, "1010001000", lengths(7, 3),
+       "runtime: the IR of device 1 does not begin with 1 and 0 where the board file has it"},
+      {"", "", "", "runtime: no device answers on the chain, TDO is all ones"},
+      {std::string(probe, '0'), "", "", "runtime: no device answers on the chain, TDO is all zeros"},
+      {noise, "", "",
+       "runtime: the chain has no end: after 65 devices TDO does not bring back what TDI was given"},
+      {fpga, "000000", "", silent},
+      {fpga, std::string(QorRT::mostIrBits + 1, '1'), "", silent},
+  };
+  for (const auto& each : cases) EXPECT_EQ(chainSeen(each.idcodes, each.irs, each.board), each.seen);
 }
 
 std::string opcodeText(std::uint64_t opcode) {
@@ -164,9 +185,9 @@ TEST(TapTables, AreReadRowByRowAndHeldAgainstTheBoard) {
             "runtime: the server's table of its scan chain has \"0x1z\" where a number is due");
 }
 
-TEST(Batches, AreOneCommandWithScansInFields) {
+TEST(Batches, AreOneScriptWithScansInFields) {
   const std::vector<OpenOcdTap> taps{{"a.tap", 0, {}, 6}, {"b.tap", 0, {}, 8}};
-  const std::vector<QorRT::WireDevice> devices{{{0, "", 6}}, {{0, "", 8}, {2, 3, 4, ~std::uint64_t{0}}}};
+  const std::vector<WireDevice> devices{{{0, "", 6}}, {{0, "", 8}, {2, 3, 4, QorRT::noOpcode}}};
   Qor_Scan ir{Qor_Scan::Kind::ir}, wide{Qor_Scan::Kind::dr}, idle{Qor_Scan::Kind::idle};
   ir.device = wide.device = 1;
   ir.userChain = 4;
@@ -174,16 +195,15 @@ TEST(Batches, AreOneCommandWithScansInFields) {
   wide.out = Bytes(33, 0xA5);
   wide.out.back() = 0x09;
   idle.cycles = 8;
-  std::string commands;
-  for (const Qor_Scan& scan : {ir, wide, idle}) QorRT::appendStep(commands, taps, devices, scan);
-  wide.capture = true;
-  QorRT::appendStep(commands, taps, devices, wide);
   std::string field;
   for (int i = 0; i < 32; ++i) field += "a5";
   const std::string fields = "drscan b.tap 256 0x" + field + " 4 0x09";
-  EXPECT_EQ(QorRT::procedureOf("p", commands),
-            "proc p {} {" + QorRT::silenceCommand() + "\nif {[catch {set r ok\nirscan b.tap 255\n" + fields +
-                "\nruntest 8\nappend r { } [" + fields + "]\nset r} m]} {set m \"failed $m\"}\nset m}");
+  const auto step = [&](const Qor_Scan& scan) { return QorRT::stepCommand(taps, devices, scan); };
+  EXPECT_EQ(step(ir) + "/" + step(wide) + "/" + step(idle), "irscan b.tap 255/" + fields + "/runtest 8");
+  EXPECT_EQ(QorRT::batchOf({{"a", 0}, {"b", 8}}), "a\nb\n");
+  EXPECT_EQ(QorRT::batchOf({{"a", 8}, {"b", 8}}), "set r ok\nappend r { } [a]\nappend r { } [b]\nset r");
+  EXPECT_EQ(QorRT::batchOf({{"a", 8}, {"b", 0}}), "set r ok\nappend r { } [a]\nb\nset r");
+  EXPECT_EQ(QorRT::batchOf({{"a", 0}}), "set r ok\na\nset r");
 }
 
 std::string read(const std::string& answer, std::size_t bitCount) {
@@ -199,17 +219,16 @@ std::string read(const std::string& answer, std::size_t bitCount) {
 TEST(Captures, AreReadStrictly) {
   const std::string field = "0" + std::string(62, '7') + "F";
   EXPECT_EQ(read("ok 0ab3 ", 12), "AB3");
-  EXPECT_EQ(read("ok AB3", 12), "AB3");
-  EXPECT_EQ(read("ok " + field + "\n 05\n", 259), "5" + field);
+  EXPECT_EQ(read("AB3", 12), "AB3");
+  EXPECT_EQ(read(field + "\n 05\n", 259), "5" + field);
   const std::pair<const char*, const char*> bad[] = {
-      {"failed invalid command name", "the server could not run the scans: invalid command name"},
-      {"failed ", "the server could not run the scans: has it lost its adapter?"},
-      {"", "the server answered \"\""},
+      {"invalid command name", "the server could not run the scans: invalid command name"},
+      {"", "the server could not run the scans: has it lost its adapter?"},
+      {"ag3", "the server could not run the scans: ag3"},
       {"ok", "the server answered \"\" where 12 bits were due"},
-      {"ok b3", "the server answered \"b3\" where 12 bits were due"},
+      {"b3", "the server answered \"b3\" where 12 bits were due"},
       {"ok 00ab3", "the server answered \"00ab3\" where 12 bits were due"},
-      {"ok 1ab3", "the server answered \"1ab3\" where 12 bits were due"},
-      {"ok ag3", "the server answered \"ag3\" where 12 bits were due"},
+      {"1ab3", "the server answered \"1ab3\" where 12 bits were due"},
       {"ok ab3 00", "the server answered more than it was asked: \"00\""},
   };
   for (const auto& [answer, problem] : bad)

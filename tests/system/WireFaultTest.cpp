@@ -1,20 +1,26 @@
 // What can happen between a host and a real chain: each fault ends in a message that says what was seen, with the
 // target lock free, and the session works again when the link does. By a remote_bitbang cable, and through OpenOCD.
+#include <netinet/in.h>
 #include <signal.h>
+#include <sys/socket.h>
+#include <sys/stat.h>
 #include <sys/wait.h>
 
 #include <atomic>
 #include <chrono>
 #include <cstdlib>
+#include <filesystem>
 #include <fstream>
+#include <iterator>
 #include <optional>
 #include <regex>
+#include <set>
 #include <sstream>
 #include <thread>
 
 #include "BitbangServer.h"
 #include "SimPins.h"
-#include "platform/jtag/cable/wire/TcpStream.h"
+#include "platform/jtag/cable/wire/Stream.h"
 #include "tests/system/Board.h"
 
 namespace {
@@ -106,16 +112,17 @@ const Case cases[] = {
      "no debug hub answers, TDO is all ones"},
     {"OneBitFlipped", Fault::flip, 60, "the CRC of the answer does not hold over 80 data bits",
      "the CRC of the answer does not hold over 80 data bits"},
-    {"ReplyWithheld", Fault::withhold, 0, "HOST:PORT gave 0 of 147 answers, then nothing for 1.1 s",
-     "HOST:PORT did not answer within 1.1 s"},
-    {"SimulationKilled", Fault::die, 150, "HOST:PORT closed the connection after 0 of 147 answers",
-     "HOST:PORT closed the connection before it answered"},
+    {"ReplyWithheld", Fault::withhold, 0, "HOST:PORT gave N of 147 answers within 1.1 s",
+     "openocd gave no answer within 1.1 s"},
+    {"SimulationKilled", Fault::die, 150, "HOST:PORT gave N of 147 answers, then closed the connection",
+     "openocd gave no answer, then closed the connection"},
 };
 
-// With the place of the server in words.
+// With the place of the server, and how many answers came, in words.
 std::vector<std::string> placeless(std::vector<std::string> messages) {
   for (std::string& message : messages)
-    message = std::regex_replace(message, std::regex(R"(127\.0\.0\.1:\d+)"), "HOST:PORT");
+    message = std::regex_replace(std::regex_replace(message, std::regex(R"(127\.0\.0\.1:\d+)"), "HOST:PORT"),
+                                 std::regex("gave [0-9]+ of"), "gave N of");
   return messages;
 }
 
@@ -142,6 +149,7 @@ class WireFault : public testing::TestWithParam<Case> {
 };
 
 TEST_P(WireFault, IsToldByABitbangCable) {
+  served.pins.setTrst(true);  // as a client before may have left it
   tryOn("rbb:127.0.0.1:" + served.port() + "?timeout=1", GetParam().byBitbang);
 }
 
@@ -171,8 +179,8 @@ class OpenOcd {
     return text.str();
   }
   std::string ask(const std::string& command) const {
-    QorRT::TcpStream stream({"127.0.0.1", port_}, QorRT::TcpStream::Seconds(5));
-    return stream.ask(command + '\x1A', '\x1A');
+    const QorRT::Deadline deadline(QorRT::Seconds(5));
+    return QorRT::Stream({"127.0.0.1", port_}, deadline, {}).ask(command + '\x1A', '\x1A', 1000, deadline);
   }
 
   void start() {
@@ -221,12 +229,12 @@ TEST(OpenOcdServer, MayHangOrDieAndComeBackWithinASession) {
   };
   const std::string where = "100 device 0, user chain 1, core 0: HOST:PORT ";
   server.kill(SIGSTOP);
-  EXPECT_THAT(said(), ElementsAre(where + "did not answer within 1.1 s"));
+  EXPECT_THAT(said(), ElementsAre(where + "gave no answer within 1.1 s"));
   server.kill(SIGCONT);
   values = core.read();
   EXPECT_EQ(values["async_in_data.activity_up"], "5A");  // even if the hanging read was carried out after all
   server.kill(SIGKILL);
-  EXPECT_THAT(said(), ElementsAre(where + "closed the connection before it answered"));
+  EXPECT_THAT(said(), ElementsAre(where + "gave no answer, then closed the connection"));
   EXPECT_THAT(said(), ElementsAre(where + "cannot be reached: Connection refused"));
   server.start();
   core.write({{"async_out_data", "A7"}});
@@ -248,9 +256,9 @@ TEST(OpenOcdServer, LogsNoScanAndIsAsLoudAsBefore) {
 }
 
 // What a cable says that cannot be opened.
-std::string refusal(const std::string& url) {
+std::string refusal(const std::string& url, QorRT::StopFunction stop = {}) {
   try {
-    QorRT::openCable(url.c_str());
+    QorRT::openCable(url.c_str(), std::move(stop));
   } catch (const std::exception& error) {
     return placeless({error.what()}).front();
   }
@@ -284,6 +292,9 @@ TEST(OpenOcdServer, IsHeldAgainstTheChainAndTheBoardFile) {
        "the chain has a device that the server's configuration does not name: auto0.tap, IDCODE 1234567B, an "
        "IR "
        "of 8 bits by its capture"},
+      {"?config=" + written("longer.cfg", std::regex_replace(adapter, std::regex("irlen 6"), "irlen 7") +
+                                              cpld + "1234567B"),
+       "openocd does not trust the chain; it says: cpld.tap: IR capture error; saw 0x80 not 0x1; Bypassing"},
       {"?config=" + written("other.cfg", adapter + cpld + "1234567D"),
        "the TAP cpld.tap has the IDCODE 1234567B, not 1234567D"},
       {"?config=" + good + "&board=" + written("tap.toml", "[[device]]\ntap = \"asic.tap\"\n[[device]]\n"),
@@ -299,6 +310,125 @@ TEST(OpenOcdServer, IsHeldAgainstTheChainAndTheBoardFile) {
   };
   for (const auto& [rest, said] : refused) EXPECT_THAT(refusal("openocd:" + rest), testing::StartsWith(said));
   EXPECT_EQ(refusal("openocd:?config=" + good), "nothing");
+}
+
+/// A server that nobody should trust: to whoever connects it sends a text, again and again, with a pause between.
+class BadServer {
+ public:
+  BadServer(std::string text, int pauseMilliseconds)
+      : thread_([this, text, pauseMilliseconds] {
+          const int client = accept(listener_, nullptr, nullptr);
+          while (!stopped_ && (text.empty() || send(client, text.data(), text.size(), MSG_NOSIGNAL) > 0))
+            std::this_thread::sleep_for(std::chrono::milliseconds(pauseMilliseconds));
+          close(client);
+        }) {}
+  ~BadServer() {
+    stopped_ = true;
+    shutdown(listener_, SHUT_RDWR);
+    thread_.join();
+    close(listener_);
+  }
+
+  std::string place() const {
+    sockaddr_in address{};
+    socklen_t size = sizeof address;
+    getsockname(listener_, reinterpret_cast<sockaddr*>(&address), &size);
+    return "127.0.0.1:" + std::to_string(ntohs(address.sin_port));
+  }
+
+ private:
+  static int listening() {
+    sockaddr_in address{};
+    address.sin_family = AF_INET;
+    address.sin_addr.s_addr = htonl(INADDR_LOOPBACK);
+    const int listener = socket(AF_INET, SOCK_STREAM, 0);
+    EXPECT_EQ(bind(listener, reinterpret_cast<sockaddr*>(&address), sizeof address), 0);
+    EXPECT_EQ(listen(listener, 1), 0);
+    return listener;
+  }
+
+  const int listener_ = listening();
+  std::atomic<bool> stopped_{false};
+  std::thread thread_;
+};
+
+TEST(BadServers, AreWaitedForNoLongerThanAnExchangeMayTake) {
+  const auto stopAtOnce = [] { return true; };
+  const struct {
+    const char *text, *kind, *options, *said;
+    int pause;
+    QorRT::StopFunction stop;
+  } rows[] = {
+      {"0", "rbb:", "?timeout=0.3", "HOST:PORT gave N of 2081 answers within 0.6 s", 20, {}},
+      {"x", "openocd:", "?timeout=0.3", "HOST:PORT gave no answer within 0.3 s", 20, {}},
+      {"", "rbb:", "?timeout=60", "HOST:PORT gave N of 2081 answers before the host stopped the wait", 20,
+       stopAtOnce},
+      {"", "openocd:", "?timeout=60", "HOST:PORT gave no answer before the host stopped the wait", 20,
+       stopAtOnce},
+      {"0123456789", "openocd:", "?timeout=20", "HOST:PORT answered more than 65536 bytes", 0, {}},
+      {"0123456789", "rbb:", "?timeout=20", "HOST:PORT gave more answers than the 2081 that were due", 0, {}},
+  };
+  for (const auto& each : rows) {
+    const BadServer server(each.text, each.pause);
+    const auto begin = std::chrono::steady_clock::now();
+    EXPECT_EQ(refusal(each.kind + server.place() + each.options, each.stop), each.said);
+    EXPECT_LT(std::chrono::steady_clock::now() - begin, std::chrono::seconds(15)) << each.said;
+  }
+}
+
+/// The ids of our children.
+std::vector<std::string> children() {
+  std::ifstream list("/proc/self/task/" + std::to_string(getpid()) + "/children");
+  return {std::istream_iterator<std::string>(list), {}};
+}
+
+TEST(OwnOpenOcd, HasNothingOfItsHostAndEndsThoughACopyOfThatLives) {
+  ServedBoard served;
+  setenv("QORVIO_BOARD_PORT", served.port().c_str(), 1);
+  const std::size_t before = children().size();
+  std::optional<Board> board("openocd:?config=" QORVIO_SOURCE_DIR "/rtl/cosim/openocd.cfg");
+  ASSERT_EQ(children().size(), before + 1);
+  const std::string openOcd = children().back();
+  std::set<std::string> descriptors;
+  for (const auto& each : std::filesystem::directory_iterator("/proc/" + openOcd + "/fd"))
+    descriptors.insert(each.path().filename());
+  EXPECT_THAT(descriptors, ElementsAre("0", "1", "2", "3"));  // the last is its own connection to the board
+  const pid_t copy = fork();
+  if (copy == 0) {
+    pause();
+    _exit(0);
+  }
+  const auto begin = std::chrono::steady_clock::now();
+  board.reset();
+  EXPECT_LT(std::chrono::steady_clock::now() - begin, std::chrono::milliseconds(900));
+  EXPECT_FALSE(std::filesystem::exists("/proc/" + openOcd));  // not even a zombie
+  ::kill(copy, SIGKILL);
+  waitpid(copy, nullptr, 0);
+}
+
+TEST(Cables, TakeNoStandardStream) {
+  ServedBoard served;
+  setenv("QORVIO_BOARD_PORT", served.port().c_str(), 1);
+  for (const std::string& url :
+       {"rbb:127.0.0.1:" + served.port(),
+        std::string("openocd:?config=" QORVIO_SOURCE_DIR "/rtl/cosim/openocd.cfg")}) {
+    int kept[3] = {dup(0), dup(1), dup(2)};
+    for (int each = 0; each < 3; ++each) close(each);
+    std::string taken;
+    {
+      Board board(url);
+      VioCore(board, {0, 1, 0}).read();
+      struct stat status {};
+      for (int each = 0; each < 3; ++each)
+        if (fstat(each, &status) == 0 && !S_ISCHR(status.st_mode) && (status.st_mode & S_IFMT) != 0)
+          taken += std::to_string(each);
+    }
+    for (int each = 0; each < 3; ++each) {
+      dup2(kept[each], each);
+      close(kept[each]);
+    }
+    EXPECT_EQ(taken, "") << url;
+  }
 }
 
 }  // namespace

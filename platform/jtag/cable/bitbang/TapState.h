@@ -1,7 +1,6 @@
 // The state machine of a TAP, as the standard draws it: pure functions, for cables that drive TMS themselves.
 #pragma once
 
-
 namespace QorRT {
 
 enum class TapState {

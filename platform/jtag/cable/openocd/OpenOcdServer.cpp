@@ -30,7 +30,6 @@ using std::chrono::milliseconds;
 
 constexpr milliseconds pollInterval{5}, exitGrace{200}, stopTimeout{1000};
 constexpr std::size_t logBytes = 16384;  // what is kept of its log
-constexpr std::string_view doubt = "Warn : Bypassing JTAG setup events due to errors";
 
 /// A program that inherits nothing but its standard streams.
 struct InheritNothing : process::extend::handler {
@@ -76,7 +75,6 @@ class Complaints {
   void add(std::string line) {
     line.erase(line.find_last_not_of(" \t\r") + 1);
     if (startsWith(line, "Error: ")) errors_.push_back(line.substr(7));
-    if (startsWith(line, doubt)) errors_.push_back(line.substr(7));
     for (const char* const start :
          {"Error:", "Warn :", "Info :", "Debug:", "Open On-Chip", "Licensed under", "For bug", "\t"})
       if (startsWith(line, start)) return;
@@ -130,8 +128,8 @@ OpenOcdServer::OpenOcdServer(const std::string& configFile, StopFunction stop)
   process::group ownGroup;  // Ctrl-C in the terminal is for the host alone
   std::error_code error;
   process_->child = process::child(programPath("openocd"), "-c", ports, "-c", "source " + quoted(configFile),
-                                   process::std_in<in, process::std_out> out, process::std_err > errors,
-                                   ownGroup, InheritNothing(), error);
+                                   "-c", "catch {tcl_port pipe}", process::std_in<in, process::std_out> out,
+                                   process::std_err > errors, ownGroup, InheritNothing(), error);
   if (error) throw std::runtime_error("openocd cannot be started: " + error.message());
   ownGroup.detach();
   process_->drain();
@@ -162,13 +160,8 @@ bool OpenOcdServer::endsWithin(milliseconds time) {
 }
 
 void OpenOcdServer::explain(const std::string& seen) {
-  throw std::runtime_error((endsWithin(exitGrace) ? "openocd has ended" : seen) + "; it says: " + errors());
-}
-
-void OpenOcdServer::requireNoDoubt() {
-  const std::string said = errors();
-  if (process_->text.find(doubt) != std::string::npos)
-    throw std::runtime_error("openocd does not trust its chain; it says: " + said);
+  const std::string what = endsWithin(exitGrace) ? "openocd has ended" : seen, said = errors();
+  throw std::runtime_error(what + (said.empty() ? "" : "; it says: ") + said);
 }
 
 std::string OpenOcdServer::errors() {

@@ -29,9 +29,6 @@ class OpenOcdServer {
   /// errors().
   [[noreturn]] void explain(const std::string& seen);
 
-  /// Throws runtime_error when the server was in doubt about its chain when it started.
-  void requireNoDoubt();
-
  private:
   struct Process;
 
