@@ -73,7 +73,9 @@ void BitbangClient::obey(char request) {
     pins_.setTrst(request >= 't');
   else if (request == 'Q')
     leaving_ = true;
-  else if (request != 'B' && request != 'b')
+  else if (request == 'B' || request == 'b')
+    pins_.setLight(request == 'B');
+  else
     sendAway("the client sent a character that means nothing: " + shown(request));
 }
 

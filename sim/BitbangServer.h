@@ -17,7 +17,7 @@ namespace qorsim {
 /// | 0 to 7     | set the wires: TCK + TMS + TDI = 4 + 2 + 1                                 |
 /// | R          | TDO, answered by 0 or 1                                                    |
 /// | r s t u    | TRST and SRST: neither, SRST, TRST, both; there is nothing that SRST resets |
-/// | B b        | a light on and off, which no board here has                                |
+/// | B b        | a light on and off                                                          |
 /// | Q          | the end of the connection                                                  |
 ///
 /// The board stays as the last client left it. Used by one thread at a time.

@@ -22,6 +22,9 @@ class QOR_API Pins {
 
   /// TRST: as long as it is asserted, the board's TAPs stay in Test-Logic-Reset.
   virtual void setTrst(bool asserted) = 0;
+
+  /// A light that clients may have on while they run their queue. Boards without one ignore it.
+  virtual void setLight(bool /*on*/) {}
 };
 
 }  // namespace qorsim

@@ -12,7 +12,7 @@
 
 namespace QorRT {
 
-std::unique_ptr<Qor_Cable> openCable(const char* url) {
+std::unique_ptr<Qor_Cable> openCable(const char* url, StopFunction) {
   const std::string_view text(url);
   const bool isSlow = text.substr(0, 5) == "slow:";
   const std::string_view kind = isSlow ? "slow:" : "lossy:";

@@ -2,14 +2,14 @@
 #pragma once
 
 #include <cstddef>
+#include <string_view>
 #include <vector>
 
 #include "ChainScan.h"
-#include "platform/jtag/cable/bitbang/TapState.h"
 
 namespace QorRT {
 
-/// Grows at its end, and knows in which state its last TCK leaves the chain. It begins in Run-Test/Idle.
+/// Grows at its end. It begins in Run-Test/Idle, and each of its steps ends there.
 class TckSequence {
  public:
   /// The bits of one TCK: TDI and TMS at its rising edge, and whether TDO is wanted there.
@@ -18,7 +18,7 @@ class TckSequence {
   /// Test-Logic-Reset from wherever the chain is, then Run-Test/Idle.
   void reset();
 
-  /// A scan through Capture, Shift and Update, back to Run-Test/Idle. `captured` asks for TDO, one bit a bit.
+  /// A scan through Capture, Shift and Update. `captured` asks for TDO, one bit a bit.
   /// @{
   void scanIr(const ChainScan& scan, bool captured = false);
   void scanDr(const ChainScan& scan, bool captured);
@@ -32,10 +32,9 @@ class TckSequence {
 
  private:
   void step(bool tmsValue, unsigned char rest = tdi);
-  void walk(TmsPath path);
-  void scan(TapState captureState, const ChainScan& scan, bool captured);
+  void walk(std::string_view tmsValues);
+  void scan(std::string_view toCapture, const ChainScan& scan, bool captured);
 
-  TapState state_ = TapState::runTestIdle;
   std::vector<unsigned char> tcks_;
   std::size_t captureCount_ = 0;
 };
