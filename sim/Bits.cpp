@@ -6,6 +6,13 @@ void appendNumber(Bits& bits, std::uint32_t value, unsigned count) {
   for (unsigned i = 0; i < count; ++i) bits.push_back(value >> i & 1);
 }
 
+Bits bitsOf(std::uint32_t value, unsigned count) {
+  Bits bits;
+  bits.reserve(count);
+  appendNumber(bits, value, count);
+  return bits;
+}
+
 std::uint32_t numberAt(const unsigned char* first, std::size_t count) {
   std::uint32_t value = 0;
   for (std::size_t i = 0; i < count; ++i) value |= std::uint32_t{first[i]} << i;

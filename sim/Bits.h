@@ -12,6 +12,9 @@ using Bits = std::vector<unsigned char>;
 /// Appends the low `count` bits of a number, least significant first.
 void appendNumber(Bits& bits, std::uint32_t value, unsigned count);
 
+/// The same as bits of their own.
+Bits bitsOf(std::uint32_t value, unsigned count);
+
 /// The number that `count` (at most 32) bits spell, least significant first.
 std::uint32_t numberAt(const unsigned char* first, std::size_t count);
 

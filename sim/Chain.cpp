@@ -1,5 +1,6 @@
 #include "sim/Chain.h"
 
+#include <algorithm>
 #include <utility>
 
 namespace qorsim {
@@ -21,41 +22,60 @@ void Chain::captureDr() {
 }
 
 void Chain::shift(bool tdi) {
+  const bool passes = leavesTime();
   for (auto tap = taps_.rbegin(); tap != taps_.rend(); ++tap) {
     const bool out = tap->out();
     tap->shift(tdi);
     tdi = out;
   }
+  if (passes) passTck();
 }
 
 void Chain::updateIr() {
   for (Tap& tap : taps_) tap.updateIr();
 }
 
-void Chain::updateDr() {
-  for (Tap& tap : taps_) tap.updateDr();
+void Chain::settle() {
+  for (Tap& tap : taps_) tap.settle();
 }
 
 void Chain::scanIr(Bits& stream) {
-  for (auto tap = taps_.rbegin(); tap != taps_.rend(); ++tap) tap->scanIr(stream);
+  captureIr();
+  shiftAll(stream);
+  updateIr();
 }
 
 void Chain::scanDr(Bits& stream) {
-  for (auto tap = taps_.rbegin(); tap != taps_.rend(); ++tap) tap->scanDr(stream);
+  captureDr();
+  shiftAll(stream);
+  settle();
 }
 
 void Chain::idle(unsigned cycles) {
-  if (tcksPerClock_ == 0) return;
-  for (unsigned i = 0; i < cycles; ++i) {
-    if (++tcks_ < tcksPerClock_) continue;
-    tcks_ = 0;
-    for (Tap& tap : taps_) tap.clock();
-  }
+  for (unsigned i = 0; i < cycles; ++i) passTck();
 }
 
 void Chain::setTcksPerClock(unsigned tcks) {
   tcksPerClock_ = tcks;
   tcks_ = 0;
+}
+
+void Chain::shiftAll(Bits& stream) {
+  for (unsigned char& bit : stream) {
+    const bool in = bit != 0;
+    bit = out();
+    shift(in);
+  }
+}
+
+bool Chain::leavesTime() const {
+  return std::any_of(taps_.begin(), taps_.end(), [](const Tap& tap) { return tap.leavesTime(); });
+}
+
+void Chain::passTck() {
+  if (tcksPerClock_ == 0 || ++tcks_ < tcksPerClock_) return;
+  tcks_ = 0;
+  for (Tap& tap : taps_) tap.clock();
 }
 
 }  // namespace qorsim

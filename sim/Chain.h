@@ -7,9 +7,9 @@
 
 namespace qorsim {
 
-/// Every whole scan begins and ends in Run-Test/Idle. The design clock stands still during scans and ticks once for
-/// every `tcksPerClock` TCKs of idle(), so that the same steps always give the same bits; with 0 it stands
-/// still altogether.
+/// The design clock ticks once for every `tcksPerClock` TCKs in Run-Test/Idle, and in Shift-DR from the end of a
+/// frame to the bit of the answer that ends the wait, so that the same steps always give the same bits, and wide
+/// cores cost no more clocks than narrow ones. With 0 it stands still.
 class Chain {
  public:
   explicit Chain(unsigned tcksPerClock) : tcksPerClock_(tcksPerClock) {}
@@ -20,19 +20,25 @@ class Chain {
   /// Test-Logic-Reset of every device.
   void reset();
 
-  /// Every device at once: capture, TCKs that bring a bit from TDI each, update. out() is the bit at TDO.
+  /// A TCK of every device in each of these states.
   /// @{
   void captureIr();
   void captureDr();
-  bool out() const { return taps_.front().out(); }
   void shift(bool tdi);
   void updateIr();
-  void updateDr();
   /// @}
 
-  /// Scans of the whole chain: replace what goes into TDI by what comes out of TDO.
+  /// A TCK in any other state, in which something that a scan began may still happen.
+  void settle();
+
+  /// The bit at TDO.
+  bool out() const { return taps_.front().out(); }
+
+  /// Scans of the whole chain from Run-Test/Idle and back: replace what goes into TDI by what comes out of TDO.
+  /// @{
   void scanIr(Bits& stream);
   void scanDr(Bits& stream);
+  /// @}
 
   /// TCKs in Run-Test/Idle.
   void idle(unsigned cycles);
@@ -41,6 +47,10 @@ class Chain {
   void setTcksPerClock(unsigned tcks);
 
  private:
+  void shiftAll(Bits& stream);
+  bool leavesTime() const;
+  void passTck();
+
   std::vector<Tap> taps_;
   unsigned tcksPerClock_;
   unsigned tcks_ = 0;  // since the last tick

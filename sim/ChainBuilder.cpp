@@ -18,7 +18,7 @@ std::unique_ptr<Core> makeCore(const CoreDescription& core) {
 }  // namespace
 
 ChainBuilder& ChainBuilder::device(unsigned idcode) {
-  devices_.push_back({{idcode, "device" + std::to_string(devices_.size()), 6}, {}});
+  devices_.push_back({{idcode, "device" + std::to_string(devices_.size()), 6}});
   return *this;
 }
 
@@ -46,6 +46,20 @@ ChainBuilder& ChainBuilder::core(unsigned userChain, unsigned index, const CoreS
   return *this;
 }
 
+ChainBuilder& ChainBuilder::lateTdi(unsigned tcks) {
+  Device& device = lastDevice("late_tdi");
+  requireRange(nameOfLast(), "late_tdi", tcks, 0, Lateness::most);
+  device.lateTdi = tcks;
+  return *this;
+}
+
+ChainBuilder& ChainBuilder::lateTdo(unsigned tcks) {
+  Device& device = lastDevice("late_tdo");
+  requireRange(nameOfLast(), "late_tdo", tcks, 0, Lateness::most);
+  device.lateTdo = tcks;
+  return *this;
+}
+
 ChainBuilder& ChainBuilder::tcksPerClock(unsigned tcks) {
   tcksPerClock_ = tcks;
   return *this;
@@ -65,7 +79,7 @@ std::unique_ptr<Chain> ChainBuilder::powerUp() const {
   if (devices_.empty()) throw BoardError("chain", "device", "is missing: a chain has at least one");
   auto chain = std::make_unique<Chain>(tcksPerClock_);
   for (const Device& device : devices_) {
-    Tap tap(device.head.idcode, device.head.irLength);
+    Tap tap(device.head.idcode, device.head.irLength, {device.lateTdi, device.lateTdo});
     for (const PlacedCore& core : device.cores)
       tap.hub(core.userChain).add(core.index, makeCore(core.description));
     chain->add(std::move(tap));

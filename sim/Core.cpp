@@ -2,11 +2,11 @@
 
 namespace qorsim {
 
-Reply Core::command(unsigned code, const Bits&, bool) {
-  return code == 0x0 || code == 0xF ? Reply::accepted : Reply::noSuchCode;
+Reply Core::reply(const Command& command) const {
+  return command.code == 0x0 || command.code == 0xF ? Reply::answered : Reply::unknown;
 }
 
-Bits Core::result(unsigned code) const {
+Bits Core::data(unsigned code) const {
   return code == 0x0 ? statusWord_ : Bits();
 }
 

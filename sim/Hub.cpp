@@ -5,8 +5,8 @@
 namespace qorsim {
 namespace {
 
-constexpr unsigned writeCode = 0x2, readCode = 0x3, mergingReadCode = 0x5;
-constexpr unsigned signature = 0xA;
+constexpr std::size_t headerBits = 24, crcBits = 32;
+constexpr unsigned unknownFlag = 2, refusedFlag = 4, repeatsFlag = 8, signature = 0xA;
 
 }  // namespace
 
@@ -14,16 +14,49 @@ void Hub::add(unsigned index, std::unique_ptr<Core> core) {
   cores_[index] = std::move(core);
 }
 
-Bits Hub::capture() {
-  resultSeen_ = (code_ == readCode || code_ == mergingReadCode) && core_ != nullptr && !core_->pending();
-  return answer();
+void Hub::capture() {
+  settle();
+  phase_ = Phase::search;
+  crc_ = {};
+  lastIn_ = false;
+  out_ = true;
 }
 
-void Hub::update(const Bits& received) {
-  if (const std::optional<Frame> frame = parseFrame(received))
-    obey(*frame);
-  else
-    reply_ = Reply::rejected;
+void Hub::shift(bool in) {
+  settle();
+  switch (phase_) {
+    case Phase::search:
+      out_ = false;
+      if (std::exchange(lastIn_, in) && !in) gather(Phase::header, headerBits);
+      break;
+    case Phase::header:
+    case Phase::headerCrc:
+    case Phase::payload:
+    case Phase::payloadCrc:
+      gatherNext(in);
+      break;
+    case Phase::zero:
+      send(Phase::head, head());
+      break;
+    case Phase::wait:
+      finishWaiting();
+      break;
+    case Phase::head:
+    case Phase::data:
+    case Phase::crc:
+      sendNext();
+      break;
+    case Phase::silence:
+      break;
+  }
+}
+
+bool Hub::leavesTime() const {
+  return phase_ == Phase::zero || phase_ == Phase::head || phase_ == Phase::wait;
+}
+
+void Hub::settle() {
+  if (std::exchange(begins_, false)) core_->begin(command_, payload_);
 }
 
 void Hub::clock() {
@@ -31,35 +64,108 @@ void Hub::clock() {
     if (core) core->clock();
 }
 
-// Head, data, CRC.
-Bits Hub::answer() const {
-  const Bits data = core_ != nullptr ? core_->result(code_) : Bits();
-  Bits out;
-  out.reserve(16 + data.size() + 16);
-  out.push_back(reply_ == Reply::rejected);
-  out.push_back(reply_ == Reply::noSuchCode);
-  out.push_back(reply_ == Reply::refused);
-  out.push_back(core_ != nullptr && core_->pending());
-  appendNumber(out, code_, 4);
-  appendNumber(out, index_, 4);
-  appendNumber(out, signature, 4);
-  out.insert(out.end(), data.begin(), data.end());
-  appendNumber(out, checksum(out.data(), out.size(), data.size()), 16);
-  return out;
+void Hub::gather(Phase phase, std::size_t count) {
+  phase_ = phase;
+  bits_.clear();
+  count_ = count;
+  if (count == 0) gathered();
 }
 
-void Hub::obey(const Frame& frame) {
-  Core* const core = cores_[frame.core].get();
-  if (frame.code != writeCode && !frame.payload.empty())
-    reply_ = Reply::rejected;
-  else if (core == nullptr)
-    reply_ = Reply::noSuchCode;
+void Hub::gatherNext(bool in) {
+  bits_.push_back(in);
+  if (bits_.size() == count_) gathered();
+}
+
+void Hub::gathered() {
+  if (phase_ == Phase::header)
+    takeHeader();
+  else if (phase_ == Phase::payload)
+    takePayload();
+  else if (!crcHolds())
+    phase_ = Phase::silence;
+  else if (phase_ == Phase::headerCrc)
+    takeCommand();
   else
-    reply_ = core->command(frame.code, frame.payload, resultSeen_ && core == core_);
-  if (reply_ == Reply::rejected || reply_ == Reply::refused) return;
-  index_ = frame.core;
-  code_ = frame.code;
-  core_ = core;
+    obeyPayload();
+}
+
+void Hub::takeHeader() {
+  crc_.add(bits_);
+  command_ = {numberAt(bits_.data(), 4), numberAt(bits_.data() + 8, 16)};
+  core_ = cores_[numberAt(bits_.data() + 4, 4)].get();
+  gather(Phase::headerCrc, crcBits);
+}
+
+void Hub::takeCommand() {
+  reply_ = core_ != nullptr ? core_->reply(command_) : Reply::unknown;
+  begins_ = reply_ == Reply::begun;
+  phase_ = Phase::zero;
+  if (reply_ == Reply::takesPayload) gather(Phase::payload, core_->payloadBits());
+}
+
+void Hub::takePayload() {
+  crc_.add(bits_);
+  payload_.swap(bits_);
+  gather(Phase::payloadCrc, crcBits);
+}
+
+void Hub::obeyPayload() {
+  begins_ = true;
+  phase_ = Phase::zero;
+}
+
+bool Hub::crcHolds() const {
+  return numberAt(bits_.data(), crcBits) == crc_.value();
+}
+
+void Hub::send(Phase phase, Bits bits) {
+  phase_ = phase;
+  bits_ = std::move(bits);
+  count_ = 0;
+  if (phase != Phase::crc) crc_.add(bits_);
+  sendNext();
+}
+
+void Hub::sendNext() {
+  if (count_ < bits_.size())
+    out_ = bits_[count_++] != 0;
+  else
+    sent();
+}
+
+// The TCK that takes the last bit.
+void Hub::sent() {
+  if (phase_ == Phase::head) {
+    phase_ = Phase::wait;
+    out_ = !waits();
+  } else if (phase_ == Phase::data) {
+    send(Phase::crc, bitsOf(crc_.value(), crcBits));
+  } else {
+    phase_ = Phase::silence;
+    out_ = false;
+    if (core_ != nullptr) core_->delivered(command_.code);
+  }
+}
+
+Bits Hub::head() const {
+  unsigned flags = 0;
+  if (reply_ == Reply::unknown) flags = unknownFlag;
+  if (reply_ == Reply::refused) flags = refusedFlag;
+  if (core_ != nullptr && core_->repeats(command_.code)) flags |= repeatsFlag;
+  return bitsOf(flags | signature << 4, 8);
+}
+
+// The 1 that ends the wait has left, or another bit of it.
+void Hub::finishWaiting() {
+  if (out_)
+    send(Phase::data, data());
+  else
+    out_ = !waits();
+}
+
+Bits Hub::data() const {
+  const bool isEmpty = reply_ == Reply::unknown || reply_ == Reply::refused;
+  return isEmpty ? Bits() : core_->data(command_.code);
 }
 
 }  // namespace qorsim

@@ -1,11 +1,11 @@
-// The hub at the end of a user chain: takes frames to its cores and brings their results back.
+// The hub at the end of a user chain: it understands a frame while it is shifted in, and answers in the same scan.
 #pragma once
 
 #include <array>
 #include <memory>
 
 #include "sim/Core.h"
-#include "sim/Frame.h"
+#include "sim/Crc.h"
 
 namespace qorsim {
 
@@ -16,30 +16,63 @@ class Hub {
   /// Puts a core behind the hub, at an index that is free.
   void add(unsigned index, std::unique_ptr<Core> core);
 
-  /// Capture-DR: what goes out first, with zeros behind it.
-  Bits capture();
+  /// A TCK in Capture-DR.
+  void capture();
 
-  /// Update-DR after that capture: all that TDI has brought since.
-  void update(const Bits& received);
+  /// The bit at its TDO end.
+  bool out() const { return out_; }
+
+  /// A TCK in Shift-DR.
+  void shift(bool in);
+
+  /// Whether the next bits are those of an answer before its data: a core may need the design clock for them.
+  bool leavesTime() const;
+
+  /// Any other TCK. What a frame begins, it begins in the TCK after its last bit.
+  void settle();
 
   /// One design clock of every core.
   void clock();
 
  private:
-  Bits answer() const;
-  void obey(const Frame& frame);
+  // First what TDI brings, then what goes to TDO.
+  enum class Phase { search, header, headerCrc, payload, payloadCrc, zero, head, wait, data, crc, silence };
+
+  void gather(Phase phase, std::size_t count);
+  void gatherNext(bool in);
+  void gathered();
+  void takeHeader();
+  void takeCommand();
+  void takePayload();
+  void obeyPayload();
+  bool crcHolds() const;
+
+  void send(Phase phase, Bits bits);
+  void sendNext();
+  void sent();
+  Bits head() const;
+  Bits data() const;
+  void finishWaiting();
+  bool waits() const { return core_ != nullptr && core_->waits(command_.code); }
 
   std::array<std::unique_ptr<Core>, coreCount> cores_;
 
-  // The last accepted frame. A frame that finds no core or no such code is accepted too, and returns nothing.
-  unsigned index_ = 0;
-  unsigned code_ = 0xF;
+  // Of the scan.
+  Phase phase_ = Phase::silence;
+  Crc crc_;  // runs over the header, a payload that is taken, head and data
+  bool lastIn_ = false;
+  bool out_ = false;
+
+  // Of the phase: bits that were gathered of `count_`, or of which `count_` were sent.
+  Bits bits_;
+  std::size_t count_ = 0;
+
+  // Of the frame.
   Core* core_ = nullptr;  // of cores_; null when there is none at that index
-
-  // The fate of the last frame of all.
-  Reply reply_ = Reply::accepted;
-
-  bool resultSeen_ = false;  // the last capture delivered a finished snapshot of core_
+  Command command_;
+  Reply reply_ = Reply::unknown;
+  Bits payload_;
+  bool begins_ = false;  // in the next TCK
 };
 
 }  // namespace qorsim

@@ -1,29 +1,25 @@
 #include "sim/PulseTrains.h"
 
-#include <iterator>
+#include <algorithm>
 
 namespace qorsim {
 
-PulseTrains::PulseTrains(unsigned width) : running_(width), staged_(width), mask_(width), values_(width) {}
-
 void PulseTrains::stage(Bits::const_reverse_iterator trains, Bits::const_reverse_iterator mask) {
-  for (std::size_t i = 0; i < mask_.size(); ++i) {
+  const auto width = static_cast<std::ptrdiff_t>(trains_.size());
+  if (std::find(mask, mask + width, 1) == mask + width) return;
+  nextStep_ = 0;
+  for (std::size_t i = 0; i < trains_.size(); ++i, ++mask, trains += steps) {
     unsigned train = 0;
-    for (unsigned step = 0; step < steps; ++step) train |= unsigned{*trains++} << step;
-    staged_[i] = static_cast<std::uint16_t>(train);
-    mask_[i] = *mask++;
-    pending_ = pending_ || mask_[i] != 0;
+    for (int step = 0; step < steps; ++step)
+      train |= unsigned{*mask != 0 ? trains[step] : values_[i]} << step;
+    trains_[i] = static_cast<std::uint16_t>(train);
   }
 }
 
 void PulseTrains::clock() {
-  for (std::size_t i = 0; i < running_.size(); ++i) {
-    const unsigned train = running_[i];
-    const unsigned next = train >> 1 | (train & 1u << (steps - 1));
-    running_[i] = pending_ && mask_[i] != 0 ? staged_[i] : static_cast<std::uint16_t>(next);
-    values_[i] = running_[i] & 1;
-  }
-  pending_ = false;
+  if (!busy()) return;
+  for (std::size_t i = 0; i < trains_.size(); ++i) values_[i] = trains_[i] >> nextStep_ & 1;
+  ++nextStep_;
 }
 
 }  // namespace qorsim

@@ -11,28 +11,26 @@ namespace qorsim {
 
 class PulseTrains {
  public:
-  static constexpr unsigned steps = 16;
+  static constexpr int steps = 16;
 
-  explicit PulseTrains(unsigned width);
+  explicit PulseTrains(unsigned width) : trains_(width), values_(width) {}
 
-  /// Keeps new trains, `steps` digits an output, for the outputs whose mask digit is 1. Nothing may be
-  /// pending.
+  /// Keeps new trains, `steps` digits an output, for the outputs whose mask digit is 1; the others hold their
+  /// values. Not while busy().
   void stage(Bits::const_reverse_iterator trains, Bits::const_reverse_iterator mask);
 
-  /// Whether staged trains wait for the design clock.
-  bool pending() const { return pending_; }
+  /// Whether trains wait for the design clock, or their last step is still to come.
+  bool busy() const { return nextStep_ < steps; }
 
-  /// One design clock: staged trains begin with their step 0; all others go on by one step and hold the last.
+  /// One design clock: the next step of the trains, whose last one is held.
   void clock();
 
   PortBits<const unsigned char> values() const { return {values_.data(), values_.size()}; }
 
  private:
-  std::vector<std::uint16_t> running_;  // bit 0 is the step that is out now
-  std::vector<std::uint16_t> staged_;   // bit 0 is step 0
-  Bits mask_;
+  std::vector<std::uint16_t> trains_;  // bit 0 is step 0
   Bits values_;
-  bool pending_ = false;
+  int nextStep_ = steps;
 };
 
 }  // namespace qorsim

@@ -1,4 +1,4 @@
-// What stands between TDI and TDO of one device, from capture to update.
+// What stands between TDI and TDO of one device that has no user register selected.
 #pragma once
 
 #include <utility>
@@ -7,34 +7,24 @@
 
 namespace qorsim {
 
-/// Bits are in the order in which they come out.
+/// Of the length of what was captured: what goes in comes out behind it. Without any bits it delivers zeros.
 class ShiftRegister {
  public:
-  /// Of a fixed length of at least 1, that of `captured`: what goes in comes out behind it.
-  static ShiftRegister passing(Bits captured) { return {std::move(captured), true}; }
-
-  /// Of no length of its own: zeros come out behind what was captured, and all that goes in is kept.
-  static ShiftRegister keeping(Bits captured) { return {std::move(captured), false}; }
+  /// Bits in the order in which they come out.
+  explicit ShiftRegister(Bits captured) : bits_(std::move(captured)) {}
 
   /// The bit at its TDO end.
-  bool out() const;
+  bool out() const { return !bits_.empty() && bits_[next_] != 0; }
 
   /// One TCK.
   void shift(bool in);
 
-  /// As many TCKs as the stream has bits, the first since capture: replaces what goes in by what comes out.
-  void shift(Bits& stream);
-
-  /// What an update takes: the bits that it holds, or, when it keeps them, all that went in.
-  Bits take();
+  /// The bits that an update takes.
+  Bits take() const;
 
  private:
-  ShiftRegister(Bits captured, bool passing) : bits_(std::move(captured)), passing_(passing) {}
-
-  // From `position_` on what comes out next; before it what went in, in the places that became free.
-  Bits bits_;
-  std::size_t position_ = 0;
-  bool passing_;
+  Bits bits_;             // a ring
+  std::size_t next_ = 0;  // the place of the bit that comes out next
 };
 
 }  // namespace qorsim

@@ -87,8 +87,15 @@ class QOR_API ChainBuilder {
   /// A core behind user chain 1 to 4 of the device, at an index of 0 to 15.
   ChainBuilder& core(unsigned userChain, unsigned index, const CoreSpec& core);
 
-  /// The design clock of all cores ticks once in so many TCKs in Run-Test/Idle: 1 when it is not set; with 0
-  /// it stands still.
+  /// The user registers of the device pass TDI to their hubs, and what their hubs deliver to TDO, so many TCKs late:
+  /// 0 to 2, and 0 when they are not set.
+  /// @{
+  ChainBuilder& lateTdi(unsigned tcks);
+  ChainBuilder& lateTdo(unsigned tcks);
+  /// @}
+
+  /// The design clock of all cores ticks once in so many of the TCKs that count, see SimCable: 1 when it is not set;
+  /// with 0 it stands still.
   ChainBuilder& tcksPerClock(unsigned tcks);
 
   /// The cable to the board, powered up.
@@ -105,7 +112,8 @@ class QOR_API ChainBuilder {
   };
   struct Device {
     QorRT::Qor_Device head;
-    std::vector<PlacedCore> cores;
+    unsigned lateTdi = 0, lateTdo = 0;
+    std::vector<PlacedCore> cores{};
   };
 
   std::unique_ptr<Chain> powerUp() const;

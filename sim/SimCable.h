@@ -15,8 +15,9 @@ class Chain;
 /// Drives the simulated chain with the scans that a real adapter would send: padded for the devices in
 /// BYPASS, bit by bit through all of them.
 ///
-/// The design clock of the board ticks once for every `tcksPerClock` TCKs spent in Run-Test/Idle, which only
-/// idle() spends, and stands still during scans: the same queue always gives the same bits.
+/// The design clock of the board ticks once for every `tcksPerClock` TCKs that count: those of idle(), and in a DR
+/// scan those from the end of a frame to the bit of the answer that ends the wait, ten when nothing waits. The same
+/// queue always gives the same bits.
 class QOR_API SimCable : public QorRT::Qor_Cable {
  public:
   /// `devices` says what stands on the chain. The builder in Sim.h makes both.

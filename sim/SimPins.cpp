@@ -30,11 +30,7 @@ void SimPins::setTrst(bool asserted) {
 
 // What a state does when it is left, or entered once more.
 void SimPins::rise(bool tms, bool tdi) {
-  if (trst_) return;
   switch (state_) {
-    case TapState::runTestIdle:
-      if (!tms) chain_->idle(1);
-      break;
     case TapState::captureDr:
       chain_->captureDr();
       break;
@@ -46,26 +42,17 @@ void SimPins::rise(bool tms, bool tdi) {
       chain_->shift(tdi);
       break;
     default:
+      chain_->settle();
+      if (state_ == TapState::runTestIdle && !tms) chain_->idle(1);
       break;
   }
-  state_ = nextState(state_, tms);
+  if (!trst_) state_ = nextState(state_, tms);
 }
 
 // What a state does half a TCK after it was entered.
 void SimPins::fall() {
-  switch (state_) {
-    case TapState::testLogicReset:
-      chain_->reset();
-      break;
-    case TapState::updateDr:
-      chain_->updateDr();
-      break;
-    case TapState::updateIr:
-      chain_->updateIr();
-      break;
-    default:
-      break;
-  }
+  if (state_ == TapState::testLogicReset) chain_->reset();
+  if (state_ == TapState::updateIr) chain_->updateIr();
   const bool shifting = state_ == TapState::shiftDr || state_ == TapState::shiftIr;
   tdo_ = !shifting || chain_->out();
 }

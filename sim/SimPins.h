@@ -13,8 +13,8 @@ enum class TapState;
 
 /// A TAP controller in front of the simulated chain. All devices share it, as they share TCK and TMS.
 ///
-/// The design clock of the board ticks once for every `tcksPerClock` TCKs that stay in Run-Test/Idle; entering
-/// and leaving it does not count. TDO is 1 outside the two Shift states, as a pull-up makes it.
+/// The design clock of the board ticks as SimCable says; of Run-Test/Idle the TCKs that stay there count, entering
+/// and leaving it does not. TDO is 1 outside the two Shift states, as a pull-up makes it.
 class QOR_API SimPins : public Pins {
  public:
   /// In Test-Logic-Reset, with TCK low. The builder in Sim.h makes the chain.

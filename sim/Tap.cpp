@@ -5,23 +5,17 @@ namespace {
 
 constexpr std::uint32_t idcodeOpcode = 1, bypassOpcode = 0xFFFFFFFF;
 
-Bits bitsOf(std::uint32_t value, unsigned count) {
-  Bits bits;
-  bits.reserve(count);
-  appendNumber(bits, value, count);
-  return bits;
-}
-
 }  // namespace
 
-Tap::Tap(std::uint32_t idcode, unsigned irLength) : idcode_(idcode), irLength_(irLength) {
+Tap::Tap(std::uint32_t idcode, unsigned irLength, Lateness lateness)
+    : idcode_(idcode), irLength_(irLength), lateness_(lateness) {
   reset();
 }
 
 Hub& Tap::hub(unsigned userChain) {
-  std::unique_ptr<Hub>& hub = hubs_[userChain - 1];
-  if (!hub) hub = std::make_unique<Hub>();
-  return *hub;
+  std::unique_ptr<UserRegister>& place = userRegisters_[userChain - 1];
+  if (!place) place = std::make_unique<UserRegister>(lateness_);
+  return place->hub;
 }
 
 void Tap::reset() {
@@ -29,51 +23,47 @@ void Tap::reset() {
 }
 
 void Tap::captureIr() {
-  register_ = ShiftRegister::passing(bitsOf(1, irLength_));
+  selected_ = nullptr;
+  register_ = ShiftRegister(bitsOf(1, irLength_));
 }
 
 void Tap::captureDr() {
-  if (Hub* const hub = selectedHub())
-    register_ = ShiftRegister::keeping(hub->capture());
-  else if (userSelected())
-    register_ = ShiftRegister::keeping({});
-  else if (instruction_ == idcodeOpcode && idcode_ != 0)
-    register_ = ShiftRegister::passing(bitsOf(idcode_, 32));
+  selected_ = isUserOpcode() ? userRegisters_[instruction_ - userOpcode(1)].get() : nullptr;
+  if (selected_ != nullptr)
+    selected_->capture();
   else
-    register_ = ShiftRegister::passing({0});
+    register_ = captured();
+}
+
+void Tap::shift(bool in) {
+  if (selected_ != nullptr)
+    selected_->shift(in);
+  else
+    register_.shift(in);
 }
 
 void Tap::updateIr() {
   instruction_ = numberAt(register_.take().data(), irLength_);
 }
 
-void Tap::updateDr() {
-  if (Hub* const hub = selectedHub()) hub->update(register_.take());
-}
-
-void Tap::scanIr(Bits& stream) {
-  captureIr();
-  register_.shift(stream);
-  updateIr();
-}
-
-void Tap::scanDr(Bits& stream) {
-  captureDr();
-  register_.shift(stream);
-  updateDr();
+void Tap::settle() {
+  for (const std::unique_ptr<UserRegister>& each : userRegisters_)
+    if (each) each->hub.settle();
 }
 
 void Tap::clock() {
-  for (const std::unique_ptr<Hub>& hub : hubs_)
-    if (hub) hub->clock();
+  for (const std::unique_ptr<UserRegister>& each : userRegisters_)
+    if (each) each->hub.clock();
 }
 
-bool Tap::userSelected() const {
+bool Tap::isUserOpcode() const {
   return instruction_ >= userOpcode(1) && instruction_ <= userOpcode(userChainCount);
 }
 
-Hub* Tap::selectedHub() const {
-  return userSelected() ? hubs_[instruction_ - userOpcode(1)].get() : nullptr;
+ShiftRegister Tap::captured() const {
+  if (isUserOpcode()) return ShiftRegister({});
+  if (instruction_ == idcodeOpcode && idcode_ != 0) return ShiftRegister(bitsOf(idcode_, 32));
+  return ShiftRegister({0});
 }
 
 }  // namespace qorsim

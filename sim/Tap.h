@@ -1,12 +1,12 @@
-// The registers of one device on the chain: captured, shifted bit by bit or as a whole scan, and updated.
+// The registers of one device on the chain: captured, shifted bit by bit, and updated.
 #pragma once
 
 #include <array>
 #include <cstdint>
 #include <memory>
 
-#include "sim/Hub.h"
 #include "sim/ShiftRegister.h"
+#include "sim/UserRegister.h"
 
 namespace qorsim {
 
@@ -21,41 +21,48 @@ class Tap {
   static constexpr std::uint32_t userOpcode(unsigned userChain) { return userChain + 1; }
 
   /// `idcode` is 0 for a device without one.
-  Tap(std::uint32_t idcode, unsigned irLength);
+  Tap(std::uint32_t idcode, unsigned irLength, Lateness lateness = {});
 
-  /// The hub behind a user chain, which appears when it is first asked for.
+  /// The hub behind a user chain, which appears when it is first asked for. A user register without a hub
+  /// delivers zeros.
   Hub& hub(unsigned userChain);
 
   /// Test-Logic-Reset: the instruction of a new TAP.
   void reset();
 
-  /// Capture, and update after it. In between, each shift is a TCK that moves the register on by one bit, out()
-  /// the one that then stands at TDO.
+  /// A TCK in each of these states.
   /// @{
   void captureIr();
   void captureDr();
-  bool out() const { return register_.out(); }
-  void shift(bool in) { register_.shift(in); }
+  void shift(bool in);
   void updateIr();
-  void updateDr();
   /// @}
 
-  /// Whole scans from capture to update: replace what TDI brings by what goes out of TDO, as many bits.
-  void scanIr(Bits& stream);
-  void scanDr(Bits& stream);
+  /// A TCK in any other state.
+  void settle();
+
+  /// The bit at TDO.
+  bool out() const { return selected_ != nullptr ? selected_->out() : register_.out(); }
+
+  /// Whether the selected hub leaves time to the design clock in the next TCK of Shift-DR.
+  bool leavesTime() const { return selected_ != nullptr && selected_->hub.leavesTime(); }
 
   /// One design clock of every core.
   void clock();
 
  private:
-  bool userSelected() const;
-  Hub* selectedHub() const;
+  bool isUserOpcode() const;
+  ShiftRegister captured() const;
 
   std::uint32_t idcode_;
   unsigned irLength_;
+  Lateness lateness_;
   std::uint32_t instruction_ = 0;
-  std::array<std::unique_ptr<Hub>, userChainCount> hubs_;
-  ShiftRegister register_ = ShiftRegister::passing({0});
+  std::array<std::unique_ptr<UserRegister>, userChainCount> userRegisters_;
+
+  // What the last capture has put between TDI and TDO: a user register, or when that is null the other.
+  UserRegister* selected_ = nullptr;
+  ShiftRegister register_{{}};
 };
 
 }  // namespace qorsim

@@ -5,6 +5,23 @@
 #include "sim/StatusWord.h"
 
 namespace qorsim {
+namespace {
+
+constexpr unsigned repeatBit = 0x8, tagsOfOneHost = 0xFFF0;
+
+bool isWrite(unsigned code) {
+  return (code & ~repeatBit) == 0x2;
+}
+
+bool isRead(unsigned code) {
+  return (code & ~repeatBit) == 0x3 || (code & ~repeatBit) == 0x5;
+}
+
+bool isRepeat(unsigned code) {
+  return (code & repeatBit) != 0;
+}
+
+}  // namespace
 
 VioCore::VioCore(const CoreDescription& core)
     : Core(statusWord(core)),
@@ -19,28 +36,57 @@ VioCore::VioCore(const CoreDescription& core)
   syncIn_.settle();
 }
 
-Reply VioCore::command(unsigned code, const Bits& payload, bool resultSeen) {
-  switch (code) {
-    case 0x2:
-      return write(payload);
-    case 0x3:
-      return requestSnapshot(false);
-    case 0x4:
-      return acknowledge(resultSeen);
-    case 0x5:
-      return requestSnapshot(true);
-    default:
-      return Core::command(code, payload, resultSeen);
+Reply VioCore::reply(const Command& command) const {
+  if (isWrite(command.code))
+    return isRepeat(command.code) ? replyToRepeatedWrite(command.tag) : replyToWrite();
+  if (!isRead(command.code)) return Core::reply(command);
+  return isRepeat(command.code) && command.tag == readTag_ ? Reply::answered : Reply::begun;
+}
+
+// No train is cut short by the next one.
+Reply VioCore::replyToWrite() const {
+  return syncOut_.busy() ? Reply::refused : Reply::takesPayload;
+}
+
+// Of another host's tag nobody knows whether it was obeyed before the last write.
+Reply VioCore::replyToRepeatedWrite(unsigned tag) const {
+  if (tag == writeTag_) return Reply::answered;
+  return ((tag ^ writeTag_) & tagsOfOneHost) != 0 ? Reply::refused : replyToWrite();
+}
+
+std::size_t VioCore::payloadBits() const {
+  return 2 * asyncOut_.size() + (PulseTrains::steps + 1) * syncOut_.values().size();
+}
+
+void VioCore::begin(const Command& command, const Bits& payload) {
+  if (isWrite(command.code)) {
+    writeTag_ = command.tag;
+    write(payload);
+  } else {
+    readTag_ = command.tag;
+    requestSnapshot((command.code & ~repeatBit) == 0x5);
   }
 }
 
-Bits VioCore::result(unsigned code) const {
-  if (code != 0x3 && code != 0x5) return Core::result(code);
+bool VioCore::waits(unsigned code) const {
+  return isWrite(code) ? syncOut_.busy() : isRead(code) && snapshotPending_;
+}
+
+bool VioCore::repeats(unsigned code) const {
+  return isRead(code) && repeats_;
+}
+
+Bits VioCore::data(unsigned code) const {
+  if (!isRead(code)) return Core::data(code);
   Bits digits;
   asyncIn_.appendRecords(digits);
   syncIn_.appendRecords(digits);
   std::reverse(digits.begin(), digits.end());
   return digits;
+}
+
+void VioCore::delivered(unsigned code) {
+  if (isRead(code)) delivered_ = true;
 }
 
 void VioCore::clock() {
@@ -53,41 +99,30 @@ void VioCore::clock() {
 }
 
 // The payload read from its top: asynchronous values, pulse trains, asynchronous mask, synchronous mask.
-Reply VioCore::write(const Bits& payload) {
-  const std::size_t asyncCount = asyncOut_.size(), syncCount = syncOut_.values().size();
-  const std::size_t trainDigits = syncCount * PulseTrains::steps;
-  if (payload.size() != 2 * asyncCount + trainDigits + syncCount) return Reply::rejected;
-  if (syncOut_.pending()) return Reply::refused;
+void VioCore::write(const Bits& payload) {
+  const auto asyncCount = static_cast<std::ptrdiff_t>(asyncOut_.size());
+  const auto syncCount = static_cast<std::ptrdiff_t>(syncOut_.values().size());
   const auto values = payload.rbegin();
-  const auto trains = values + static_cast<std::ptrdiff_t>(asyncCount);
-  const auto asyncMask = trains + static_cast<std::ptrdiff_t>(trainDigits);
-  const auto syncMask = asyncMask + static_cast<std::ptrdiff_t>(asyncCount);
-  for (std::size_t i = 0; i < asyncCount; ++i) {
-    const auto digit = static_cast<std::ptrdiff_t>(i);
-    if (asyncMask[digit] != 0) asyncOut_[i] = values[digit];
-  }
-  syncOut_.stage(trains, syncMask);
-  return Reply::accepted;
+  const auto trains = values + asyncCount;
+  const auto asyncMask = trains + syncCount * PulseTrains::steps;
+  for (std::ptrdiff_t i = 0; i < asyncCount; ++i)
+    if (asyncMask[i] != 0) asyncOut_[static_cast<std::size_t>(i)] = values[i];
+  syncOut_.stage(trains, asyncMask + asyncCount);
 }
 
-// A snapshot that was asked for in both ways merges: activity delivered twice is better than lost.
-Reply VioCore::requestSnapshot(bool alwaysMerge) {
+// One that is under way serves.
+void VioCore::requestSnapshot(bool alwaysMerges) {
+  if (snapshotPending_) return;
   snapshotPending_ = true;
-  alwaysMerge_ = alwaysMerge_ || alwaysMerge;
-  return Reply::accepted;
-}
-
-Reply VioCore::acknowledge(bool resultSeen) {
-  if (!resultSeen) return Reply::refused;
-  acknowledged_ = true;
-  return Reply::accepted;
+  merges_ = alwaysMerges || !delivered_;
+  repeats_ = merges_ && (repeats_ || delivered_);
+  delivered_ = false;
 }
 
 void VioCore::takeSnapshot() {
-  const bool merge = alwaysMerge_ || !acknowledged_;
-  asyncIn_.deliver(merge);
-  syncIn_.deliver(merge);
-  snapshotPending_ = alwaysMerge_ = acknowledged_ = false;
+  asyncIn_.deliver(merges_);
+  syncIn_.deliver(merges_);
+  snapshotPending_ = false;
 }
 
 Ports VioCore::ports() {

@@ -10,22 +10,27 @@
 
 namespace qorsim {
 
-/// Codes 02 (write), 03 and 05 (snapshot) and 04 (acknowledge). Asynchronous outputs take their values at
-/// once; pulse trains and snapshots wait for the next design clock. That clock moves the outputs, lets the
+/// Codes 02 (write), 03 and 05 (snapshot), and their repeats 0A, 0B and 0D. Asynchronous outputs take their values
+/// at once; pulse trains and snapshots wait for the next design clock. That clock moves the outputs, lets the
 /// design answer, samples the inputs and then takes the snapshot.
 class VioCore : public Core {
  public:
   explicit VioCore(const CoreDescription& core);
 
-  Reply command(unsigned code, const Bits& payload, bool resultSeen) override;
-  Bits result(unsigned code) const override;
-  bool pending() const override { return snapshotPending_ || syncOut_.pending(); }
+  Reply reply(const Command& command) const override;
+  std::size_t payloadBits() const override;
+  void begin(const Command& command, const Bits& payload) override;
+  bool waits(unsigned code) const override;
+  bool repeats(unsigned code) const override;
+  Bits data(unsigned code) const override;
+  void delivered(unsigned code) override;
   void clock() override;
 
  private:
-  Reply write(const Bits& payload);
-  Reply requestSnapshot(bool alwaysMerge);
-  Reply acknowledge(bool resultSeen);
+  Reply replyToWrite() const;
+  Reply replyToRepeatedWrite(unsigned tag) const;
+  void write(const Bits& payload);
+  void requestSnapshot(bool alwaysMerges);
   void takeSnapshot();
   Ports ports();
 
@@ -35,9 +40,12 @@ class VioCore : public Core {
   InputPort syncIn_;
   std::shared_ptr<Design> design_;
 
-  bool snapshotPending_ = false;
-  bool alwaysMerge_ = false;  // of the pending snapshot
-  bool acknowledged_ = false;
+  unsigned writeTag_ = 0;         // of the last write that was obeyed
+  unsigned readTag_ = 0;          // of the last read that was no repeat of the one before it
+  bool snapshotPending_ = false;  //
+  bool merges_ = false;           // the pending snapshot adds to the activity of the record
+  bool delivered_ = true;         // the record, and no snapshot has been asked for since
+  bool repeats_ = false;          // the record, or the one to come, may have activity of a delivered one
 };
 
 }  // namespace qorsim

@@ -19,8 +19,8 @@ using qorsim::otherCore;
 using qorsim::vio;
 
 unsigned coreType(qorsim::SimCable& cable, unsigned device, unsigned userChain, unsigned core) {
-  const std::string word = SimHost(cable, device, userChain, core).read(128, 0);
-  return static_cast<unsigned>(std::stoul(word.substr(112, 8), nullptr, 2));
+  const std::string word = SimHost(cable, device, userChain, core).send(0, 1, 128);
+  return static_cast<unsigned>(std::stoul(word.substr(3 + 112, 8), nullptr, 2));
 }
 
 TEST(SimBoard, reachesTheDeviceAtEveryPosition) {
@@ -85,11 +85,11 @@ TEST(SimBoard, readsTheExampleFile) {
   EXPECT_EQ(cable->devices()[2].irLength, 8u);
   EXPECT_EQ(coreType(*cable, 0, 1, 0), 9u);
   EXPECT_EQ(coreType(*cable, 0, 1, 1), 7u);
-  // 32 TCKs have made 16 clocks; the next one takes the snapshot.
-  const std::string records = SimHost(*cable, 2, 2, 3).read(160);
+  // The answers before have made 10 clocks; the next one takes the snapshot.
+  const std::string records = SimHost(*cable, 2, 2, 3).send(3, 1, 160).substr(3);
   std::string values;
   for (std::size_t i = 0; i < 64; i += 4) values += records[i];
-  EXPECT_EQ(values, "1000100000000000");
+  EXPECT_EQ(values, "1101000000000000");
 }
 
 class BoardFiles : public testing::Test {

@@ -1,4 +1,4 @@
-// A plain host for tests of the simulated chain: it sends frames and takes answers apart, bit by bit.
+// A plain host for tests of the simulated chain: it makes scans and takes answers apart, bit by bit.
 #pragma once
 
 #include <algorithm>
@@ -11,7 +11,7 @@
 class SimHost {
  public:
   explicit SimHost(qorsim::SimCable& cable, unsigned device = 0, unsigned userChain = 1, unsigned core = 0)
-      : cable_(cable), device_(device), core_(core) {
+      : cable_(cable), device_(device), core_(core), late_(cable.devices().size() - 1) {
     cable_.scanIr(device, userChain);
   }
 
@@ -20,40 +20,51 @@ class SimHost {
     return text;
   }
 
-  std::string frame(unsigned code, const std::string& digits = "") const {
-    const std::string body = reversed(digits) + bitsOf(core_, 4) + bitsOf(code, 4);
-    return "10" + body + checkOf(body, digits.size());
+  static Bits crcOf(const Bits& bits) {
+    unsigned crc = 0xFFFFFFFF;
+    for (const char bit : bits) crc = crc >> 1 ^ (((crc & 1) != 0) != (bit == '1') ? 0xEDB88320 : 0);
+    return bitsOf(~crc, 32);
   }
 
-  /// One DR scan of exactly these bits, then Run-Test/Idle; returns the bits that came back.
-  std::string scan(const std::string& bits, unsigned idle = 8) {
-    const std::size_t number = cable_.scanDr(device_, bytesOf(bits), bits.size(), true);
-    cable_.idle(idle);
-    return bitsOfBytes(cable_.captured(number), bits.size());
+  /// One DR scan; returns the bits that came back.
+  Bits scan(const Bits& out) {
+    const std::size_t number = cable_.scanDr(device_, bytesOf(out), out.size(), true);
+    return bitsOfBytes(cable_.captured(number), out.size());
   }
 
-  /// Sends a frame in a scan that fetches `count` digits: "HEAD DIGITS", the head in hexadecimal. An answer
-  /// with a wrong CRC, or with anything behind it, is returned as "damaged".
-  std::string sendFrame(const std::string& frame, std::size_t count = 0) {
-    const std::size_t length = std::max(frame.size(), 32 + count);
-    const std::string in = scan(std::string(length - frame.size(), '1') + frame);
-    const std::string body = in.substr(0, 16 + count);
-    if (in != body + checkOf(body, count) + std::string(length - 32 - count, '0')) return "damaged";
-    return hexOf(in.substr(0, 16)) + (count == 0 ? "" : " " + reversed(in.substr(16, count)));
+  Bits header(unsigned code, unsigned tag) const {
+    return bitsOf(code, 4) + bitsOf(core_, 4) + bitsOf(tag, 16);
   }
 
-  std::string send(unsigned code, const std::string& digits = "", std::size_t count = 0) {
-    return sendFrame(frame(code, digits), count);
+  static Bits frame(const Bits& header, const Bits& payload = "") {
+    return "10" + header + crcOf(header) + (payload.empty() ? "" : payload + crcOf(header + payload));
   }
 
-  /// Snapshot, without acknowledging it: the digits of the records.
-  std::string read(std::size_t count, unsigned code = 3) {
-    send(code);
-    return send(0xF, "", count).substr(5);
+  /// Sends a frame with room for `count` digits and 8 waiting bits, and with `missing` bits less at the end of the
+  /// scan. Returns "HEAD DIGITS", the head in hexadecimal; "HEAD waits"; "silent"; or "damaged".
+  std::string send(unsigned code, unsigned tag, std::size_t count = 0, const std::string& digits = "",
+                   std::size_t missing = 0) {
+    const Bits head = header(code, tag), payload = reversed(digits), out = frame(head, payload);
+    const Bits in = scan(out + Bits(late_ + 50 + count - missing, '1')) + Bits(missing, '0');
+    const std::size_t signature = in.find('1', 1);
+    if (in[0] != '1' || signature == Bits::npos) return "silent";
+    const bool isTaken = signature > late_ + out.size();
+    return answer(in.substr(late_ + (isTaken ? out.size() : 58)), isTaken ? head + payload : head, count);
   }
 
  private:
+  static std::string answer(const Bits& in, const Bits& understood, std::size_t count) {
+    const Bits head = in.substr(1, 8);
+    const std::size_t one = in.find('1', 9);
+    if (one == Bits::npos) return hexOf(head) + " waits";
+    const Bits data = head[1] == '1' || head[2] == '1' ? "" : in.substr(one + 1, count);
+    const Bits due = data + crcOf(understood + head + data), rest = in.substr(one + 1);
+    if (rest != due + Bits(rest.size() - due.size(), '0')) return "damaged";
+    return hexOf(head) + (data.empty() ? "" : " " + reversed(data));
+  }
+
   qorsim::SimCable& cable_;
   unsigned device_;
   unsigned core_;
+  std::size_t late_;  // the answer, by the devices in BYPASS
 };
