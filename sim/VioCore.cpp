@@ -73,7 +73,7 @@ bool VioCore::waits(unsigned code) const {
 }
 
 bool VioCore::repeats(unsigned code) const {
-  return isRead(code) && repeats_;
+  return isRead(code) && merges_;
 }
 
 Bits VioCore::data(unsigned code) const {
@@ -112,10 +112,8 @@ void VioCore::write(const Bits& payload) {
 
 // One that is under way serves.
 void VioCore::requestSnapshot(bool alwaysMerges) {
-  if (snapshotPending_) return;
+  merges_ = alwaysMerges || (snapshotPending_ ? merges_ : !delivered_);
   snapshotPending_ = true;
-  merges_ = alwaysMerges || !delivered_;
-  repeats_ = merges_ && (repeats_ || delivered_);
   delivered_ = false;
 }
 

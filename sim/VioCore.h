@@ -40,12 +40,11 @@ class VioCore : public Core {
   InputPort syncIn_;
   std::shared_ptr<Design> design_;
 
-  unsigned writeTag_ = 0;         // of the last write that was obeyed
-  unsigned readTag_ = 0;          // of the last read that was no repeat of the one before it
-  bool snapshotPending_ = false;  //
-  bool merges_ = false;           // the pending snapshot adds to the activity of the record
-  bool delivered_ = true;         // the record, and no snapshot has been asked for since
-  bool repeats_ = false;          // the record, or the one to come, may have activity of a delivered one
+  unsigned writeTag_ = 0;  // of the last write that was obeyed
+  unsigned readTag_ = 0;   // of the last read that asked for a snapshot
+  bool snapshotPending_ = false;
+  bool merges_ = false;    // the last snapshot, or the pending one, adds to the activity of the record
+  bool delivered_ = true;  // the record, and nothing has been asked for since
 };
 
 }  // namespace qorsim

@@ -40,12 +40,11 @@ class SimHost {
     return "10" + header + crcOf(header) + (payload.empty() ? "" : payload + crcOf(header + payload));
   }
 
-  /// Sends a frame with room for `count` digits and 8 waiting bits, and with `missing` bits less at the end of the
-  /// scan. Returns "HEAD DIGITS", the head in hexadecimal; "HEAD waits"; "silent"; or "damaged".
+  /// Sends a frame with room for `count` digits and `room` waiting bits; fewer than none cut the scan short. Returns "HEAD DIGITS", the head in hexadecimal; "HEAD waits"; "silent"; or "damaged".
   std::string send(unsigned code, unsigned tag, std::size_t count = 0, const std::string& digits = "",
-                   std::size_t missing = 0) {
+                   int room = 8) {
     const Bits head = header(code, tag), payload = reversed(digits), out = frame(head, payload);
-    const Bits in = scan(out + Bits(late_ + 50 + count - missing, '1')) + Bits(missing, '0');
+    const Bits in = scan(out + Bits(late_ + 42 + count + static_cast<std::size_t>(room), '1'));
     const std::size_t signature = in.find('1', 1);
     if (in[0] != '1' || signature == Bits::npos) return "silent";
     const bool isTaken = signature > late_ + out.size();
@@ -59,7 +58,7 @@ class SimHost {
     if (one == Bits::npos) return hexOf(head) + " waits";
     const Bits data = head[1] == '1' || head[2] == '1' ? "" : in.substr(one + 1, count);
     const Bits due = data + crcOf(understood + head + data), rest = in.substr(one + 1);
-    if (rest != due + Bits(rest.size() - due.size(), '0')) return "damaged";
+    if (rest.size() < due.size() || rest != due + Bits(rest.size() - due.size(), '0')) return "damaged";
     return hexOf(head) + (data.empty() ? "" : " " + reversed(data));
   }
 

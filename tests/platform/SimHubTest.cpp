@@ -31,4 +31,80 @@ TEST(SimHub, deliversTheWorkedExample) {
   for (const auto& scan : scans) EXPECT_EQ(hexOf(host.scan(bitsOfHex(scan.out, scan.bits))), scan.in);
 }
 
+// A core with one bit of every port but the synchronous inputs: its outputs loop back.
+TEST(SimHub, answersEachCommand) {
+  const std::string train(16, '1'), none(16, '0'), rise = "1" + none + "10", fall = "0" + none + "10";
+  const struct {
+    const char* what;
+    unsigned tcksPerClock, core, code, tag;
+    std::size_t count;
+    std::string digits, answer;
+  } steps[] = {
+      {"nothing", 1, 0, 0xF, 1, 0, "", "A0"},
+      {"no such core", 1, 5, 0xF, 1, 0, "", "A2"},
+      {"no such code", 1, 0, 0x4, 1, 4, "", "A2"},
+      {"a status word has no repeat", 1, 0, 0x8, 1, 128, "", "A2"},
+      {"nothing but a status word", 1, 15, 0x3, 1, 0, "", "A2"},
+      {"no payload is taken", 1, 15, 0x2, 1, 0, rise, "A2"},
+      {"nobody knows whether it was obeyed", 1, 0, 0xA, 0x12, 0, rise, "A4"},
+      {"a first write", 1, 0, 0x2, 0x11, 0, rise, "A0"},
+      {"is read", 1, 0, 0x3, 0x11, 4, "", "A0 1100"},
+      {"was obeyed already", 1, 0, 0xA, 0x11, 0, fall, "A0"},
+      {"and is not obeyed again", 1, 0, 0x3, 0x12, 4, "", "A0 1000"},
+      {"was not obeyed yet", 1, 0, 0xA, 0x12, 0, fall, "A0"},
+      {"of another host", 1, 0, 0xA, 0x22, 0, rise, "A4"},
+      {"repeats the record before", 1, 0, 0xB, 0x12, 4, "", "A0 1000"},
+      {"asks anew", 1, 0, 0xB, 0x13, 4, "", "A0 0010"},
+      {"merges a record that was delivered", 1, 0, 0x5, 0x14, 4, "", "A8 0010"},
+      {"repeats that", 1, 0, 0xD, 0x14, 4, "", "A8 0010"},
+      {"a train on a stopped clock", 0, 0, 0x2, 0x13, 0, "1" + train + "11", "A0 waits"},
+      {"keeps other writes away", 0, 0, 0x2, 0x14, 0, fall, "A4 waits"},
+      {"and repeats", 0, 0, 0xA, 0x14, 0, fall, "A4 waits"},
+      {"but is repeated", 0, 0, 0xA, 0x13, 0, fall, "A0 waits"},
+      {"a read waits too", 0, 0, 0x3, 0x15, 4, "", "A0 waits"},
+      {"a snapshot under way serves", 0, 0, 0x3, 0x16, 4, "", "A0 waits"},
+      {"which is of the last tag", 0, 0, 0xB, 0x16, 4, "", "A0 waits"},
+      {"nothing else waits", 0, 0, 0xF, 0, 0, "", "A0"},
+      {"with a clock it is taken", 1, 0, 0xB, 0x16, 4, "", "A0 1100"},
+      {"and delivered once more", 1, 0, 0xB, 0x16, 4, "", "A0 1100"},
+      {"a merge that joins a snapshot", 0, 0, 0x3, 0x17, 4, "", "A0 waits"},
+      {"merges", 0, 0, 0x5, 0x18, 4, "", "A8 waits"},
+      {"what was delivered", 1, 0, 0xD, 0x18, 4, "", "A8 1100"},
+      {"the train is over", 1, 0, 0x2, 0x14, 0, fall, "A0"},
+      {"a slow clock finds no room", 100, 0, 0x3, 0x19, 4, "", "A0 waits"},
+  };
+  const auto core = vio().asyncOut(1).syncOut(1).asyncIn(1).design(qorsim::loopback());
+  const auto cable = chain().device().core(1, 0, core).core(1, 15, qorsim::otherCore(7)).cable();
+  for (const auto& step : steps) {
+    cable->setTcksPerClock(step.tcksPerClock);
+    SimHost host(*cable, 0, 1, step.core);
+    EXPECT_EQ(host.send(step.code, step.tag, step.count, step.digits), step.answer) << step.what;
+  }
+}
+
+TEST(SimHub, isSilentAfterACrcThatDoesNotHold) {
+  const auto cable =
+      chain().device().core(1, 0, vio().asyncOut(4).asyncIn(4).design(qorsim::loopback())).cable();
+  SimHost host(*cable);
+  const Bits whole = host.frame(host.header(2, 1), "11111111") + Bits(60, '1'), silent = "1" + Bits(157, '0');
+  for (std::size_t i = 0; i + 60 < whole.size(); ++i) {
+    Bits out = whole;
+    out[i] = out[i] == '1' ? '0' : '1';
+    EXPECT_EQ(host.scan(out), silent.substr(0, out.size())) << i;
+  }
+  EXPECT_EQ(host.send(3, 1, 16), "A0 " + Bits(16, '0'));
+}
+
+TEST(SimHub, isReachedLateAndAnswersLate) {
+  for (unsigned tdi = 0; tdi <= 2; ++tdi) {
+    for (unsigned tdo = 0; tdo <= 2; ++tdo) {
+      const auto cable = chain().device().lateTdi(tdi).lateTdo(tdo).core(1, 0, qorsim::otherCore(7)).cable();
+      SimHost host(*cable);
+      const Bits in = host.scan(host.frame(host.header(0xF, 1)) + Bits(60, '1'));
+      EXPECT_EQ(in.find('1'), tdo);
+      EXPECT_EQ(in.find('1', tdo + 1), 58 + 1 + 5 + tdi + tdo);
+    }
+  }
+}
+
 }  // namespace
