@@ -10,6 +10,8 @@ function(qor_shared_library target)
   qor_strict(${target})
   target_compile_features(${target} PUBLIC cxx_std_17)
   set_target_properties(${target} PROPERTIES VERSION ${PROJECT_VERSION} SOVERSION ${PROJECT_VERSION_MAJOR})
+  # Sessions live on in one library while cores and cables of another are in them: none is ever unloaded.
+  target_link_options(${target} PRIVATE -Wl,-z,nodelete)
   if(NOT CMAKE_CXX_FLAGS MATCHES "-fsanitize")
     target_link_options(${target} PRIVATE -Wl,--no-undefined)
   endif()

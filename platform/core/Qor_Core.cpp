@@ -14,6 +14,10 @@ Qor_ByteBuffer copyOf(const unsigned char* bytes, unsigned bitCount) {
 
 }  // namespace
 
+Qor_NoHub::Qor_NoHub(const std::string& text) : std::runtime_error(text) {}
+Qor_NoHub::Qor_NoHub(const Qor_NoHub&) = default;
+Qor_NoHub::~Qor_NoHub() = default;
+
 Qor_Core::Qor_Core(unsigned session, QOR_CORE_REF coreRef, QOR_CORE_INFO coreInfo,
                    const unsigned char* statusWord, unsigned bitCount)
     : session_(session), coreRef_(coreRef), coreInfo_(coreInfo), statusWord_(copyOf(statusWord, bitCount)) {}

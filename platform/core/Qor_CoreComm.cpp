@@ -1,6 +1,7 @@
 #include <algorithm>
 #include <cstdint>
 #include <stdexcept>
+#include <utility>
 
 #include "QorCore.h"
 #include "platform/core/Qor_CommandText.h"
@@ -13,6 +14,10 @@ namespace {
 
 constexpr unsigned coreFound = 0, noSuchCore = 1;
 
+Qor_HubAccess hubAccess(unsigned session, const QOR_CORE_REF& coreRef, Qor_CoreLink& link) {
+  return {sessionCable(session), sessionRecord(session), link, coreRef};
+}
+
 /// Zeroes `*coreInfo` and `bitCount` bits of `bytes`, then fills both if there is a core; false if not.
 bool readStatus(unsigned session, const QOR_CORE_REF& coreRef, QOR_CORE_INFO* coreInfo, unsigned char* bytes,
                 std::size_t bitCount) {
@@ -20,7 +25,8 @@ bool readStatus(unsigned session, const QOR_CORE_REF& coreRef, QOR_CORE_INFO* co
   *coreInfo = {};
   std::fill_n(bytes, (bitCount + 7) / 8, static_cast<unsigned char>(0));
   Qor_StatusWord word{};
-  if (!Qor_HubAccess(sessionCable(session), coreRef).readStatus(word)) return false;
+  const std::shared_ptr<Qor_SessionCores> cores = Qor_SessionCores::open(session);
+  if (!hubAccess(session, coreRef, cores->link(coreRef)).readStatus(word)) return false;
   *coreInfo = {word[0], word[1], word[2], word[3], word[4]};
   std::copy_n(word.begin(), std::min((bitCount + 7) / 8, statusWordBytes), bytes);
   if (bitCount % 8 != 0) bytes[bitCount / 8] &= static_cast<unsigned char>((1U << bitCount % 8) - 1);
@@ -47,44 +53,43 @@ void report(QOR_PROGRESS_CALLBACK progress, unsigned session, std::size_t done, 
   if (answer == QOR_PROGRESS_ABORT) throw std::logic_error("Qor abort command");
 }
 
-/// The reads of one text. Each is noted before its scans and struck off when its bits are with the caller, so
-/// that whatever goes wrong between makes the next read keep the activity that this one took.
-class ReadNotes {
+/// The reads of one text. The activity that each takes out of the inputs is owed from before its scan until its bits
+/// are with the caller, so that whatever goes wrong between makes the next read tell it again.
+class Reads {
  public:
-  explicit ReadNotes(unsigned session) : session_(session) {}
-
-  /// True when an earlier text did not bring home a read of the address, and this one has not yet.
-  bool note(const QOR_CORE_REF& coreRef) {
-    if (cores_ == nullptr) cores_ = Qor_SessionCores::open(session_);
-    const bool isFirst = noted_.insert(coreRef).second;
-    return cores_->note(Qor_Transfer::read, coreRef) && isFirst;
+  /// True when an earlier text owes the activity of a read, and this one has not read the core yet.
+  bool begin(Qor_CoreLink& link) {
+    const bool isFirst = std::find(links_.begin(), links_.end(), &link) == links_.end();
+    if (isFirst) links_.push_back(&link);
+    return std::exchange(link.readIsOwed, true) && isFirst;
   }
 
-  void strikeOff() noexcept {
-    for (const QOR_CORE_REF& coreRef : noted_) cores_->succeeded(Qor_Transfer::read, coreRef);
+  void delivered() noexcept {
+    for (Qor_CoreLink* link : links_) link->readIsOwed = false;
   }
 
  private:
-  const unsigned session_;
-  std::shared_ptr<Qor_SessionCores> cores_;
-  std::set<QOR_CORE_REF, Qor_AddressOrder> noted_;
+  std::vector<Qor_CoreLink*> links_;
 };
 
-void runWrite(unsigned session, const Qor_PortCommand& command) {
-  Qor_HubAccess hub(sessionCable(session), command.coreRef);
-  const std::shared_ptr<Qor_SessionCores> cores = Qor_SessionCores::open(session);
-  if (cores->note(Qor_Transfer::write, command.coreRef)) hub.settle();
-  hub.write(command.payload, command.bitCount);
-  cores->succeeded(Qor_Transfer::write, command.coreRef);
+/// The mask of the synchronous outputs is the lowest part of a write's data.
+bool marksSyncOutputs(const Qor_PortCommand& command, std::size_t syncOutputs) {
+  const std::size_t end = std::min(syncOutputs, command.bitCount);
+  return findOne(command.payload, 0, end) < end;
+}
+
+void runWrite(unsigned session, const Qor_PortCommand& command, Qor_SessionCores& cores) {
+  const bool playsTrains = marksSyncOutputs(command, cores.syncOutputCount(command.coreRef));
+  hubAccess(session, command.coreRef, cores.link(command.coreRef))
+      .write(command.payload, command.bitCount, playsTrains);
 }
 
 /// Appends what the command returns.
-void runRead(unsigned session, const Qor_PortCommand& command, ReadNotes& notes,
-             std::vector<unsigned char>& result) {
-  Qor_HubAccess hub(sessionCable(session), command.coreRef);
-  const bool afterFailure = notes.note(command.coreRef);
-  if (afterFailure) hub.settle();
-  const Qor_ReadResult read = hub.read(command.bitCount, afterFailure);
+void runRead(unsigned session, const Qor_PortCommand& command, Qor_SessionCores& cores, Reads& reads,
+             Qor_Bytes& result) {
+  Qor_CoreLink& link = cores.link(command.coreRef);
+  Qor_HubAccess hub = hubAccess(session, command.coreRef, link);
+  const Qor_ReadResult read = hub.read(command.bitCount, reads.begin(link));
   result.insert(result.end(), read.bits.begin(), read.bits.end());
   result.push_back(static_cast<unsigned char>(read.flags));
 }
@@ -104,19 +109,20 @@ void Qor_CoreComm::commandSequence(unsigned session, const std::string& text, un
                                    unsigned resultBitCount, QOR_PROGRESS_CALLBACK progress) {
   const std::vector<Qor_PortCommand> commands = parseCommandText(text);
   requireResult(commands, result, resultBitCount);
-  std::vector<unsigned char> read;
-  ReadNotes notes(session);
+  const std::shared_ptr<Qor_SessionCores> cores = Qor_SessionCores::open(session);
+  Qor_Bytes read;
+  Reads reads;
   for (std::size_t i = 0; i < commands.size(); ++i) {
     report(progress, session, i, commands.size());
     if (commands[i].isRead) {
-      runRead(session, commands[i], notes, read);
+      runRead(session, commands[i], *cores, reads, read);
     } else {
-      runWrite(session, commands[i]);
+      runWrite(session, commands[i], *cores);
     }
   }
   report(progress, session, commands.size(), commands.size());
   std::copy(read.begin(), read.end(), result);
-  notes.strikeOff();
+  reads.delivered();
 }
 
 }  // namespace QorRT

@@ -1,137 +1,122 @@
 #include "platform/core/Qor_Frame.h"
 
 #include <algorithm>
-#include <cstdint>
 
 #include "QorUtil.h"
-#include "platform/core/Qor_Crc.h"
 
 namespace QorRT {
 namespace {
 
-constexpr std::size_t prefixBits = 2, addressBits = 8, crcBits = 16, headBits = 16;
+constexpr std::size_t startBits = 2, headerBits = 24, crcBits = 32, headBits = 8;
+constexpr std::size_t frameBits = startBits + headerBits + crcBits;
+constexpr std::size_t gapBits = 1;    // the 0 before the head
+constexpr std::size_t readyBits = 1;  // the 1 before the data
+constexpr std::size_t resultCrcBits = 16;
+constexpr unsigned signature = 0xA;
 
-constexpr unsigned rejectedFlag = 1, noSuchCoreFlag = 2, refusedFlag = 4, pendingFlag = 8;
-constexpr unsigned flagMask = 0xF, echoMask = 0xFF0, signatureMask = 0xF000, signature = 0xA000;
-
-/// ORs the low 16 bits of `value` into the bits from `at` on, which must be 0.
-void putBits(std::vector<unsigned char>& bytes, std::size_t at, unsigned value) {
-  std::uint32_t word = std::uint32_t{value} << at % 8;
-  for (std::size_t i = at / 8; word != 0; ++i, word >>= 8) bytes[i] |= static_cast<unsigned char>(word);
+std::uint32_t headerOf(const Qor_Request& request) {
+  return request.code | request.core << 4 | request.tag << 8;
 }
 
-unsigned wordAt(const std::vector<unsigned char>& bytes, std::size_t at) {
-  std::uint32_t word = 0;
-  for (std::size_t i = (at + 15) / 8 + 1; i-- > at / 8;) word = word << 8 | bytes[i];
-  return word >> at % 8 & 0xFFFF;
+void addNumber(Qor_Crc32& crc, std::uint32_t value, std::size_t bitCount) {
+  const unsigned char bytes[] = {static_cast<unsigned char>(value), static_cast<unsigned char>(value >> 8),
+                                 static_cast<unsigned char>(value >> 16)};
+  crc.add(bytes, bitCount);
 }
 
-/// Payload, core index, code and CRC.
-std::vector<unsigned char> buildMessage(const Qor_Frame& frame, unsigned coreIndex) {
-  const std::size_t crcAt = frame.payloadBits + addressBits;
-  std::vector<unsigned char> message((crcAt + crcBits + 7) / 8);
-  if (frame.payload != nullptr) {
-    std::copy_n(frame.payload->begin(), (frame.payloadBits + 7) / 8, message.begin());
-  }
-  putBits(message, frame.payloadBits, coreIndex | frame.code << 4);
-  putBits(message, crcAt, crc16(message.data(), crcAt) ^ (frame.payloadBits & 0xFFFF));
-  return message;
+/// The bits that the payload takes, with its CRC.
+std::size_t payloadPart(const Qor_Request& request) {
+  return request.payload == nullptr ? 0 : request.payloadBits + crcBits;
 }
 
-/// Replaces everything in `bytes` from bit `at` on; `message` reaches to their end.
-void placeAt(std::vector<unsigned char>& bytes, std::size_t at, const std::vector<unsigned char>& message) {
-  const std::size_t shift = at % 8;
-  std::size_t index = at / 8;
-  unsigned carry = bytes[index] & ((1U << shift) - 1);
-  for (const unsigned char byte : message) {
-    carry |= static_cast<unsigned>(byte) << shift;
-    bytes[index++] = static_cast<unsigned char>(carry);
-    carry >>= 8;
-  }
-  if (index < bytes.size()) bytes[index] = static_cast<unsigned char>(carry);
-}
-
-bool allBits(const std::vector<unsigned char>& bytes, std::size_t bitCount, unsigned char eight) {
-  const auto last = bytes.begin() + static_cast<std::ptrdiff_t>(bitCount / 8);
-  if (!std::all_of(bytes.begin(), last, [eight](unsigned char byte) { return byte == eight; })) return false;
+bool isAll(const Qor_Bytes& bits, std::size_t bitCount, unsigned char eight) {
+  const auto last = bits.begin() + static_cast<std::ptrdiff_t>(bitCount / 8);
+  if (!std::all_of(bits.begin(), last, [eight](unsigned char byte) { return byte == eight; })) return false;
   return bitCount % 8 == 0 || ((*last ^ eight) & ((1U << bitCount % 8) - 1)) == 0;
 }
 
-bool crcHolds(const std::vector<unsigned char>& answer, std::size_t dataBits) {
-  const std::size_t crcAt = headBits + dataBits;
-  return wordAt(answer, crcAt) == (crc16(answer.data(), crcAt) ^ (dataBits & 0xFFFF));
-}
-
-Qor_Verdict judgeSilence(const std::vector<unsigned char>& answer, std::size_t bitCount) {
-  if (allBits(answer, bitCount, 0x00)) return Qor_Verdict::allZeros;
-  if (allBits(answer, bitCount, 0xFF)) return Qor_Verdict::allOnes;
-  return Qor_Verdict::noSignature;
-}
-
-/// Of a head that echoes our frame or, of a frame that was not taken, an earlier one.
-Qor_Verdict judgeFlags(unsigned flags) {
-  if ((flags & rejectedFlag) != 0) return Qor_Verdict::rejected;
-  if ((flags & refusedFlag) != 0) return Qor_Verdict::refused;
-  if ((flags & noSuchCoreFlag) != 0) return Qor_Verdict::noSuchCore;
-  return (flags & pendingFlag) != 0 ? Qor_Verdict::pending : Qor_Verdict::good;
-}
-
-std::string headText(const std::vector<unsigned char>& answer) {
+std::string hexText(std::uint32_t value, unsigned bits) {
   std::string digits;
-  return Qor_NumberUtil::uInt2HexStr(answerHead(answer), headBits, digits);
+  return Qor_NumberUtil::uInt2HexStr(value, bits, digits);
+}
+
+std::string silenceText(const Qor_Capture& capture) {
+  const std::string text = "no debug hub answers, TDO is ";
+  if (isAll(capture.bits, capture.bitCount, 0x00)) return text + "all zeros";
+  if (isAll(capture.bits, capture.bitCount, 0xFF)) return text + "all ones";
+  return text + "another pattern, its first 32 bits " + hexText(bitsAt(capture.bits, 0, 32), 32);
 }
 
 }  // namespace
 
-std::size_t frameLength(const Qor_Frame& frame) {
-  return prefixBits + frame.payloadBits + addressBits + crcBits;
+Qor_Frame::Qor_Frame(const Qor_Request& request) : request_(request) {
+  addNumber(afterHeader_, headerOf(request), headerBits);
+  afterPayload_ = afterHeader_;
+  if (request.payload != nullptr) afterPayload_.add(request.payload->data(), request.payloadBits);
 }
 
-std::size_t answerLength(const Qor_Frame& frame) {
-  return headBits + frame.answerBits + crcBits;
+std::size_t Qor_Frame::scanBits(std::size_t room) const {
+  return frameBits + payloadPart(request_) + gapBits + headBits + room + readyBits + request_.answerBits +
+         crcBits;
 }
 
-std::vector<unsigned char> buildScan(const Qor_Frame& frame, unsigned coreIndex, std::size_t scanBits) {
-  const std::vector<unsigned char> message = buildMessage(frame, coreIndex);
-  const std::size_t messageAt = scanBits - (frameLength(frame) - prefixBits);
-  std::vector<unsigned char> scan((scanBits + 7) / 8, 0xFF);
-  placeAt(scan, messageAt, message);
-  const std::size_t zeroAt = messageAt - 1;
-  scan[zeroAt / 8] &= static_cast<unsigned char>(~(1U << zeroAt % 8));
-  return scan;
+Qor_Bytes Qor_Frame::scan(std::size_t bitCount) const {
+  Qor_Bytes bits(byteCount(bitCount), 0xFF);
+  putBits(bits, 0, startBits, 1);
+  putBits(bits, startBits, headerBits, headerOf(request_));
+  putBits(bits, startBits + headerBits, crcBits, afterHeader_.value());
+  if (request_.payload != nullptr) {
+    placeBytes(bits, frameBits, *request_.payload);
+    putBits(bits, frameBits + request_.payloadBits, crcBits, afterPayload_.value());
+  }
+  return bits;
 }
 
-unsigned answerHead(const std::vector<unsigned char>& answer) {
-  return wordAt(answer, 0);
+Qor_Answer Qor_Frame::judge(const Qor_Capture& capture) const {
+  const std::size_t headAt = capture.late + frameBits + gapBits;
+  const bool isPayloadTaken = request_.payload != nullptr && bitsAt(capture.bits, headAt, headBits) == 0;
+  return isPayloadTaken ? judgeAt(capture, headAt + payloadPart(request_), afterPayload_)
+                        : judgeAt(capture, headAt, afterHeader_);
 }
 
-Qor_Verdict judgeAnswer(const std::vector<unsigned char>& answer, const Qor_Frame& frame,
-                        unsigned coreIndex) {
-  const unsigned head = answerHead(answer);
-  if ((head & signatureMask) != signature) return judgeSilence(answer, answerLength(frame));
-  const unsigned flags = head & flagMask;
-  const bool isEcho = (head & echoMask) == (coreIndex << 8 | frame.code << 4);
-  if (!isEcho && (flags & (rejectedFlag | refusedFlag)) == 0) return Qor_Verdict::anotherFrame;
-  // Nothing but a frame that was taken by its core has data behind the head.
-  const bool hasData = isEcho && (flags & noSuchCoreFlag) == 0;
-  return crcHolds(answer, hasData ? frame.answerBits : 0) ? judgeFlags(flags) : Qor_Verdict::badCrc;
+Qor_Answer Qor_Frame::judgeAt(const Qor_Capture& capture, std::size_t headAt, Qor_Crc32 crc) const {
+  Qor_Answer answer{Qor_Verdict::noHead, bitsAt(capture.bits, headAt, headBits)};
+  if (answer.head >> 4 != signature) {
+    if (answer.head != 0) answer.verdict = Qor_Verdict::wrongHead;
+    if (findHello(capture.bits) > 2) answer.verdict = Qor_Verdict::noHub;
+    return answer;
+  }
+  const std::size_t readyAt = findOne(capture.bits, headAt + headBits, capture.bitCount);
+  const std::size_t dataAt = readyAt + readyBits;
+  const std::size_t dataBits = answer.isRefused() || answer.isNoSuchCore() ? 0 : request_.answerBits;
+  answer.waited = readyAt - headAt - headBits;
+  answer.verdict = Qor_Verdict::slow;
+  if (dataAt + dataBits + crcBits > capture.bitCount) return answer;
+  answer.bits = copyBits(capture.bits, dataAt, dataBits + resultCrcBits);
+  addNumber(crc, answer.head, headBits);
+  crc.add(answer.bits.data(), dataBits);
+  const bool holds = bitsAt(capture.bits, dataAt + dataBits, crcBits) == crc.value();
+  answer.verdict = holds ? Qor_Verdict::good : Qor_Verdict::badCrc;
+  return answer;
 }
 
-std::string failureText(Qor_Verdict verdict, const std::vector<unsigned char>& answer,
-                        const Qor_Frame& frame) {
-  switch (verdict) {
-    case Qor_Verdict::rejected:
-      return "the frame was rejected";
-    case Qor_Verdict::allZeros:
-      return "no debug hub answers, TDO is all zeros";
-    case Qor_Verdict::allOnes:
-      return "no debug hub answers, TDO is all ones";
-    case Qor_Verdict::noSignature:
-      return "no debug hub answers, TDO is another pattern, head " + headText(answer);
-    case Qor_Verdict::badCrc:
-      return "the CRC of the answer does not hold over " + std::to_string(frame.answerBits) + " data bits";
+std::size_t findHello(const Qor_Bytes& bits) {
+  const std::size_t first = findOne(bits, 0, 3);
+  const std::size_t end = first + 1 + 32;
+  return first < 3 && findOne(bits, first + 1, end) == end ? first
+                                                           : 3;  // ones, or an echo of the frame, are no hub
+}
+
+std::string failureText(const Qor_Answer& answer, const Qor_Capture& capture, const Qor_Request& request) {
+  switch (answer.verdict) {
+    case Qor_Verdict::noHub:
+      return silenceText(capture);
+    case Qor_Verdict::noHead:
+      return "the hub did not answer the frame";
+    case Qor_Verdict::wrongHead:
+      return "the answer begins with " + hexText(answer.head, 8) + ", which is no head";
     default:
-      return "the answer is to another frame, head " + headText(answer);
+      return "the CRC of the answer does not hold over " + std::to_string(request.answerBits) + " data bits";
   }
 }
 

@@ -1,17 +1,17 @@
 #include "platform/core/Qor_HubAccess.h"
 
 #include <algorithm>
+#include <chrono>
 #include <stdexcept>
 
+#include "QorCore.h"
+#include "platform/core/Qor_Attempts.h"
 #include "platform/core/Qor_SessionCores.h"
 
 namespace QorRT {
 namespace {
 
-/// TCKs in Run-Test/Idle after each frame, first try first.
-constexpr unsigned idleCyclesOfTry[] = {8, 64, 512, 4096, 32768};
-
-constexpr std::size_t headBytes = 2, checkBits = 16;
+constexpr std::size_t mostLate = 2;  // of TDI and of TDO, in TCKs
 
 /// Leaves nothing queued, whatever throws.
 class QueueGuard {
@@ -25,96 +25,164 @@ class QueueGuard {
   Qor_Cable& cable_;
 };
 
-/// What to send in the place of a frame that has to be repeated.
-Qor_Frame repeatOf(const Qor_Frame& frame, Qor_Verdict verdict) {
-  Qor_Frame next = frame;
-  if (frame.code == Qor_HubCode::read) next.code = Qor_HubCode::readAgain;
-  // A pending write was taken: sent again, its pulse trains would play twice.
-  if (frame.code == Qor_HubCode::write && verdict == Qor_Verdict::pending) next = {Qor_HubCode::nothing};
-  return next;
+std::uint64_t& repeatsOf(const Qor_Answer& answer, QorJtag_Statistics& statistics) {
+  switch (answer.verdict) {
+    case Qor_Verdict::good:
+      return statistics.repeatsRefused;
+    case Qor_Verdict::slow:
+      return statistics.repeatsSlow;
+    case Qor_Verdict::noHub:
+      return statistics.repeatsNoHub;
+    case Qor_Verdict::badCrc:
+      return statistics.repeatsBadCrc;
+    default:
+      return statistics.repeatsNoHead;
+  }
 }
 
-/// The bytes behind the head, with the bits from `bitCount` on cleared.
-std::vector<unsigned char> bitsBehindHead(const std::vector<unsigned char>& answer, std::size_t bitCount) {
-  std::vector<unsigned char> bits(answer.begin() + headBytes, answer.end());
-  if (bitCount % 8 != 0) bits.back() &= static_cast<unsigned char>((1U << bitCount % 8) - 1);
-  return bits;
+std::string waitText(const Qor_Answer& answer, bool mayBeDone) {
+  const bool isAnothers = answer.verdict == Qor_Verdict::good && mayBeDone;
+  return isAnothers
+             ? "the write was refused when repeated: another program wrote to the core, or its design clock "
+               "stopped"
+             : "design clock stopped";
+}
+
+std::uint64_t nanosecondsSince(std::chrono::steady_clock::time_point begin) {
+  const std::chrono::nanoseconds passed = std::chrono::steady_clock::now() - begin;
+  return static_cast<std::uint64_t>(passed.count());
 }
 
 }  // namespace
 
-Qor_HubAccess::Qor_HubAccess(Qor_Cable& cable, const QOR_CORE_REF& coreRef)
-    : cable_(cable), coreRef_(coreRef) {
+Qor_HubAccess::Qor_HubAccess(Qor_Cable& cable, Qor_LinkRecord& record, Qor_CoreLink& link,
+                             const QOR_CORE_REF& coreRef)
+    : cable_(cable), record_(record), link_(link), coreRef_(coreRef), lead_(cable.devices().size() - 1) {
   if (coreRef.core_index <= 15) return;
   throw std::logic_error("the core index " + std::to_string(coreRef.core_index) + " is above 15");
 }
 
-void Qor_HubAccess::settle() {
-  run({{Qor_HubCode::nothing}, {Qor_HubCode::nothing}});
-}
-
 bool Qor_HubAccess::readStatus(Qor_StatusWord& word) {
-  const auto answers = run({{Qor_HubCode::status, 8 * statusWordBytes}, {Qor_HubCode::nothing}});
-  if (!answers) return false;
-  std::copy_n(answers->front().begin() + headBytes, statusWordBytes, word.begin());
+  Qor_WaitingRoom room(leastRoom);
+  const Qor_Answer answer =
+      ask({Qor_HubCode::status, coreRef_.core_index, link_.readTags.upcoming(), 8 * statusWordBytes}, room);
+  if (answer.isNoSuchCore()) return false;
+  std::copy_n(answer.bits.begin(), statusWordBytes, word.begin());
   return true;
 }
 
-void Qor_HubAccess::write(const std::vector<unsigned char>& payload, std::size_t bitCount) {
-  if (!run({{Qor_HubCode::write, 0, &payload, bitCount}, {Qor_HubCode::nothing}})) {
-    fail("no such core, or it cannot be written");
+void Qor_HubAccess::write(const Qor_Bytes& payload, std::size_t bitCount, bool playsTrains) {
+  try {
+    if (!link_.knowsWriteTags) introduce(bitCount);
+    const Qor_Request request{Qor_HubCode::write, coreRef_.core_index, link_.writeTags.next(), 0, &payload,
+                              bitCount,           Qor_HubCode::repeat};
+    const Qor_Answer answer = ask(request, playsTrains ? link_.playRoom : link_.writeRoom);
+    if (answer.isNoSuchCore()) fail("no such core, or it cannot be written");
+    link_.writeTags.succeeded();
+  } catch (...) {
+    if (link_.writeTags.failed()) link_.knowsWriteTags = false;
+    throw;
   }
 }
 
-Qor_ReadResult Qor_HubAccess::read(std::size_t recordBits, bool afterFailure) {
-  const unsigned code = afterFailure ? Qor_HubCode::readAgain : Qor_HubCode::read;
-  const auto answers = run({{code, recordBits}, {Qor_HubCode::acknowledge}, {Qor_HubCode::nothing}});
-  if (!answers) fail("no such core, or it cannot be read");
-  return {bitsBehindHead(answers->front(), recordBits + checkBits), answerHead(answers->back()) & 0xF};
+// A write that marks no output. Only a hub that has obeyed one of our tags can tell whether a repeat was obeyed before.
+void Qor_HubAccess::introduce(std::size_t payloadBits) {
+  const Qor_Bytes nothing(byteCount(payloadBits));
+  const Qor_Answer answer =
+      ask({Qor_HubCode::write, coreRef_.core_index, link_.writeTags.current(), 0, &nothing, payloadBits},
+          link_.writeRoom);
+  link_.knowsWriteTags = !answer.isNoSuchCore();
 }
 
-std::optional<Qor_HubAccess::Answers> Qor_HubAccess::run(Frames frames) {
-  for (const unsigned idleCycles : idleCyclesOfTry) {
-    Answers answers = exchange(frames, idleCycles);
-    Qor_Verdict verdict = Qor_Verdict::good;
-    std::size_t i = 0;
-    for (; i < answers.size() && verdict == Qor_Verdict::good; ++i) {
-      verdict = judgeAnswer(answers[i], frames[i], coreRef_.core_index);
-    }
-    if (verdict == Qor_Verdict::good) return answers;
-    if (verdict == Qor_Verdict::noSuchCore) return std::nullopt;
-    if (verdict != Qor_Verdict::pending && verdict != Qor_Verdict::refused) {
-      fail(failureText(verdict, answers[i - 1], frames[i - 1]));
-    }
-    frames.front() = repeatOf(frames.front(), verdict);
+Qor_ReadResult Qor_HubAccess::read(std::size_t recordBits, bool keepActivity) {
+  try {
+    const unsigned code = keepActivity ? Qor_HubCode::readAgain : Qor_HubCode::read;
+    Qor_Answer answer =
+        ask({code, coreRef_.core_index, link_.readTags.next(), recordBits, nullptr, 0, Qor_HubCode::repeat},
+            link_.readRoom);
+    if (answer.isNoSuchCore()) fail("no such core, or it cannot be read");
+    link_.readTags.succeeded();
+    return {std::move(answer.bits), answer.flags()};
+  } catch (...) {
+    link_.readTags.failed();
+    throw;
   }
-  fail("design clock stopped");
 }
 
-Qor_HubAccess::Answers Qor_HubAccess::exchange(const Frames& frames, unsigned idleCycles) {
+Qor_Answer Qor_HubAccess::ask(Qor_Request request, Qor_WaitingRoom& room) {
+  Qor_Damage damage;
+  Qor_Wait wait;
+  for (bool mayBeDone = false;;) {
+    std::string seen;
+    Qor_Answer answer = exchange(request, room.bits(), seen);
+    const bool isWhole = answer.verdict == Qor_Verdict::good;
+    if (isWhole && !answer.isRefused()) {
+      room.needed(answer.waited);
+      return answer;
+    }
+    if (isWhole || answer.verdict == Qor_Verdict::slow) {
+      if (!wait.mayRepeat(room)) fail(waitText(answer, mayBeDone) + ", " + wait.text());
+    } else if (!damage.mayRepeat(seen, answer.verdict == Qor_Verdict::noHub)) {
+      if (damage.isOnlySilence()) throw Qor_NoHub(addressText(coreRef_) + ": " + damage.text());
+      fail(damage.text());
+    }
+    QorJtag_Statistics repeat;
+    ++repeatsOf(answer, repeat);
+    record_.add(repeat);
+    mayBeDone = mayBeDone || !isWhole;
+    if (mayBeDone) request.code |= request.repeat;
+  }
+}
+
+/// One attempt; `seen` gets what was wrong with it.
+Qor_Answer Qor_HubAccess::exchange(const Qor_Request& request, std::size_t room, std::string& seen) {
+  const Qor_Frame frame(request);
+  const std::size_t late = hub().late();
+  const std::size_t bitCount = lead_ + late + frame.scanBits(room);
+  const Qor_Bytes bits = run(frame.scan(bitCount), bitCount);
+  Qor_Answer answer{Qor_Verdict::noHead};
+  if (request.code == Qor_HubCode::status) answer = calibrate(frame, bits, bitCount);
+  if (answer.verdict != Qor_Verdict::good) answer = frame.judge({bits, bitCount, lead_ + late});
+  if (answer.verdict != Qor_Verdict::good)
+    seen = failureText(answer, {bits, bitCount, lead_ + late}, request);
+  return answer;
+}
+
+// A late TDO delays the hello and the answer, a late TDI the answer alone.
+Qor_Answer Qor_HubAccess::calibrate(const Qor_Frame& frame, const Qor_Bytes& bits, std::size_t bitCount) {
+  QorJtag_Hub found = hub();
+  if (const std::size_t hello = findHello(bits); hello <= mostLate)
+    found.lateTdo = static_cast<unsigned>(hello);
+  Qor_Answer answer{Qor_Verdict::noHead};
+  for (found.lateTdi = 0; found.lateTdi <= mostLate; ++found.lateTdi) {
+    answer = frame.judge({bits, bitCount, lead_ + found.late()});
+    if (answer.verdict != Qor_Verdict::good) continue;
+    record_.keep(found);
+    break;
+  }
+  return answer;
+}
+
+Qor_Bytes Qor_HubAccess::run(const Qor_Bytes& out, std::size_t bitCount) {
   const QueueGuard guard(cable_);
+  const auto begin = std::chrono::steady_clock::now();
   cable_.scanIr(coreRef_.device_index, coreRef_.user_chain_number);
-  std::vector<std::size_t> captures;
-  for (std::size_t i = 0; i < frames.size(); ++i) {
-    const bool fetches = i != 0;  // the first scan brings what an earlier sequence left
-    const std::size_t bits = fetches ? answerLength(frames[i - 1]) : frameLength(frames[i]);
-    const std::size_t scan =
-        cable_.scanDr(coreRef_.device_index, buildScan(frames[i], coreRef_.core_index, bits), bits, fetches);
-    if (fetches) captures.push_back(scan);
-    cable_.idle(idleCycles);
-  }
-  flush();
-  Answers answers;
-  for (const std::size_t scan : captures) answers.push_back(cable_.captured(scan));
-  return answers;
-}
-
-void Qor_HubAccess::flush() {
+  const std::size_t scan = cable_.scanDr(coreRef_.device_index, out, bitCount, true);
   try {
     cable_.flush();
   } catch (const std::runtime_error& e) {  // the cable knows what is wrong with the link, not what it was for
     fail(e.what());
   }
+  QorJtag_Statistics transfer;
+  transfer.transfers = 1;
+  transfer.bits = bitCount;
+  transfer.nanoseconds = nanosecondsSince(begin);
+  record_.add(transfer);
+  return cable_.captured(scan);
+}
+
+QorJtag_Hub Qor_HubAccess::hub() const {
+  return record_.hub(coreRef_.device_index, coreRef_.user_chain_number);
 }
 
 void Qor_HubAccess::fail(const std::string& text) const {

@@ -30,10 +30,16 @@ bool Qor_AddressOrder::operator()(const QOR_CORE_REF& left, const QOR_CORE_REF& 
 std::shared_ptr<Qor_SessionCores> Qor_SessionCores::open(unsigned session) {
   Registry& all = registry();
   const std::lock_guard<std::mutex> guard(all.mutex);
-  // Under the mutex: a hook that is called from now on waits for the entry that it has to take out.
-  onSessionClose(session, &Qor_SessionCores::forget);
   if (const auto entry = all.sessions.find(session); entry != all.sessions.end()) return entry->second;
-  return all.sessions.emplace(session, std::make_shared<Qor_SessionCores>()).first->second;
+  const auto entry = all.sessions.emplace(session, std::make_shared<Qor_SessionCores>()).first;
+  try {
+    // Under the mutex: a hook that is called from now on waits for the entry that it has to take out.
+    onSessionClose(session, &Qor_SessionCores::forget);
+  } catch (...) {
+    all.sessions.erase(entry);
+    throw;
+  }
+  return entry->second;
 }
 
 std::shared_ptr<Qor_SessionCores> Qor_SessionCores::find(unsigned session) noexcept {
@@ -74,14 +80,17 @@ std::unique_ptr<Qor_Core> Qor_SessionCores::take(const Qor_Core* core) noexcept 
   return taken;
 }
 
-bool Qor_SessionCores::note(Qor_Transfer transfer, const QOR_CORE_REF& coreRef) {
+Qor_CoreLink& Qor_SessionCores::link(const QOR_CORE_REF& coreRef) {
   const std::lock_guard<std::mutex> guard(mutex_);
-  return !unfinished_[transfer].insert(coreRef).second;
+  return links_.try_emplace(coreRef, tagAbove_).first->second;
 }
 
-void Qor_SessionCores::succeeded(Qor_Transfer transfer, const QOR_CORE_REF& coreRef) noexcept {
+unsigned Qor_SessionCores::syncOutputCount(const QOR_CORE_REF& coreRef) {
   const std::lock_guard<std::mutex> guard(mutex_);
-  if (const auto entry = unfinished_.find(transfer); entry != unfinished_.end()) entry->second.erase(coreRef);
+  const auto entry = cores_.find(coreRef);
+  const auto* const core =
+      entry == cores_.end() ? nullptr : dynamic_cast<Qor_SignalCore*>(entry->second.get());
+  return core == nullptr ? 0 : core->getCorePhysicalSignalCount(Qor_SignalBase::SIGNAL_TYPE_VIO_SYNC_OUTPUT);
 }
 
 std::string addressText(const QOR_CORE_REF& coreRef) {

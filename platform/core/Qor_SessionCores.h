@@ -1,20 +1,18 @@
-// What libQorCore keeps of each session: its cores, and the addresses whose last write or read failed.
+// What libQorCore keeps of each session: its cores, and what it remembers of transfers with each address.
 #pragma once
 
 #include <map>
 #include <memory>
 #include <mutex>
-#include <set>
 
 #include "QorCore.h"
+#include "platform/core/Qor_CoreLink.h"
 
 namespace QorRT {
 
 struct Qor_AddressOrder {
   bool operator()(const QOR_CORE_REF& left, const QOR_CORE_REF& right) const noexcept;
 };
-
-enum class Qor_Transfer { write, read };
 
 /// One session's part. Forgotten when the session is closed; its cores are destroyed then.
 class Qor_SessionCores {
@@ -33,17 +31,19 @@ class Qor_SessionCores {
   /// Hands back the core if it is here. Compares pointers only: `core` may be destroyed already.
   std::unique_ptr<Qor_Core> take(const Qor_Core* core) noexcept;
 
-  /// Notes a write or a read of the address until it is known to have succeeded. True when an earlier one of
-  /// the kind is still noted.
-  bool note(Qor_Transfer transfer, const QOR_CORE_REF& coreRef);
-  void succeeded(Qor_Transfer transfer, const QOR_CORE_REF& coreRef) noexcept;
+  /// What is remembered of the address, for the holder of the session's target lock.
+  Qor_CoreLink& link(const QOR_CORE_REF& coreRef);
+
+  /// How many synchronous outputs the core at the address has; 0 while the list has none there.
+  unsigned syncOutputCount(const QOR_CORE_REF& coreRef);
 
  private:
   static void forget(unsigned session) noexcept;
 
   std::mutex mutex_;  // never held while a core is destroyed
   std::map<QOR_CORE_REF, std::unique_ptr<Qor_Core>, Qor_AddressOrder> cores_;
-  std::map<Qor_Transfer, std::set<QOR_CORE_REF, Qor_AddressOrder>> unfinished_;
+  std::map<QOR_CORE_REF, Qor_CoreLink, Qor_AddressOrder> links_;
+  const unsigned tagAbove_ = drawTagAbove();
 };
 
 /// "device 0, user chain 1, core 2"

@@ -11,6 +11,7 @@
 #pragma once
 
 #include <map>
+#include <stdexcept>
 #include <string>
 #include <vector>
 
@@ -26,9 +27,23 @@ enum QOR_PROGRESS_RETURN { QOR_PROGRESS_CONTINUE, QOR_PROGRESS_ABORT };
 /// that are done, and all pairs. If it returns QOR_PROGRESS_ABORT, the sequence throws logic_error.
 using QOR_PROGRESS_CALLBACK = QOR_PROGRESS_RETURN (*)(unsigned, unsigned, unsigned, QOR_PROGRESS_STATUS);
 
+namespace QorRT {
+
+/// Thrown when nothing that begins as a debug hub's answer came back at any attempt: no hub stands at that device and
+/// user chain, its device is off, or TDO is dead. Anything else that goes wrong is another exception.
+class QOR_API Qor_NoHub : public std::runtime_error {
+ public:
+  explicit Qor_NoHub(const std::string& text);
+  Qor_NoHub(const Qor_NoHub&);
+  ~Qor_NoHub() override;
+};
+
+}  // namespace QorRT
+
 /// Reads the head of the core's status word into `*coreInfo` (out), and its first `bitCount` bits into
 /// `statusWord` (out; may be null if `bitCount` is 0). Returns 0; or a nonzero status, with the record all
-/// zero, if there is no such core. Throws, with the record all zero, if no debug hub answers.
+/// zero, if there is no such core. Throws Qor_NoHub, with the record all
+/// zero, if no debug hub answers.
 extern "C" QOR_API unsigned QorCore_getCoreStatus(unsigned session, QOR_CORE_REF coreRef,
                                                   QOR_CORE_INFO* coreInfo, unsigned char* statusWord,
                                                   unsigned bitCount);
@@ -201,7 +216,8 @@ class QOR_API Qor_CoreComm {
  public:
   /// Reads the status word into the first `bitCount` bits of `statusWord` (out; at most its size; bits that
   /// the core does not have are 0), and its head into `*coreInfo` (out). If there is no such core, both are
-  /// zero. If no debug hub answers, it throws, and both are zero.
+  /// zero. If no debug hub answers, it throws Qor_NoHub,
+  /// and both are zero.
   static void getCoreStatus(unsigned session, QOR_CORE_REF coreRef, QOR_CORE_INFO* coreInfo,
                             Qor_ByteBuffer& statusWord, unsigned bitCount);
 

@@ -8,6 +8,7 @@
 ///     wrong.
 #pragma once
 
+#include <cstdint>
 #include <functional>
 #include <memory>
 #include <string>
@@ -58,3 +59,35 @@ extern "C" QOR_API void QorJtag_session_setMessageHandler(unsigned session, QorJ
 /// What stands on the session's chain, in device-index order: a copy into `devices`. Throws when the session
 /// is unknown, with `devices` as it was.
 extern "C" QOR_API void QorJtag_session_getDevices(unsigned session, std::vector<QorRT::Qor_Device>& devices);
+
+/// What the transfers of a session have cost since it was opened. A transfer is one IR scan and one DR scan; one whose
+/// answer is damaged or late is repeated, so that its caller sees nothing of it but the time.
+struct QorJtag_Statistics {
+  std::uint64_t transfers = 0;       ///< those that reached the cable, repeats among them
+  std::uint64_t bits = 0;            ///< of their DR scans, without those of bypassed devices
+  std::uint64_t nanoseconds = 0;     ///< spent in the cable
+  std::uint64_t repeatsNoHub = 0;    ///< nothing on TDO began as a debug hub's answer does
+  std::uint64_t repeatsNoHead = 0;   ///< the hub did not take the frame, or its answer did not begin as one
+  std::uint64_t repeatsBadCrc = 0;   ///< the CRC of the answer did not hold
+  std::uint64_t repeatsSlow = 0;     ///< the design clock was not ready in time
+  std::uint64_t repeatsRefused = 0;  ///< an earlier write was not ready
+};
+
+/// Copies the session's counts into `statistics`. Throws when the session is unknown.
+extern "C" QOR_API void QorJtag_session_getStatistics(unsigned session, QorJtag_Statistics& statistics);
+
+/// A debug hub, and how many TCKs (0 to 2) its lines are later than the plain chain. Some device families register
+/// them once more; the host finds this out when it reads a status word, and allows for it.
+struct QorJtag_Hub {
+  unsigned device_index;       ///< from the device nearest to TDO
+  unsigned user_chain_number;  ///< 1 to 4
+  unsigned lateTdi;            ///< TCKs
+  unsigned lateTdo;            ///< TCKs
+
+  /// How many TCKs an answer comes later than on a plain chain.
+  unsigned late() const { return lateTdi + lateTdo; }
+};
+
+/// The hubs that have answered a status read in this session, by address: a copy into `hubs`. Throws when the session
+/// is unknown, with `hubs` as it was.
+extern "C" QOR_API void QorJtag_session_getHubs(unsigned session, std::vector<QorJtag_Hub>& hubs);

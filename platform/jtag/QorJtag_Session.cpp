@@ -39,6 +39,15 @@ void QorJtag_session_getDevices(unsigned session, std::vector<QorRT::Qor_Device>
   devices.swap(copy);
 }
 
+void QorJtag_session_getStatistics(unsigned session, QorJtag_Statistics& statistics) {
+  statistics = Qor_SessionTable::instance().get(session)->record().statistics();
+}
+
+void QorJtag_session_getHubs(unsigned session, std::vector<QorJtag_Hub>& hubs) {
+  std::vector<QorJtag_Hub> copy = Qor_SessionTable::instance().get(session)->record().hubs();
+  hubs.swap(copy);
+}
+
 unsigned QorJtag_target_flush(unsigned session) {
   QorRT::sessionCable(session).flush();
   return 0;
@@ -48,6 +57,10 @@ namespace QorRT {
 
 Qor_Cable& sessionCable(unsigned session) {
   return Qor_SessionTable::instance().get(session)->cable();
+}
+
+Qor_LinkRecord& sessionRecord(unsigned session) {
+  return Qor_SessionTable::instance().get(session)->record();
 }
 
 void onSessionClose(unsigned session, void (*hook)(unsigned session) noexcept) {

@@ -6,6 +6,7 @@
 #include <vector>
 
 #include "QorJtag_Host.h"
+#include "platform/jtag/Qor_LinkRecord.h"
 #include "platform/jtag/Qor_TargetMutex.h"
 
 namespace QorRT {
@@ -24,6 +25,8 @@ class Qor_Session {
 
   /// For the holder of the target lock, until the session is closed.
   Qor_Cable& cable() { return *cable_; }
+
+  Qor_LinkRecord& record() { return record_; }
 
   /// What stood on the chain when the session was opened.
   const std::vector<Qor_Device>& devices() const { return devices_; }
@@ -47,6 +50,7 @@ class Qor_Session {
   bool closed_ = false;
   std::unique_ptr<Qor_Cable> cable_;
   const std::vector<Qor_Device> devices_;
+  Qor_LinkRecord record_;
 
   std::mutex mutex_;  // guards what follows, never held while foreign code runs
   std::shared_ptr<const QorJtag_MessageHandler> handler_;

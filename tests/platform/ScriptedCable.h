@@ -10,12 +10,27 @@
 
 #include "QorJtag_Host.h"
 #include "Qor_Cable.h"
+#include "tests/platform/HubScript.h"
 #include "tests/platform/ThrownBy.h"
 #include "tests/platform/WireBits.h"
 
+/// What comes back of a scan: bits filled up with zeros, or what a hub says to what was sent.
+class Answer {
+ public:
+  Answer(Bits bits) : bits_(std::move(bits)) {}
+  Answer(Reply reply) : reply_(std::move(reply)) {}
+  Bits to(const Bits& sent) const { return reply_ ? reply_->to(sent) : bits_; }
+
+ private:
+  Bits bits_;
+  std::optional<Reply> reply_;
+};
+
 /// Shared by a test and the cable that its session owns.
 struct Script {
-  std::deque<Bits> answers;  // to each scan that captures, in turn; filled up with zeros
+  std::deque<Answer> answers;       // to each scan that captures, in turn; zeros after the last
+  std::vector<std::string> frames;  // SentFrame::text() of each DR scan
+  std::vector<unsigned> tags;       // of each DR scan
   std::vector<std::string>
       log;              // "ir DEVICE CHAIN", "dr DEVICE BITS NUMBER", "idle TCKS"; "run" after each queue
   std::string failure;  // thrown by the next run, when not empty
@@ -33,7 +48,10 @@ struct Script {
 
 class ScriptedCable : public QorRT::Qor_Cable {
  public:
-  explicit ScriptedCable(std::shared_ptr<Script> script) : script_(std::move(script)) {}
+  explicit ScriptedCable(std::shared_ptr<Script> script, std::size_t devices = 2)
+      : script_(std::move(script)) {
+    devices_.resize(devices);
+  }
   ~ScriptedCable() override { script_->destroyed = true; }
 
   const std::vector<QorRT::Qor_Device>& devices() const override { return devices_; }
@@ -55,18 +73,22 @@ class ScriptedCable : public QorRT::Qor_Cable {
       case QorRT::Qor_Scan::Kind::dr:
         script_->log.push_back("dr " + device + std::to_string(scan.bitCount) + " " +
                                hexOf(bitsOfBytes(scan.out, scan.bitCount)));
-        if (scan.capture) scan.in = bytesOf(nextAnswer(scan.bitCount));
+        if (scan.capture) scan.in = bytesOf(nextAnswer(bitsOfBytes(scan.out, scan.bitCount)));
     }
   }
 
-  Bits nextAnswer(std::size_t bitCount) {
+  Bits nextAnswer(const Bits& sent) {
     Bits bits;
+    if (sent.size() > 58) {
+      script_->frames.push_back(SentFrame(sent).text());
+      script_->tags.push_back(SentFrame(sent).tag());
+    }
     if (!script_->answers.empty()) {
-      bits = script_->answers.front();
+      bits = script_->answers.front().to(sent);
       script_->answers.pop_front();
     }
-    bits.resize(bitCount, '0');
-    bits.resize((bitCount + 7) / 8 * 8, '1');  // what stands above a capture in its last byte is nobody's
+    bits.resize(sent.size(), '0');
+    bits.resize((sent.size() + 7) / 8 * 8, '1');  // what stands above a capture in its last byte is nobody's
     return bits;
   }
 
