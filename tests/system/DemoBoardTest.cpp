@@ -26,7 +26,8 @@ TEST(DemoBoard, SaysWhatIsWrongWithAnAddressAndGoesOn) {
   const std::pair<QOR_CORE_REF, const char*> cases[] = {
       {{2, 1, 0}, "100 there is no device 2: the chain has 2 devices"},
       {{0, 5, 0}, "100 device 0 has no user chain 5: they are 1 to 4"},
-      {{0, 2, 0}, "100 device 0, user chain 2, core 0: no debug hub answers, TDO is all zeros"},
+      {{0, 2, 0},
+       "100 device 0, user chain 2, core 0: no debug hub answers, TDO is all zeros, in 4 attempts"},
       {{0, 1, 16}, "100 the core index 16 is above 15"},
   };
   for (const auto& [ref, message] : cases) {
@@ -88,7 +89,7 @@ TEST(DemoBoard, PlaysPulseTrainsWhoseStepsShowAsActivity) {
   core.define("pulse", syncOut, {2});
   core.write({{"pulse.pulsetrain", "00000000000000000000000000000100"}});  // 1 at step 1 alone
   core.read();
-  TextMap values = core.read();  // both frames of the write and the first read have played it to its end
+  TextMap values = core.read();  // the write has played it to its end
   EXPECT_EQ(values["sync_in_data"], "80");
   core.write({{"pulse.pulsetrain", "01000000000000000000000000000100"}});  // 1 at step 1, and from step 15 on
   core.read();
@@ -124,8 +125,8 @@ TEST(DemoBoard, CountsItsClocksBehindItsSecondDevice) {
   const TextMap before = core.read(), after = core.read();
   EXPECT_NE(before.at("sync_in_data"), after.at("sync_in_data"));
   EXPECT_EQ(after.at("async_in_data"), after.at("sync_in_data"));
-  EXPECT_EQ(after.at("sync_in_data.sync_activity_up").substr(3), "F");
-  EXPECT_EQ(after.at("sync_in_data.sync_activity_down").substr(3), "F");
+  for (const char* flag : {"sync_in_data.sync_activity_up", "sync_in_data.sync_activity_down"})
+    EXPECT_EQ(std::stoul(after.at(flag), nullptr, 16) & 3, 3U) << flag;  // a read leaves it some clocks
 }
 
 }  // namespace

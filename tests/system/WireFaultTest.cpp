@@ -97,7 +97,7 @@ struct Case {
   const char* name;
   Fault fault;
   int steps;
-  const char* byBitbang;  // what is said of it
+  const char* byBitbang;  // what is said of it; nothing of what a repeat mends
   const char* byOpenOcd;
 };
 
@@ -106,15 +106,14 @@ void PrintTo(const Case& each, std::ostream* out) {
 }
 
 const Case cases[] = {
-    {"TdoStuckAt0", Fault::tdoLow, 0, "no debug hub answers, TDO is all zeros",
-     "no debug hub answers, TDO is all zeros"},
-    {"TdoStuckAt1", Fault::tdoHigh, 0, "no debug hub answers, TDO is all ones",
-     "no debug hub answers, TDO is all ones"},
-    {"OneBitFlipped", Fault::flip, 60, "the CRC of the answer does not hold over 80 data bits",
-     "the CRC of the answer does not hold over 80 data bits"},
-    {"ReplyWithheld", Fault::withhold, 0, "HOST:PORT gave N of 147 answers within 1.1 s",
+    {"TdoStuckAt0", Fault::tdoLow, 0, "no debug hub answers, TDO is all zeros, in 4 attempts",
+     "no debug hub answers, TDO is all zeros, in 4 attempts"},
+    {"TdoStuckAt1", Fault::tdoHigh, 0, "no debug hub answers, TDO is all ones, in 4 attempts",
+     "no debug hub answers, TDO is all ones, in 4 attempts"},
+    {"OneBitFlipped", Fault::flip, 100, nullptr, nullptr},
+    {"ReplyWithheld", Fault::withhold, 0, "HOST:PORT gave N of 191 answers within 1.1 s",
      "openocd gave no answer within 1.1 s"},
-    {"SimulationKilled", Fault::die, 150, "HOST:PORT gave N of 147 answers, then closed the connection",
+    {"SimulationKilled", Fault::die, 150, "HOST:PORT gave N of 191 answers, then closed the connection",
      "openocd gave no answer, then closed the connection"},
 };
 
@@ -128,16 +127,18 @@ std::vector<std::string> placeless(std::vector<std::string> messages) {
 
 class WireFault : public testing::TestWithParam<Case> {
  protected:
-  void tryOn(const std::string& url, const std::string& said) {
+  void tryOn(const std::string& url, const char* said) {
     Board board(url);
     VioCore core(board, {0, 1, 0});
     core.write({{"async_out_data", "5A"}});
     core.read();
     served.pins.set(GetParam().fault, GetParam().steps);
     TextMap values, *map = &values;
-    EXPECT_EQ(QorVIO_readValues(board.session, core.ref, &map), failed);
-    EXPECT_THAT(placeless(board.takeMessages()), ElementsAre("100 device 0, user chain 1, core 0: " + said));
-    EXPECT_TRUE(values.empty());
+    EXPECT_EQ(QorVIO_readValues(board.session, core.ref, &map), said != nullptr ? failed : 0U);
+    std::vector<std::string> messages;
+    if (said != nullptr) messages.push_back(std::string("100 device 0, user chain 1, core 0: ") + said);
+    EXPECT_EQ(placeless(board.takeMessages()), messages);
+    EXPECT_EQ(values.empty(), said != nullptr);
     { QorRT::QorJtagTargetLock free(board.session, 0); }
     served.pins.set(Fault::none);
     if (GetParam().fault == Fault::die) served.restart();
