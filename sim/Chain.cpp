@@ -60,7 +60,14 @@ void Chain::setTcksPerClock(unsigned tcks) {
   tcks_ = 0;
 }
 
+// Device by device, unless a clock that one hub asks for could be early for another.
 void Chain::shiftAll(Bits& stream) {
+  if (std::count_if(taps_.begin(), taps_.end(), [](const Tap& tap) { return tap.isSelected(); }) > 1)
+    return shiftEach(stream);
+  for (auto tap = taps_.rbegin(); tap != taps_.rend(); ++tap) tap->shift(stream, [this] { passTck(); });
+}
+
+void Chain::shiftEach(Bits& stream) {
   for (unsigned char& bit : stream) {
     const bool in = bit != 0;
     bit = out();

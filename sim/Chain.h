@@ -48,6 +48,7 @@ class Chain {
 
  private:
   void shiftAll(Bits& stream);
+  void shiftEach(Bits& stream);
   bool leavesTime() const;
   void passTck();
 

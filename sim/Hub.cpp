@@ -1,5 +1,6 @@
 #include "sim/Hub.h"
 
+#include <algorithm>
 #include <utility>
 
 namespace qorsim {
@@ -24,31 +25,34 @@ void Hub::capture() {
 
 void Hub::shift(bool in) {
   settle();
-  switch (phase_) {
-    case Phase::search:
-      out_ = false;
-      if (std::exchange(lastIn_, in) && !in) gather(Phase::header, headerBits);
-      break;
-    case Phase::header:
-    case Phase::headerCrc:
-    case Phase::payload:
-    case Phase::payloadCrc:
-      gatherNext(in);
-      break;
-    case Phase::zero:
-      send(Phase::head, head());
-      break;
-    case Phase::wait:
-      finishWaiting();
-      break;
-    case Phase::head:
-    case Phase::data:
-    case Phase::crc:
-      sendNext();
-      break;
-    case Phase::silence:
-      break;
+  if (phase_ == Phase::search)
+    search(in);
+  else if (gathers())
+    gatherNext(in);
+  else if (sends())
+    sendNext();
+  else if (phase_ == Phase::zero)
+    send(Phase::head, head());
+  else if (phase_ == Phase::wait)
+    finishWaiting();
+}
+
+std::size_t Hub::shiftRun(unsigned char* bits, std::size_t count) {
+  if (begins_ || bits_.size() == count_) return 0;
+  if (phase_ == Phase::payload) {
+    count = std::min(count, count_ - bits_.size() - 1);
+    bits_.insert(bits_.end(), bits, bits + count);
+    std::fill_n(bits, count, static_cast<unsigned char>(0));
+  } else if (phase_ == Phase::data) {
+    count = std::min(count, bits_.size() - count_);
+    bits[0] = out_;
+    std::copy_n(bits_.begin() + static_cast<std::ptrdiff_t>(count_), count - 1, bits + 1);
+    count_ += count;
+    out_ = bits_[count_ - 1] != 0;
+  } else {
+    count = 0;
   }
+  return count;
 }
 
 bool Hub::leavesTime() const {
@@ -62,6 +66,11 @@ void Hub::settle() {
 void Hub::clock() {
   for (const std::unique_ptr<Core>& core : cores_)
     if (core) core->clock();
+}
+
+void Hub::search(bool in) {
+  out_ = false;
+  if (std::exchange(lastIn_, in) && !in) gather(Phase::header, headerBits);
 }
 
 void Hub::gather(Phase phase, std::size_t count) {

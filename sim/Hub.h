@@ -25,6 +25,10 @@ class Hub {
   /// A TCK in Shift-DR.
   void shift(bool in);
 
+  /// As many such TCKs as only gather or send, at most `count`: replaces what goes in by what comes out, and
+  /// returns how many there were. A shortcut for shift().
+  std::size_t shiftRun(unsigned char* bits, std::size_t count);
+
   /// Whether the next bits are those of an answer before its data: a core may need the design clock for them.
   bool leavesTime() const;
 
@@ -38,6 +42,10 @@ class Hub {
   // First what TDI brings, then what goes to TDO.
   enum class Phase { search, header, headerCrc, payload, payloadCrc, zero, head, wait, data, crc, silence };
 
+  bool gathers() const { return phase_ >= Phase::header && phase_ <= Phase::payloadCrc; }
+  bool sends() const { return phase_ == Phase::head || phase_ == Phase::data || phase_ == Phase::crc; }
+
+  void search(bool in);
   void gather(Phase phase, std::size_t count);
   void gatherNext(bool in);
   void gathered();

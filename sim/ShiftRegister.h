@@ -19,6 +19,9 @@ class ShiftRegister {
   /// One TCK.
   void shift(bool in);
 
+  /// As many TCKs as the stream has bits, the first since capture: replaces what goes in by what comes out.
+  void shift(Bits& stream);
+
   /// The bits that an update takes.
   Bits take() const;
 

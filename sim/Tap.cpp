@@ -42,6 +42,18 @@ void Tap::shift(bool in) {
     register_.shift(in);
 }
 
+void Tap::shift(Bits& stream, const std::function<void()>& passTck) {
+  if (selected_ == nullptr) return register_.shift(stream);
+  for (std::size_t i = 0; i < stream.size();) {
+    i += selected_->shiftRun(&stream[i], stream.size() - i);
+    if (i == stream.size()) break;
+    const bool passes = leavesTime(), in = stream[i] != 0;
+    stream[i++] = selected_->out();
+    selected_->shift(in);
+    if (passes) passTck();
+  }
+}
+
 void Tap::updateIr() {
   instruction_ = numberAt(register_.take().data(), irLength_);
 }

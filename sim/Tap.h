@@ -3,6 +3,7 @@
 
 #include <array>
 #include <cstdint>
+#include <functional>
 #include <memory>
 
 #include "sim/ShiftRegister.h"
@@ -38,11 +39,18 @@ class Tap {
   void updateIr();
   /// @}
 
+  /// A whole scan in Shift-DR or Shift-IR from capture on: replaces what TDI brings by what goes out of TDO, and
+  /// calls `passTck` after each TCK that leaves time to the design clock.
+  void shift(Bits& stream, const std::function<void()>& passTck);
+
   /// A TCK in any other state.
   void settle();
 
   /// The bit at TDO.
   bool out() const { return selected_ != nullptr ? selected_->out() : register_.out(); }
+
+  /// Whether a hub is between TDI and TDO.
+  bool isSelected() const { return selected_ != nullptr; }
 
   /// Whether the selected hub leaves time to the design clock in the next TCK of Shift-DR.
   bool leavesTime() const { return selected_ != nullptr && selected_->hub.leavesTime(); }

@@ -36,6 +36,14 @@ class UserRegister {
     out_ = out_ << 1 | unsigned{hub.out()};
   }
 
+  /// As many such TCKs as only shift, at most `count`: replaces what goes in by what comes out. A shortcut for shift().
+  std::size_t shiftRun(unsigned char* bits, std::size_t count) {
+    if (lateness_.tdi != 0 || lateness_.tdo != 0) return 0;
+    const std::size_t run = hub.shiftRun(bits, count);
+    out_ = unsigned{hub.out()};
+    return run;
+  }
+
  private:
   Lateness lateness_;
   unsigned in_ = 0;  // bit 0 is the bit that came last
