@@ -53,15 +53,15 @@ void BitbangClient::receive() {
   const ssize_t count = ::recv(socket_, block_.data(), block_.size(), 0);
   if (count == 0) leaving_ = true;
   if (count < 0) lose("cannot receive from the client: ");
+  if (count > 0) lastMoved_ = Clock::now();
   for (ssize_t i = 0; i < count && !leaving_; ++i) obey(block_[static_cast<std::size_t>(i)]);
 }
 
 void BitbangClient::send() {
   const ssize_t count = ::send(socket_, answers_.data(), answers_.size(), MSG_NOSIGNAL);
-  if (count >= 0)
-    answers_.erase(0, static_cast<std::size_t>(count));
-  else
-    lose("cannot send to the client: ");
+  if (count < 0) return lose("cannot send to the client: ");
+  lastMoved_ = Clock::now();
+  answers_.erase(0, static_cast<std::size_t>(count));
 }
 
 void BitbangClient::obey(char request) {

@@ -2,6 +2,7 @@
 #pragma once
 
 #include <array>
+#include <chrono>
 #include <functional>
 #include <string>
 
@@ -26,7 +27,12 @@ class BitbangClient {
   /// Until the client leaves or `stop` says so. Returns why it was sent away, or nothing.
   std::string serve(const std::function<bool()>& stop);
 
+  /// How long nothing has come from it or gone to it.
+  std::chrono::steady_clock::duration idleTime() const { return Clock::now() - lastMoved_; }
+
  private:
+  using Clock = std::chrono::steady_clock;
+
   void receive();
   void send();
   void obey(char request);
@@ -35,6 +41,7 @@ class BitbangClient {
 
   Pins& pins_;
   int socket_;
+  Clock::time_point lastMoved_ = Clock::now();
   std::array<char, 65536> block_{};
   std::string answers_;
   bool leaving_ = false;  // as soon as the answers have gone

@@ -46,10 +46,17 @@ int acceptClient(int listener) {
   return -1;
 }
 
+bool isClientWaiting(int listener) {
+  pollfd entry{listener, POLLIN, 0};
+  return ::poll(&entry, 1, 0) > 0;
+}
+
 }  // namespace
 
-BitbangServer::BitbangServer(Pins& pins, std::uint16_t port)
-    : pins_(pins), listener_(::socket(AF_INET, SOCK_STREAM | SOCK_CLOEXEC | SOCK_NONBLOCK, 0)) {
+BitbangServer::BitbangServer(Pins& pins, std::uint16_t port, std::chrono::milliseconds idleLimit)
+    : pins_(pins),
+      idleLimit_(idleLimit),
+      listener_(::socket(AF_INET, SOCK_STREAM | SOCK_CLOEXEC | SOCK_NONBLOCK, 0)) {
   if (listener_ < 0) failPort(listener_, port);
   setOption(listener_, SOL_SOCKET, SO_REUSEADDR);
   sockaddr_in address = loopbackAddress(port);
@@ -71,9 +78,19 @@ void BitbangServer::serve(const std::function<bool()>& stop,
   while (awaitEvents(listener_, POLLIN, found, stop)) {
     const int socket = acceptClient(listener_);
     if (socket < 0) continue;
-    const std::string reason = BitbangClient(pins_, socket).serve(stop);
+    const std::string reason = serveClient(socket, stop);
     if (!reason.empty() && tell) tell(reason);
   }
+}
+
+std::string BitbangServer::serveClient(int socket, const std::function<bool()>& stop) {
+  BitbangClient client(pins_, socket);
+  bool makesRoom = false;
+  const std::string reason = client.serve([&] {
+    makesRoom = client.idleTime() >= idleLimit_ && isClientWaiting(listener_);
+    return makesRoom || stop();
+  });
+  return makesRoom ? "the client was idle while another one waited" : reason;
 }
 
 }  // namespace qorsim

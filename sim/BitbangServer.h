@@ -1,7 +1,8 @@
 /// @file
-/// Lends the wires of a board to one client after another, over TCP.
+/// A board's wires over TCP, for one client after another.
 #pragma once
 
+#include <chrono>
 #include <cstdint>
 #include <functional>
 #include <string>
@@ -23,9 +24,10 @@ namespace qorsim {
 /// The board stays as the last client left it. Used by one thread at a time.
 class QOR_API BitbangServer {
  public:
-  /// Listens on the loopback interface; port 0 takes any that is free. `pins` must outlive the server. Throws
-  /// runtime_error when the port cannot be had.
-  BitbangServer(Pins& pins, std::uint16_t port);
+  /// Listens on the loopback interface; port 0 takes any that is free. `pins` must outlive the server. `idleLimit`:
+  /// see serve(). Throws runtime_error when the port cannot be had.
+  BitbangServer(Pins& pins, std::uint16_t port,
+                std::chrono::milliseconds idleLimit = std::chrono::milliseconds(2000));
   BitbangServer(const BitbangServer&) = delete;
   BitbangServer& operator=(const BitbangServer&) = delete;
   ~BitbangServer();
@@ -33,14 +35,17 @@ class QOR_API BitbangServer {
   /// The port on which it listens.
   std::uint16_t port() const { return port_; }
 
-  /// Serves until `stop`, which is asked several times a second and after each signal, says so; clients that
-  /// come meanwhile wait for the one before to leave. A client that leaves by its own fault is left to go, and
-  /// `tell`, unless it is empty, hears why. Throws what `pins`, `stop` and `tell` throw, and runtime_error when
-  /// the network fails.
+  /// Serves until `stop`, which is asked several times a second and after each signal, says so. Clients that come
+  /// meanwhile wait for the one before to leave; when that is silent for the idle limit while another one waits,
+  /// its connection is closed. `tell`, unless it is empty, hears why a connection was closed from this end. Throws
+  /// what `pins`, `stop` and `tell` throw, and runtime_error when the network fails.
   void serve(const std::function<bool()>& stop, const std::function<void(const std::string&)>& tell = {});
 
  private:
+  std::string serveClient(int socket, const std::function<bool()>& stop);
+
   Pins& pins_;
+  std::chrono::milliseconds idleLimit_;
   int listener_;
   std::uint16_t port_ = 0;
 };

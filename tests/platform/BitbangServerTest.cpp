@@ -29,6 +29,8 @@ class NotedPins : public qorsim::Pins {
 
 class BitbangServerTest : public testing::Test {
  protected:
+  explicit BitbangServerTest(std::chrono::milliseconds idleLimit = std::chrono::hours(1))
+      : server(pins, 0, idleLimit) {}
   ~BitbangServerTest() override { end(); }
 
   void end() {
@@ -62,7 +64,7 @@ class BitbangServerTest : public testing::Test {
   }
 
   NotedPins pins;
-  qorsim::BitbangServer server{pins, 0};
+  qorsim::BitbangServer server;
   std::string told;
 
  private:
@@ -100,6 +102,22 @@ TEST_F(BitbangServerTest, AnswersAClientThatSendsEverythingBeforeItReads) {
     answers += i % 3 == 0 ? "1111" : "0000";
   }
   EXPECT_TRUE(talk(connect(), requests + "Q") == answers);
+}
+
+class IdleBitbangClientTest : public BitbangServerTest {
+ protected:
+  IdleBitbangClientTest() : BitbangServerTest(std::chrono::milliseconds(1)) {}
+};
+
+TEST_F(IdleBitbangClientTest, SendsAnIdleClientAwayWhenAnotherOneWaits) {
+  const int idle = connect();
+  char answer = 0;
+  ASSERT_EQ(::send(idle, "1R", 2, 0), 2);
+  ASSERT_EQ(::recv(idle, &answer, 1, 0), 1);
+  EXPECT_EQ(talk(connect(), "RQ"), "1");
+  EXPECT_EQ(talk(idle, ""), "");
+  end();
+  EXPECT_EQ(told, "the client was idle while another one waited;");
 }
 
 }  // namespace
