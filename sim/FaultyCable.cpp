@@ -11,41 +11,29 @@ namespace qorsim {
 namespace {
 
 using Kind = QorRT::Qor_Scan::Kind;
-using BitsOfStep = Bits PassingStep::*;
+using Step = PassingExchange::iterator;
 
 /// The scan of that number, or the end.
-PassingExchange::iterator scanAt(PassingExchange& exchange, std::size_t number) {
+Step scanAt(PassingExchange& exchange, std::size_t number) {
   return std::find_if(exchange.begin(), exchange.end(), [&number](const PassingStep& step) {
     return step.kind != Kind::idle && number-- == 0;
   });
 }
 
-void cutFrom(PassingExchange& exchange, PassingExchange::iterator first) {
-  std::for_each(first, exchange.end(), [](PassingStep& step) { step.reachesChip = false; });
+/// The step of a sent bit and the bit; the end of the exchange when there is no such bit.
+std::pair<Step, Bits::iterator> sentBit(PassingExchange& exchange, std::size_t bit) {
+  auto step = exchange.begin();
+  for (; step != exchange.end() && bit >= step->sent.size(); ++step) bit -= step->sent.size();
+  if (step == exchange.end()) return {step, {}};
+  return {step, step->sent.begin() + static_cast<std::ptrdiff_t>(bit)};
 }
 
-/// The step and the number of the bit in it; the end of the exchange when there is no such bit.
-std::pair<PassingExchange::iterator, std::size_t> locate(PassingExchange& exchange, BitsOfStep bits,
-                                                         BitPlace place) {
-  auto step = place.scan ? scanAt(exchange, *place.scan) : exchange.begin();
-  if (place.scan && step != exchange.end() && place.index >= ((*step).*bits).size()) step = exchange.end();
-  while (step != exchange.end() && place.index >= ((*step).*bits).size()) {
-    place.index -= ((*step).*bits).size();
-    ++step;
-  }
-  return {step, place.index};
-}
-
-/// The bits from the place on, to the end of its scan or of the exchange.
-std::vector<unsigned char*> runFrom(PassingExchange& exchange, BitsOfStep bits, BitPlace place) {
+/// The bits from that one on, to the end of the exchange.
+std::vector<unsigned char*> runFrom(PassingExchange& exchange, Bits PassingStep::*bits, std::size_t bit) {
   std::vector<unsigned char*> run;
-  auto [step, index] = locate(exchange, bits, place);
-  while (step != exchange.end()) {
-    Bits& row = (*step).*bits;
-    for (; index < row.size(); ++index) run.push_back(&row[index]);
-    step = place.scan ? exchange.end() : step + 1;
-    index = 0;
-  }
+  for (PassingStep& step : exchange)
+    for (unsigned char& each : step.*bits) run.push_back(&each);
+  run.erase(run.begin(), run.begin() + static_cast<std::ptrdiff_t>(std::min(bit, run.size())));
   return run;
 }
 
@@ -56,18 +44,11 @@ void flip(const std::vector<unsigned char*>& run, unsigned pattern) {
   }
 }
 
-std::function<void(PassingExchange&)> editSent(BitPlace place,
+std::function<void(PassingExchange&)> editSent(std::size_t bit,
                                                std::function<void(Bits&, Bits::iterator)> edit) {
-  return [place, edit = std::move(edit)](PassingExchange& exchange) {
-    const auto [step, index] = locate(exchange, &PassingStep::sent, place);
-    if (step != exchange.end()) edit(step->sent, step->sent.begin() + static_cast<std::ptrdiff_t>(index));
+  return [bit, edit = std::move(edit)](PassingExchange& exchange) {
+    if (const auto [step, place] = sentBit(exchange, bit); step != exchange.end()) edit(step->sent, place);
   };
-}
-
-/// Ones in the place of what does not come.
-Bits fitted(Bits bits, std::size_t count) {
-  bits.resize(count, 1);
-  return bits;
 }
 
 PassingExchange passing(const std::vector<QorRT::Qor_Scan>& scans) {
@@ -82,11 +63,22 @@ PassingExchange passing(const std::vector<QorRT::Qor_Scan>& scans) {
 }  // namespace
 
 Fault failAt(std::size_t scan) {
-  return {[scan](PassingExchange& exchange) { cutFrom(exchange, scanAt(exchange, scan)); },
-          [scan](PassingExchange& exchange, const PassingExchange&) {
-            if (scanAt(exchange, scan) == exchange.end()) return;
-            throw std::runtime_error("the link failed at scan " + std::to_string(scan));
-          }};
+  return {[scan](PassingExchange& exchange) {
+    const auto failed = scanAt(exchange, scan);
+    if (failed == exchange.end()) return;
+    failed->reachesChip = false;
+    failed->failure = "the link failed at scan " + std::to_string(scan);
+  }};
+}
+
+Fault cutAt(std::size_t bit) {
+  return {[bit](PassingExchange& exchange) {
+    const auto [step, place] = sentBit(exchange, bit);
+    if (step == exchange.end()) return;
+    step->sent.erase(place, step->sent.end());
+    step->reachesChip = !step->sent.empty();
+    step->failure = "the link failed at bit " + std::to_string(bit);
+  }};
 }
 
 Fault loseScan(std::size_t scan) {
@@ -95,8 +87,16 @@ Fault loseScan(std::size_t scan) {
   }};
 }
 
+Fault interrupt(std::size_t scan, std::function<void()> others) {
+  return {[scan, others = std::move(others)](PassingExchange& exchange) {
+    if (const auto next = scanAt(exchange, scan); next != exchange.end()) next->before = others;
+  }};
+}
+
 Fault silence(bool level) {
-  return {[](PassingExchange& exchange) { cutFrom(exchange, exchange.begin()); },
+  return {[](PassingExchange& exchange) {
+            for (PassingStep& step : exchange) step.reachesChip = false;
+          },
           [level](PassingExchange& exchange, const PassingExchange&) {
             for (PassingStep& step : exchange) step.captured.assign(step.captured.size(), level);
           }};
@@ -105,48 +105,56 @@ Fault silence(bool level) {
 Fault deliverLate() {
   return {{}, [](PassingExchange& exchange, const PassingExchange& before) {
             for (std::size_t i = 0; i < exchange.size(); ++i) {
-              const Bits late = i < before.size() ? before[i].captured : Bits();
-              exchange[i].captured = fitted(late, exchange[i].captured.size());
+              const std::size_t count = exchange[i].captured.size();
+              exchange[i].captured = i < before.size() ? before[i].captured : Bits();
+              exchange[i].captured.resize(count, 1);
             }
           }};
 }
 
-Fault flipCaptured(BitPlace place, unsigned pattern) {
+Fault flipCaptured(std::size_t bit, unsigned pattern) {
   return {{}, [=](PassingExchange& exchange, const PassingExchange&) {
-            flip(runFrom(exchange, &PassingStep::captured, place), pattern);
+            flip(runFrom(exchange, &PassingStep::captured, bit), pattern);
           }};
 }
 
-Fault flipSent(BitPlace place, unsigned pattern) {
-  return {[=](PassingExchange& exchange) { flip(runFrom(exchange, &PassingStep::sent, place), pattern); }};
+Fault flipSent(std::size_t bit, unsigned pattern) {
+  return {[=](PassingExchange& exchange) { flip(runFrom(exchange, &PassingStep::sent, bit), pattern); }};
 }
 
-Fault loseCaptured(BitPlace place) {
-  return {{}, [place](PassingExchange& exchange, const PassingExchange&) {
-            const auto run = runFrom(exchange, &PassingStep::captured, place);
+Fault loseCaptured(std::size_t bit) {
+  return {{}, [bit](PassingExchange& exchange, const PassingExchange&) {
+            const auto run = runFrom(exchange, &PassingStep::captured, bit);
             for (std::size_t i = 0; i < run.size(); ++i) *run[i] = i + 1 < run.size() ? *run[i + 1] : 1;
           }};
 }
 
-Fault doubleCaptured(BitPlace place) {
-  return {{}, [place](PassingExchange& exchange, const PassingExchange&) {
-            const auto run = runFrom(exchange, &PassingStep::captured, place);
+Fault doubleCaptured(std::size_t bit) {
+  return {{}, [bit](PassingExchange& exchange, const PassingExchange&) {
+            const auto run = runFrom(exchange, &PassingStep::captured, bit);
             for (std::size_t i = run.size(); i-- > 1;) *run[i] = *run[i - 1];
           }};
 }
 
-Fault loseSent(BitPlace place) {
-  return {editSent(place, [](Bits& sent, Bits::iterator lost) { sent.erase(lost); })};
+Fault loseSent(std::size_t bit) {
+  return {editSent(bit, [](Bits& sent, Bits::iterator lost) { sent.erase(lost); })};
 }
 
-Fault doubleSent(BitPlace place) {
-  return {editSent(place, [](Bits& sent, Bits::iterator twice) { sent.insert(twice, *twice); })};
+Fault doubleSent(std::size_t bit) {
+  return {editSent(bit, [](Bits& sent, Bits::iterator twice) { sent.insert(twice, *twice); })};
 }
 
-FaultyCable::FaultyCable(std::unique_ptr<QorRT::Qor_Cable> whole) : whole_(std::move(whole)) {}
+FaultyCable::FaultyCable(std::shared_ptr<QorRT::Qor_Cable> chain) : chain_(std::move(chain)) {}
 
 FaultyCable& FaultyCable::next(Fault fault) {
   script_.push_back(std::move(fault));
+  return *this;
+}
+
+FaultyCable& FaultyCable::noise(double sent, double captured, unsigned seed) {
+  sentNoise_ = sent;
+  capturedNoise_ = captured;
+  random_.seed(seed);
   return *this;
 }
 
@@ -170,24 +178,39 @@ void FaultyCable::run(std::vector<QorRT::Qor_Scan>& scans) {
 }
 
 void FaultyCable::pass(const std::vector<QorRT::Qor_Scan>& scans, PassingExchange& exchange) {
-  whole_->drop();  // an exchange that broke off while it was queued
-  std::vector<std::size_t> numbers(scans.size());
+  chain_->drop();  // an exchange that broke off while it was queued
   for (std::size_t i = 0; i < scans.size(); ++i) {
-    const QorRT::Qor_Scan& scan = scans[i];
-    const Bits& sent = exchange[i].sent;
-    if (!exchange[i].reachesChip) continue;
-    if (scan.kind == Kind::ir) whole_->scanIr(scan.device, scan.userChain, scan.always);
-    if (scan.kind == Kind::dr)
-      numbers[i] = whole_->scanDr(scan.device, pack(sent), sent.size(), scan.capture);
-    if (scan.kind == Kind::idle) whole_->idle(scan.cycles);
+    if (exchange[i].before) {
+      chain_->flush();
+      exchange[i].before();
+    }
+    if (exchange[i].reachesChip) passStep(scans[i], exchange[i]);
+    if (!exchange[i].failure.empty()) fail(exchange[i].failure);
+    if (scans[i].capture) exchange[i].captured.resize(scans[i].bitCount, 1);
   }
-  whole_->flush();
-  for (std::size_t i = 0; i < scans.size(); ++i) {
-    if (!scans[i].capture) continue;
-    Bits& captured = exchange[i].captured;
-    if (exchange[i].reachesChip) captured = unpack(whole_->captured(numbers[i]), exchange[i].sent.size());
-    captured.resize(scans[i].bitCount, 1);
-  }
+  chain_->flush();
+}
+
+void FaultyCable::passStep(const QorRT::Qor_Scan& scan, PassingStep& step) {
+  if (scan.kind == Kind::ir) chain_->scanIr(scan.device, scan.userChain, scan.always);
+  if (scan.kind == Kind::idle) chain_->idle(scan.cycles);
+  if (scan.kind != Kind::dr) return;
+  disturb(step.sent, sentNoise_);
+  const std::size_t number = chain_->scanDr(scan.device, pack(step.sent), step.sent.size(), scan.capture);
+  if (!scan.capture) return;
+  step.captured = unpack(chain_->captured(number), step.sent.size());
+  disturb(step.captured, capturedNoise_);
+}
+
+void FaultyCable::fail(const std::string& failure) {
+  chain_->flush();
+  throw std::runtime_error(failure);
+}
+
+void FaultyCable::disturb(std::vector<unsigned char>& bits, double rate) {
+  if (rate <= 0) return;
+  std::geometric_distribution<std::size_t> gap(rate);
+  for (std::size_t i = gap(random_); i < bits.size(); i += gap(random_) + 1, ++noisyBits_) bits[i] ^= 1;
 }
 
 }  // namespace qorsim

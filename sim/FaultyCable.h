@@ -2,12 +2,12 @@
 /// A link that fails by a script, to try what hosts and tools make of it:
 ///
 ///     auto cable = std::make_unique<qorsim::FaultyCable>(qorsim::demoBoard().cable());
-///     cable->next(qorsim::flipCaptured(qorsim::bit(17)))   // the next exchange
-///         .next(qorsim::failAt(2));                        // the one after it
+///     cable->next(qorsim::flipCaptured(17))   // the next exchange
+///         .next(qorsim::failAt(1));           // the one after it
 ///
 /// Conventions
 ///
-///  1. A fault lasts for one exchange, which stays one exchange; those without a fault pass as they are.
+///  1. A fault lasts for one exchange; exchanges without a fault pass as they are.
 ///  2. Scans are the IR and DR scans of an exchange, counted from 0; TCKs in Run-Test/Idle are no scan. A
 ///     fault of a scan that the exchange does not have changes nothing.
 ///  3. Sent bits are those of its DR scans, captured bits those of its DR scans that capture, scan after
@@ -19,7 +19,8 @@
 #include <deque>
 #include <functional>
 #include <memory>
-#include <optional>
+#include <random>
+#include <string>
 #include <vector>
 
 #include "Qor_Cable.h"
@@ -30,6 +31,8 @@ namespace qorsim {
 struct PassingStep {
   QorRT::Qor_Scan::Kind kind;             ///< as the host queued it
   bool reachesChip = true;                ///< false: the chip does not see it
+  std::function<void()> before{};         ///< what other software does just before it, unless empty
+  std::string failure{};                  ///< unless empty: the link fails after it, with this text
   std::vector<unsigned char> sent{};      ///< may be made longer or shorter: the chip then sees so many TCKs
   std::vector<unsigned char> captured{};  ///< on the way back only, always as many as the host asked for
 };
@@ -46,61 +49,58 @@ struct Fault {
   std::function<void(PassingExchange& exchange, const PassingExchange& before)> back{};
 };
 
-/// A bit of an exchange, or of one of its scans.
-struct BitPlace {
-  std::size_t index = 0;              ///< from the beginning of the exchange, or of the scan
-  std::optional<std::size_t> scan{};  ///< none: counted through the exchange
-
-  /// Counts the bit from the beginning of that scan, and keeps the fault within the scan.
-  BitPlace ofScan(std::size_t number) const { return {index, number}; }
-};
-
-/// Counts the bit from the beginning of the exchange.
-inline BitPlace bit(std::size_t index) {
-  return {index, {}};
-}
-
 /// Throws runtime_error "the link failed at scan SCAN" in the place of that scan; the chip saw those before.
 QOR_API Fault failAt(std::size_t scan);
+
+/// Throws runtime_error "the link failed at bit BIT" in the place of that sent bit; the scan ends before it.
+QOR_API Fault cutAt(std::size_t bit);
 
 /// The chip does not see the scan.
 QOR_API Fault loseScan(std::size_t scan);
 
+/// Other software has the chain just before the scan. It may use another FaultyCable to the same chain.
+QOR_API Fault interrupt(std::size_t scan, std::function<void()> others);
+
 /// The chip sees nothing, and every captured bit is `level`.
 QOR_API Fault silence(bool level);
 
-/// The host gets what the chip delivered in the exchange before, and the chip sees this one. Nothing in the
-/// bits tells a late answer to an exchange just like this one from the right answer.
+/// The host gets what the chip delivered in the exchange before, and the chip sees this one.
 QOR_API Fault deliverLate();
 
 /// Inverts the bits that `pattern` has set, its bit 0 at the place.
 /// @{
-QOR_API Fault flipCaptured(BitPlace place, unsigned pattern = 1);
-QOR_API Fault flipSent(BitPlace place, unsigned pattern = 1);
+QOR_API Fault flipCaptured(std::size_t bit, unsigned pattern = 1);
+QOR_API Fault flipSent(std::size_t bit, unsigned pattern = 1);
 /// @}
 
 /// The captured bit is lost: those behind it move up.
-QOR_API Fault loseCaptured(BitPlace place);
+QOR_API Fault loseCaptured(std::size_t bit);
 
 /// The captured bit comes twice: those behind it move down, and the last one is lost.
-QOR_API Fault doubleCaptured(BitPlace place);
+QOR_API Fault doubleCaptured(std::size_t bit);
 
 /// The chip misses the TCK of the bit: its scan is one bit shorter.
-QOR_API Fault loseSent(BitPlace place);
+QOR_API Fault loseSent(std::size_t bit);
 
 /// The chip takes one TCK for two: its scan is one bit longer.
-QOR_API Fault doubleSent(BitPlace place);
+QOR_API Fault doubleSent(std::size_t bit);
 
 /// A cable with such a link to the chain of another cable.
 class QOR_API FaultyCable : public QorRT::Qor_Cable {
  public:
-  /// Owns the whole cable from then on.
-  explicit FaultyCable(std::unique_ptr<QorRT::Qor_Cable> whole);
+  /// Several of them may share the chain, as several programs do, in one thread.
+  explicit FaultyCable(std::shared_ptr<QorRT::Qor_Cable> chain);
 
-  const std::vector<QorRT::Qor_Device>& devices() const override { return whole_->devices(); }
+  const std::vector<QorRT::Qor_Device>& devices() const override { return chain_->devices(); }
 
   /// Appends to the script; a fault without parts lets an exchange pass.
   FaultyCable& next(Fault fault);
+
+  /// From now on each bit sent and each bit captured is inverted with this probability, beside the script.
+  FaultyCable& noise(double sent, double captured, unsigned seed = 1);
+
+  /// How many bits noise has inverted.
+  std::size_t noisyBits() const { return noisyBits_; }
 
   /// Until restore(), every exchange throws runtime_error "the link is down", and the chip sees nothing. The
   /// script waits.
@@ -113,11 +113,18 @@ class QOR_API FaultyCable : public QorRT::Qor_Cable {
   void run(std::vector<QorRT::Qor_Scan>& scans) override;
   Fault takeFault();
   void pass(const std::vector<QorRT::Qor_Scan>& scans, PassingExchange& exchange);
+  void passStep(const QorRT::Qor_Scan& scan, PassingStep& step);
+  void fail(const std::string& failure);
+  void disturb(std::vector<unsigned char>& bits, double rate);
 
-  std::unique_ptr<QorRT::Qor_Cable> whole_;
+  std::shared_ptr<QorRT::Qor_Cable> chain_;
   std::deque<Fault> script_;
   PassingExchange before_;
   bool isDown_ = false;
+
+  double sentNoise_ = 0, capturedNoise_ = 0;
+  std::mt19937_64 random_;
+  std::size_t noisyBits_ = 0;
 };
 
 }  // namespace qorsim
