@@ -17,6 +17,8 @@ class Chain {
   /// Adds a device at the TDI end: the first one is device 0, nearest to TDO.
   void add(Tap tap);
 
+  const Tap& tap(unsigned device) const { return taps_[device]; }
+
   /// Test-Logic-Reset of every device.
   void reset();
 

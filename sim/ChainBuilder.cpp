@@ -34,6 +34,15 @@ ChainBuilder& ChainBuilder::irLength(unsigned bits) {
   return *this;
 }
 
+ChainBuilder& ChainBuilder::userOpcodes(const std::vector<unsigned>& opcodes) {
+  Device& device = lastDevice("user_opcodes");
+  requireRange(nameOfLast(), "user_opcodes", static_cast<unsigned>(opcodes.size()), 1, Tap::userChainCount);
+  const unsigned bypass = 0xFFFFFFFF >> (Tap::longestIr - device.head.irLength);
+  for (const unsigned opcode : opcodes) requireRange(nameOfLast(), "user_opcodes", opcode, 0, bypass - 1);
+  device.userOpcodes = opcodes;
+  return *this;
+}
+
 ChainBuilder& ChainBuilder::core(unsigned userChain, unsigned index, const CoreSpec& core) {
   Device& device = lastDevice("core");
   const std::string part =
@@ -79,7 +88,8 @@ std::unique_ptr<Chain> ChainBuilder::powerUp() const {
   if (devices_.empty()) throw BoardError("chain", "device", "is missing: a chain has at least one");
   auto chain = std::make_unique<Chain>(tcksPerClock_);
   for (const Device& device : devices_) {
-    Tap tap(device.head.idcode, device.head.irLength, {device.lateTdi, device.lateTdo});
+    Tap tap(device.head.idcode, device.head.irLength,
+            {device.userOpcodes, {device.lateTdi, device.lateTdo}});
     for (const PlacedCore& core : device.cores)
       tap.hub(core.userChain).add(core.index, makeCore(core.description));
     chain->add(std::move(tap));

@@ -84,6 +84,10 @@ class QOR_API ChainBuilder {
   /// 4 to 32 bits.
   ChainBuilder& irLength(unsigned bits);
 
+  /// The instructions that select USER1 and so on, 1 to 4 of them: 2, 3, 4 and 5 when they are not set. Each has room
+  /// in the IR, whose length is set before, and is not all ones.
+  ChainBuilder& userOpcodes(const std::vector<unsigned>& opcodes);
+
   /// A core behind user chain 1 to 4 of the device, at an index of 0 to 15.
   ChainBuilder& core(unsigned userChain, unsigned index, const CoreSpec& core);
 
@@ -112,6 +116,7 @@ class QOR_API ChainBuilder {
   };
   struct Device {
     QorRT::Qor_Device head;
+    std::vector<unsigned> userOpcodes{2, 3, 4, 5};
     unsigned lateTdi = 0, lateTdo = 0;
     std::vector<PlacedCore> cores{};
   };

@@ -35,7 +35,8 @@ void SimCable::run(std::vector<QorRT::Qor_Scan>& scans) {
 
 void SimCable::runIr(const QorRT::Qor_Scan& scan) {
   ++scans_;
-  const QorRT::ChainScan out = QorRT::chainIrScan(devices_, scan.device, Tap::userOpcode(scan.userChain));
+  const std::uint32_t opcode = chain_->tap(scan.device).userOpcode(scan.userChain);
+  const QorRT::ChainScan out = QorRT::chainIrScan(devices_, scan.device, opcode);
   Bits stream = unpack(out.bits, out.bitCount);
   chain_->scanIr(stream);
 }

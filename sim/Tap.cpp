@@ -1,5 +1,8 @@
 #include "sim/Tap.h"
 
+#include <algorithm>
+#include <utility>
+
 namespace qorsim {
 namespace {
 
@@ -7,19 +10,21 @@ constexpr std::uint32_t idcodeOpcode = 1, bypassOpcode = 0xFFFFFFFF;
 
 }  // namespace
 
-Tap::Tap(std::uint32_t idcode, unsigned irLength, Lateness lateness)
-    : idcode_(idcode), irLength_(irLength), lateness_(lateness) {
-  reset();
+Tap::Tap(std::uint32_t idcode, unsigned irLength, TapOptions options)
+    : idcode_(idcode), irLength_(irLength), options_(std::move(options)) {}
+
+std::uint32_t Tap::userOpcode(unsigned userChain) const {
+  return userChain <= options_.userOpcodes.size() ? options_.userOpcodes[userChain - 1] : bypassOpcode;
 }
 
 Hub& Tap::hub(unsigned userChain) {
   std::unique_ptr<UserRegister>& place = userRegisters_[userChain - 1];
-  if (!place) place = std::make_unique<UserRegister>(lateness_);
+  if (!place) place = std::make_unique<UserRegister>(options_.lateness);
   return place->hub;
 }
 
 void Tap::reset() {
-  instruction_ = idcode_ != 0 ? idcodeOpcode : bypassOpcode;
+  instruction_.reset();
 }
 
 void Tap::captureIr() {
@@ -28,7 +33,8 @@ void Tap::captureIr() {
 }
 
 void Tap::captureDr() {
-  selected_ = isUserOpcode() ? userRegisters_[instruction_ - userOpcode(1)].get() : nullptr;
+  const std::size_t number = selectedUserRegister();
+  selected_ = number < userChainCount ? userRegisters_[number].get() : nullptr;
   if (selected_ != nullptr)
     selected_->capture();
   else
@@ -68,14 +74,17 @@ void Tap::clock() {
     if (each) each->hub.clock();
 }
 
-bool Tap::isUserOpcode() const {
-  return instruction_ >= userOpcode(1) && instruction_ <= userOpcode(userChainCount);
+// From 0 on; the number of them when none is selected.
+std::size_t Tap::selectedUserRegister() const {
+  const auto& opcodes = options_.userOpcodes;
+  const auto found = instruction_ ? std::find(opcodes.begin(), opcodes.end(), *instruction_) : opcodes.end();
+  return found != opcodes.end() ? static_cast<std::size_t>(found - opcodes.begin()) : userChainCount;
 }
 
 ShiftRegister Tap::captured() const {
-  if (isUserOpcode()) return ShiftRegister({});
-  if (instruction_ == idcodeOpcode && idcode_ != 0) return ShiftRegister(bitsOf(idcode_, 32));
-  return ShiftRegister({0});
+  if (selectedUserRegister() < userChainCount) return ShiftRegister({});
+  const bool isIdcode = idcode_ != 0 && instruction_.value_or(idcodeOpcode) == idcodeOpcode;
+  return ShiftRegister(isIdcode ? bitsOf(idcode_, 32) : Bits{0});
 }
 
 }  // namespace qorsim

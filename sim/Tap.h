@@ -5,24 +5,33 @@
 #include <cstdint>
 #include <functional>
 #include <memory>
+#include <optional>
+#include <vector>
 
 #include "sim/ShiftRegister.h"
 #include "sim/UserRegister.h"
 
 namespace qorsim {
 
-/// Instructions: 1 selects IDCODE, n + 1 selects USERn (n = 1 to 4), and all ones, like any other, BYPASS. A
-/// new TAP has IDCODE selected, or BYPASS when it has none.
+/// What TAPs differ in beside IDCODE and the length of the IR.
+struct TapOptions {
+  std::vector<std::uint32_t> userOpcodes{2, 3, 4, 5};  ///< of USER1 and so on; those that there are not are left out
+  Lateness lateness{};
+};
+
+/// Instructions: those of the user registers; then 1 selects IDCODE; and all ones, like any other, BYPASS. A new TAP
+/// has IDCODE selected, or BYPASS when it has none.
 class Tap {
  public:
   static constexpr unsigned userChainCount = 4;
   static constexpr unsigned shortestIr = 4;  // bits: room for six instructions
   static constexpr unsigned longestIr = 32;
 
-  static constexpr std::uint32_t userOpcode(unsigned userChain) { return userChain + 1; }
-
   /// `idcode` is 0 for a device without one.
-  Tap(std::uint32_t idcode, unsigned irLength, Lateness lateness = {});
+  Tap(std::uint32_t idcode, unsigned irLength, TapOptions options = {});
+
+  /// The instruction that selects a user register, or that of BYPASS when it has no such register.
+  std::uint32_t userOpcode(unsigned userChain) const;
 
   /// The hub behind a user chain, which appears when it is first asked for. A user register without a hub
   /// delivers zeros.
@@ -59,13 +68,13 @@ class Tap {
   void clock();
 
  private:
-  bool isUserOpcode() const;
+  std::size_t selectedUserRegister() const;
   ShiftRegister captured() const;
 
   std::uint32_t idcode_;
   unsigned irLength_;
-  Lateness lateness_;
-  std::uint32_t instruction_ = 0;
+  TapOptions options_;
+  std::optional<std::uint32_t> instruction_;  // none since the last reset
   std::array<std::unique_ptr<UserRegister>, userChainCount> userRegisters_;
 
   // What the last capture has put between TDI and TDO: a user register, or when that is null the other.
