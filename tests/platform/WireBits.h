@@ -58,23 +58,3 @@ inline Bits noise(std::size_t count, unsigned seed = 1) {
   }
   return bits;
 }
-
-/// CRC-16/X-25 of the bits, XORed with the low 16 bits of `length`.
-inline Bits checkOf(const Bits& bits, std::size_t length) {
-  unsigned crc = 0xFFFF;
-  for (const char bit : bits) crc = ((crc & 1) != 0) != (bit == '1') ? crc >> 1 ^ 0x8408 : crc >> 1;
-  return bitsOf(crc ^ 0xFFFF ^ (length & 0xFFFF), 16);
-}
-
-/// A scan of `length` bits that ends with a frame to core 0.
-inline Bits frameScan(unsigned code, const Bits& payload, std::size_t length) {
-  const Bits message = payload + bitsOf(0, 4) + bitsOf(code, 4);
-  const Bits frame = "10" + message + checkOf(message, payload.size());
-  return Bits(length - frame.size(), '1') + frame;
-}
-
-/// What a hub delivers.
-inline Bits answerOf(unsigned head, const Bits& data = "") {
-  const Bits covered = bitsOf(head, 16) + data;
-  return covered + checkOf(covered, data.size());
-}
