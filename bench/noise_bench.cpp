@@ -5,10 +5,10 @@
 #include <random>
 #include <vector>
 
+#include "FaultyCable.h"
 #include "QorJtag_Host.h"
 #include "QorVIO.h"
 #include "Sim.h"
-#include "bench/NoisyCable.h"
 
 namespace {
 
@@ -41,9 +41,9 @@ Failures callTimes(unsigned session, unsigned width, std::size_t calls) {
 
 void measure(unsigned width, bool sent, std::size_t calls, double rate) {
   const auto core = qorsim::vio().asyncOut(width).asyncIn(width).design(qorsim::loopback());
-  auto cable =
-      std::make_unique<bench::NoisyCable>(qorsim::chain().device(0x11).core(1, 0, core).cable(), rate, sent);
-  const bench::NoisyCable& noise = *cable;
+  auto cable = std::make_unique<qorsim::FaultyCable>(qorsim::chain().device(0x11).core(1, 0, core).cable());
+  cable->noise(sent ? rate : 0, sent ? 0 : rate);
+  const qorsim::FaultyCable& noise = *cable;
   const unsigned session = QorJtag_session_openCable(std::move(cable));
   QorJtag_session_setMessageHandler(session, [](unsigned, const char*) {});
   QorVIO_initCore(session, {0, 1, 0});
@@ -51,7 +51,7 @@ void measure(unsigned width, bool sent, std::size_t calls, double rate) {
   QorJtag_Statistics link;
   QorJtag_session_getStatistics(session, link);
   std::printf("%4u %4s %9zu %9zu %9llu %9llu %9llu %9llu %7zu %7zu %7zu\n", width, sent ? "TDI" : "TDO",
-              calls, noise.flips(), static_cast<unsigned long long>(link.repeatsNoHub),
+              calls, noise.noisyBits(), static_cast<unsigned long long>(link.repeatsNoHub),
               static_cast<unsigned long long>(link.repeatsNoHead),
               static_cast<unsigned long long>(link.repeatsBadCrc),
               static_cast<unsigned long long>(link.repeatsSlow + link.repeatsRefused), failures.writes,

@@ -22,15 +22,6 @@ constexpr Operation operations[] = {
 
 constexpr unsigned everyAttempt = 4;
 
-/// Ends the DR scan before the TCK: a host that died, and whose successor goes on.
-Fault cutAt(BitPlace place) {
-  return {[place](PassingExchange& exchange) {
-            exchange[1].sent.resize(place.index);
-            exchange[1].reachesChip = place.index != 0;
-          },
-          [](PassingExchange&, const PassingExchange&) { throw std::runtime_error("the link is down"); }};
-}
-
 class Link : public testing::TestWithParam<Operation> {
  protected:
   Link() {
@@ -57,7 +48,7 @@ class Link : public testing::TestWithParam<Operation> {
     const std::uint64_t before = world.statistics().transfers;
     for (std::size_t i = 0; i < bits && !HasFailure(); ++i) {
       SCOPED_TRACE(std::string(what) + ", " + std::to_string(i));
-      done += isDone(faultAt(bit(i)), exchanges) ? 1 : 0;
+      done += isDone(faultAt(i), exchanges) ? 1 : 0;
     }
     world.expectGood();
     std::printf("%s, %s in %u: %zu tried, %zu done, %zu transfers\n", operation.name, what, exchanges, bits,
@@ -88,14 +79,14 @@ TEST_P(Link, ThatFailsOrFallsSilentIsTold) {
 
 TEST_P(Link, ThatFlipsBitsIsNotNoticedUntilItIsAlwaysBad) {
   for (const unsigned exchanges : {1U, everyAttempt}) {
-    for (const unsigned pattern : {1U, 0xFFFFU, 0U}) {
+    for (const unsigned pattern : {1U, 0U}) {
       const auto burst = [&] {
         return static_cast<unsigned>(pattern != 0 ? pattern : (random() & 0xFFFF) | 1);
       };
       const std::size_t back = sweep("captured bits flipped", exchanges,
-                                     [&](BitPlace place) { return flipCaptured(place, burst()); });
+                                     [&](std::size_t place) { return flipCaptured(place, burst()); });
       const std::size_t out =
-          sweep("sent bits flipped", exchanges, [&](BitPlace place) { return flipSent(place, burst()); });
+          sweep("sent bits flipped", exchanges, [&](std::size_t place) { return flipSent(place, burst()); });
       EXPECT_TRUE(exchanges == 1 ? back == bits && out == bits : back < bits && out < bits);
     }
   }
@@ -104,7 +95,7 @@ TEST_P(Link, ThatFlipsBitsIsNotNoticedUntilItIsAlwaysBad) {
 TEST_P(Link, ThatLosesOrDoublesABitIsNotNoticedUntilItAlwaysDoes) {
   for (const unsigned exchanges : {1U, everyAttempt}) {
     const std::size_t done[] = {
-        sweep("captured bit lost", exchanges, [](BitPlace place) { return loseCaptured(place); }),
+        sweep("captured bit lost", exchanges, [](std::size_t place) { return loseCaptured(place); }),
         sweep("captured bit doubled", exchanges, doubleCaptured), sweep("sent bit lost", exchanges, loseSent),
         sweep("sent bit doubled", exchanges, doubleSent)};
     for (const std::size_t each : done) EXPECT_TRUE(exchanges == 1 ? each == bits : each < bits);
@@ -126,7 +117,7 @@ TEST(OtherSoftware, DoesNothingToACoreWithItsScans) {
   const auto scanAnything = [&] {
     for (unsigned scans = random() % 4; scans != 0; --scans) {
       world.scans.scanIr(1, 1 + random() % 4);
-      const std::size_t bits = 1 + random() % 1500;
+      const std::size_t bits = 1 + random() % 600;
       std::vector<unsigned char> out((bits + 7) / 8, random() % 2 == 0 ? 0xFF : 0);
       for (std::size_t i = random() % 2 * out.size(); i-- > 0;) out[i] = static_cast<unsigned char>(random());
       world.scans.scanDr(1, out, bits, false);
@@ -136,7 +127,7 @@ TEST(OtherSoftware, DoesNothingToACoreWithItsScans) {
   for (int i = 0; i < 500 && !testing::Test::HasFailure(); ++i) {
     world.stir();
     const bool breaksAnswer = random() % 2 == 0;
-    const Fault damage = breaksAnswer ? flipCaptured(bit(70), 0xFFFF) : flipSent(bit(20));
+    const Fault damage = breaksAnswer ? flipCaptured(75, 0xFFFF) : flipSent(20);
     const auto back = [&](PassingExchange& exchange, const PassingExchange& before) {
       if (damage.back) damage.back(exchange, before);
       scanAnything();
@@ -147,6 +138,25 @@ TEST(OtherSoftware, DoesNothingToACoreWithItsScans) {
   }
 }
 
+// Twenty times what a bad adapter does, so that some calls fail.
+TEST(Noise, CostsTimeAndSomeCallsButNoValue) {
+  LinkWorld world;
+  world.expectGood();
+  std::size_t failures = 0;
+  for (int i = 0; i < 1000 && !testing::Test::HasFailure(); ++i) {
+    world.stir();
+    world.link.noise(2e-3, 2e-3, static_cast<unsigned>(i));
+    for (const Operation& operation : operations) failures += (world.*operation.run)() ? 0 : 1;
+    world.link.noise(0, 0);
+    EXPECT_TRUE(world.expectActivityTold());
+  }
+  const QorJtag_Statistics link = world.statistics();
+  std::printf("noise: %zu bits, %zu repeats, %zu of 3000 calls failed\n", world.link.noisyBits(),
+              static_cast<std::size_t>(link.repeatsNoHub + link.repeatsNoHead + link.repeatsBadCrc),
+              failures);
+  EXPECT_GT(link.repeatsBadCrc, failures);
+}
+
 // A write that another program's write came between is not repeated blindly: it is done once, or fails.
 TEST(AnotherProgram, BetweenTheAttemptsOfAWriteNeverMakesItHappenTwice) {
   for (const bool reachesChip : {false, true}) {
@@ -154,7 +164,7 @@ TEST(AnotherProgram, BetweenTheAttemptsOfAWriteNeverMakesItHappenTwice) {
       LinkWorld world;
       world.expectGood();
       QorVIO_initCore(world.other.session, world.ref);
-      const Fault damage = reachesChip ? flipCaptured(bit(1320), 0xFFFF) : flipSent(bit(20));
+      const Fault damage = reachesChip ? flipCaptured(410, 0xFFFF) : flipSent(20);
       const auto back = [&](PassingExchange& exchange, const PassingExchange& before) {
         if (damage.back) damage.back(exchange, before);
         TextMap none, *map = &none;

@@ -1,4 +1,4 @@
-// A core of 64 bits of every port in the middle of a chain, behind a faulty link, with what its design drove
+// A core of 16 bits of every port in the middle of a chain, behind a faulty link, with what its design drove
 // and saw on record. Each operation checks what its success and what its failure owes.
 #pragma once
 
@@ -9,9 +9,12 @@
 #include "FaultyCable.h"
 #include "tests/system/Board.h"
 
-/// A port of 64 bits. Its bytes are the arrays of the exported functions: these tests are for hosts that keep
+/// Holds a port. Its bytes are the arrays of the exported functions: these tests are for hosts that keep
 /// the least significant byte first.
 using Word = std::uint64_t;
+
+constexpr unsigned portWidth = 16;
+constexpr Word allOutputs = (Word{1} << portWidth) - 1;
 
 using Words = std::array<Word, 2>;  // asynchronous, synchronous
 
@@ -24,29 +27,6 @@ inline unsigned char* bytes(Word& word) {
 inline const unsigned char* bytes(const Word& word) {
   return reinterpret_cast<const unsigned char*>(&word);
 }
-
-/// One of several programs' cables to the same chain.
-class SharedCable : public QorRT::Qor_Cable {
- public:
-  explicit SharedCable(std::shared_ptr<QorRT::Qor_Cable> chain) : chain_(std::move(chain)) {}
-  const std::vector<QorRT::Qor_Device>& devices() const override { return chain_->devices(); }
-
- private:
-  void run(std::vector<QorRT::Qor_Scan>& scans) override {
-    chain_->drop();
-    std::vector<std::size_t> numbers;
-    for (const QorRT::Qor_Scan& scan : scans) {
-      const bool isIr = scan.kind == QorRT::Qor_Scan::Kind::ir;
-      if (isIr) chain_->scanIr(scan.device, scan.userChain);
-      numbers.push_back(isIr ? 0 : chain_->scanDr(scan.device, scan.out, scan.bitCount, scan.capture));
-    }
-    chain_->flush();
-    for (std::size_t i = 0; i < scans.size(); ++i)
-      if (scans[i].capture) scans[i].in = chain_->captured(numbers[i]);
-  }
-
-  std::shared_ptr<QorRT::Qor_Cable> chain_;
-};
 
 class LinkWorld {
  public:
@@ -61,20 +41,21 @@ class LinkWorld {
   void stir() {
     pins_ = {random(), random()};
     glitchIn_ = random() % 9;
-    glitch_ = Word{1} << random() % 64;
+    glitch_ = Word{1} << random() % portWidth;
   }
 
-  /// The fault happens to so many exchanges of the next operation.
+  /// The fault happens to the first so many exchanges of the next operation.
   void hit(const qorsim::Fault& fault, unsigned exchanges) {
     isHit_ = true;
-    const auto out = [this, fault](qorsim::PassingExchange& exchange) {
+    const auto out = [this, fault, exchanges](qorsim::PassingExchange& exchange) {
+      if (isHit_ && exchanges > 1) hit(fault, exchanges - 1);
       if (isHit_ && fault.out) fault.out(exchange);
     };
     const auto back = [this, fault](qorsim::PassingExchange& exchange,
                                     const qorsim::PassingExchange& before) {
       if (isHit_ && fault.back) fault.back(exchange, before);
     };
-    for (; exchanges != 0; --exchanges) link.next({out, back});
+    link.next({out, back});
   }
 
   QorJtag_Statistics statistics() const {
@@ -86,14 +67,15 @@ class LinkWorld {
   /// A success drives every output to its last step and plays the pulse on synchronous bit 0 once; a failure
   /// does this too, or nothing at all.
   bool write() {
-    std::array<Word, 16> steps{};
-    for (std::size_t i = 0; i < steps.size(); ++i) steps[i] = (random() & ~Word{1}) | Word{i == 1};
+    std::array<std::uint16_t, 16> steps{};
+    for (std::size_t i = 0; i < steps.size(); ++i)
+      steps[i] = static_cast<std::uint16_t>((random() & ~Word{1}) | Word{i == 1});
     const Words wanted{random(), steps[15]};
     const Word before = outputs_[0];
-    const Word all = ~Word{0};
     pulses_ = 0;
-    const bool done = succeeded(QorVIO_setPortBits(board.session, ref, bytes(wanted[0]), bytes(all), 64,
-                                                   bytes(steps[0]), bytes(all), 64));
+    const bool done = succeeded(QorVIO_setPortBits(
+        board.session, ref, bytes(wanted[0]), bytes(allOutputs), portWidth,
+        reinterpret_cast<const unsigned char*>(steps.data()), bytes(allOutputs), portWidth));
     isHit_ = false;
     for (int i = 0; i < 4 && !done; ++i) read();  // lets the design clock play what may have begun
     EXPECT_EQ(pulses_, outputs_[0] == before ? 0 : 1);
@@ -103,12 +85,12 @@ class LinkWorld {
   }
 
   bool read() {
-    constexpr Word untouched = 0x5A5A5A5A5A5A5A5A;
+    constexpr Word untouched = 0x5A5A;
     Inputs in;
     in.fill(untouched);
     const bool done = succeeded(QorVIO_getPortBits(board.session, ref, bytes(in[0]), bytes(in[1]),
-                                                   bytes(in[2]), 64, bytes(in[3]), bytes(in[4]), bytes(in[5]),
-                                                   bytes(in[6]), bytes(in[7]), 64));
+                                                   bytes(in[2]), portWidth, bytes(in[3]), bytes(in[4]),
+                                                   bytes(in[5]), bytes(in[6]), bytes(in[7]), portWidth));
     isHit_ = false;
     if (done) {
       told(in);
@@ -140,7 +122,7 @@ class LinkWorld {
     EXPECT_EQ(info.core_type, done ? 9 : 0);
     for (const unsigned width :
          {info.async_input_count, info.sync_input_count, info.async_output_count, info.sync_output_count})
-      EXPECT_EQ(width, done ? 64 : 0);
+      EXPECT_EQ(width, done ? portWidth : 0);
     return done;
   }
 
@@ -183,12 +165,12 @@ class LinkWorld {
             wordOf(c.getSyncInSyncActivityUp()), wordOf(c.getSyncInSyncActivityDown())};
   }
 
-  Word random() { return random_(); }
+  Word random() { return random_() & allOutputs; }
 
   /// One design clock.
   void clock(qorsim::Ports& ports) {
     outputs_ = {};
-    for (std::size_t i = 0; i < 64; ++i) {
+    for (std::size_t i = 0; i < portWidth; ++i) {
       outputs_[0] |= Word{ports.asyncOut[i]} << i;
       outputs_[1] |= Word{ports.syncOut[i]} << i;
       ports.asyncIn[i] = pins_[0] >> i & 1;
@@ -224,11 +206,12 @@ class LinkWorld {
     const std::string seen =
         "(the hub did not answer the frame|the answer begins with [0-9A-F]{2}, which is no head|the CRC of "
         "the answer "
-        "does not hold over (0|128|640) data bits|no debug hub answers, TDO is (all zeros|all ones|another "
+        "does not hold over (0|128|160) data bits|no debug hub answers, TDO is (all zeros|all ones|another "
         "pattern, its "
         "first 32 bits [0-9A-F]{8}))";
     static const testing::Matcher<std::string> whatIsSeen = testing::MatchesRegex(
-        "100 device 1, user chain 2, core 3: (the link failed at scan [01]|the link is down|the write was "
+        "100 device 1, user chain 2, core 3: (the link failed at (scan|bit) [0-9]+|the link is down|the "
+        "write was "
         "refused when "
         "repeated: .*|no such core, or it cannot be (read|written)|" +
         seen + ", in 4 attempts|4 attempts: " + seen + "(; " + seen + "){3})");
@@ -251,17 +234,20 @@ class LinkWorld {
           .device(0x0A5F1093)
           .named("fpga")
           .core(2, 3,
-                qorsim::vio().asyncIn(64).syncIn(64).asyncOut(64).syncOut(64).design(
-                    qorsim::callback([this](qorsim::Ports& ports) { clock(ports); })))
+                qorsim::vio()
+                    .asyncIn(portWidth)
+                    .syncIn(portWidth)
+                    .asyncOut(portWidth)
+                    .syncOut(portWidth)
+                    .design(qorsim::callback([this](qorsim::Ports& ports) { clock(ports); })))
           .device(0x1234567B)
           .named("far")
           .cable();
-  std::unique_ptr<qorsim::FaultyCable> cable_ =
-      std::make_unique<qorsim::FaultyCable>(std::make_unique<SharedCable>(chain_));
+  std::unique_ptr<qorsim::FaultyCable> cable_ = std::make_unique<qorsim::FaultyCable>(chain_);
 
  public:
   qorsim::FaultyCable& link = *cable_;
   Board board{std::move(cable_)};
-  Board other{std::make_unique<SharedCable>(chain_)};  // another program, on a good link
-  SharedCable scans{chain_};                           // other software
+  Board other{std::make_unique<qorsim::FaultyCable>(chain_)};  // another program, on a good link
+  qorsim::FaultyCable scans{chain_};                           // other software
 };
