@@ -1,76 +1,72 @@
-// The core's end of the bus behind a hub: knows when the core is meant, and delivers its results bit by bit.
+// The core's end of the bus of a hub: finds out whether the core is meant, and delivers its data bit by bit.
 `default_nettype none
 
 module qor_core_link #(
-    parameter         INDEX = 0,          // of the core on its user chain, 0 to 15
-    parameter [127:0] STATUS_WORD = 0,    // what code 00 delivers
-    parameter         RECORD_BITS = 0     // what codes 03 and 05 deliver
+    parameter         INDEX = 0,         // of the core on its user chain, 0 to 15
+    parameter [127:0] STATUS_WORD = 0,   // what code 00 delivers
+    parameter         PAYLOAD_BITS = 0,  // of a write
+    parameter         RECORD_BITS = 0    // what codes 03 and 05 deliver
 ) (
     input  wire        tck,
-    input  wire [46:0] to_core,
+    input  wire [30:0] to_core,
     output wire [6:0]  from_core,
 
-    // The frame that the hub has received. The core answers at once; it acts on TCK when `obey` is high.
-    output wire        capturing,
-    output wire        shifting,
+    // The frame. What follows it happens at TCK.
+    output wire [3:0]  code,
+    output wire [15:0] tag,
     output wire        payload_bit,
-    output wire [20:0] frame_length,  // of the payload
-    output wire [3:0]  frame_code,
-    output wire        obey,          // the frame is for this core, and whole
-    output wire        result_seen,   // this scan delivers a finished snapshot of this core
-    input  wire        knows_code,    // beside 00 and 0F, which every core knows
-    input  wire        rejects,
-    input  wire        refuses,
+    output wire        payload_shift,  // the payload bit is one of this core
+    output wire        accepted,       // for one TCK: the header is for this core, and whole
+    output wire        obeyed,         // for one TCK: so is the payload
+    output wire        sent,           // for one TCK: the answer is out
 
-    input  wire                                           pending,
+    // What the core says of it, at once.
+    input  wire        knows_code,     // beside 00 and 0F, which every core knows
+    input  wire        takes,          // the payload
+    input  wire        refuses,
+    input  wire        waits,          // for the design clock
+    input  wire        overlaps,       // flag 3
+
     input  wire [RECORD_BITS == 0 ? 0 : RECORD_BITS-1 : 0] records
 );
 
-  localparam [3:0] CODE_STATUS = 4'h0, CODE_READ = 4'h3, CODE_READ_AGAIN = 4'h5, CODE_NOTHING = 4'hF;
-  localparam       PLACE_BITS = RECORD_BITS < 256 ? 8 : $clog2(RECORD_BITS + 1);
+  localparam [3:0] CODE_STATUS = 4'h0, CODE_NOTHING = 4'hF;
+  localparam       LONGEST = PAYLOAD_BITS > RECORD_BITS ? PAYLOAD_BITS : RECORD_BITS;
+  localparam       PLACE_BITS = LONGEST < 256 ? 8 : $clog2(LONGEST + 1);
 
-  wire       any_obey, last_pending, behind_head;
-  wire [3:0] frame_core, last_core, last_code, length_place;
-  assign {capturing, shifting, payload_bit, any_obey, frame_core, frame_code, frame_length,
-          last_core, last_code, last_pending, behind_head, length_place} = to_core;
+  wire       shifting, in_payload, in_data, any_accepted, any_obeyed, any_sent;
+  wire [3:0] core;
+  assign {tag, core, code, payload_bit, shifting, in_payload, in_data, any_accepted, any_obeyed, any_sent} = to_core;
 
-  wire meant = frame_core == INDEX[3:0];
-  wire selected = last_core == INDEX[3:0];
-  wire delivers_status = selected & last_code == CODE_STATUS;
-  wire delivers_records = selected & (last_code == CODE_READ | last_code == CODE_READ_AGAIN);
-
-  assign obey = any_obey & meant;
-  assign result_seen = delivers_records & ~last_pending;
+  wire meant = core == INDEX[3:0];
+  wire is_status = code == CODE_STATUS;
+  wire is_read = code[2:0] == 3'd3 | code[2:0] == 3'd5;
+  assign accepted = any_accepted & meant;
+  assign obeyed = any_obeyed & meant;
+  assign sent = any_sent & meant;
 
   // The status word is a table, not registers; the records are delivered from where they are kept.
-  reg  [PLACE_BITS-1:0] place = 0;
-  wire                  more_status = delivers_status & ~place[7];
-  wire                  more_records, record_bit;
-  wire                  more = more_status | more_records;
-  wire [15:0]           record_count = RECORD_BITS[15:0];
-  wire                  length_bit = delivers_status & length_place == 4'd7 |
-                                     delivers_records & record_count[length_place];
+  reg  [PLACE_BITS-1:0] place = 0;  // of the bit that is shifted next, in payload or data
+  wire                  record_bit;
+  wire more = in_payload ? place != PAYLOAD_BITS[PLACE_BITS-1:0] :
+              is_status ? ~place[7] : is_read & place != RECORD_BITS[PLACE_BITS-1:0];
+  wire data = is_status ? STATUS_WORD[place[6:0]] : record_bit;
+  wire knows = knows_code | is_status | code == CODE_NOTHING;
+  assign payload_shift = shifting & in_payload & meant & more;
 
   always @(posedge tck)
-    if (capturing) place <= 0;
-    else if (shifting & behind_head & more) place <= place + 1'b1;
+    if (~(in_payload | in_data)) place <= 0;
+    else if (shifting & more) place <= place + 1'b1;
 
   generate
-    if (RECORD_BITS == 0) begin : without_records
-      wire unused = records;
-      assign more_records = 1'b0;
-      assign record_bit = 1'b0;
-    end else begin : with_records
-      localparam INDEX_BITS = RECORD_BITS == 1 ? 1 : $clog2(RECORD_BITS);
-      assign more_records = delivers_records & place != RECORD_BITS[PLACE_BITS-1:0];
-      assign record_bit = records[place[INDEX_BITS-1:0]];
+    if (RECORD_BITS < 2) begin : at_most_one
+      assign record_bit = records[0];
+    end else begin : several
+      assign record_bit = records[place[$clog2(RECORD_BITS)-1:0]];
     end
   endgenerate
 
-  wire data = more_status & STATUS_WORD[place[6:0]] | more_records & record_bit;
-  wire takes = knows_code | frame_code == CODE_STATUS | frame_code == CODE_NOTHING;
-
-  assign from_core = {length_bit, more, data, selected & pending, meant & refuses, meant & rejects, meant & takes};
+  assign from_core = {7{meant}} & {data, more, overlaps, waits, refuses, takes, knows};
 
 endmodule
 

@@ -1,130 +1,124 @@
-// The hub at the end of a user chain: takes frames to its cores and brings their results back.
+// The hub at the end of a user chain: it understands a frame while it is shifted in, and answers in the same scan.
 //
-// Everything here is on TCK. capture, shift and update are levels, sampled at its rising edge; tdo changes at the
-// rising edge too, so it is stable when a TAP samples it at the falling one.
+// Everything here is on TCK. capture and shift are levels, sampled at its rising edge; tdo changes at the rising edge
+// too, so it is stable when a TAP samples it at the falling one. TCK may stand still in all other states of the TAP.
 `default_nettype none
 
 module qor_hub #(
-    parameter CORES = 1,        // how many cores stand behind this hub, 1 to 16
-    parameter LENGTH_BITS = 16  // the longest payload, 2 * ASYNC_OUT + 17 * SYNC_OUT, fits in these: 16 to 21
+    parameter CORES = 1  // how many cores this hub has, 1 to 16
 ) (
     input  wire               tck,
     input  wire               sel,
     input  wire               capture,
     input  wire               shift,
-    input  wire               update,
     input  wire               tdi,
     output reg                tdo,
-    output wire [46:0]        to_cores,   // to every core alike
-    input  wire [7*CORES-1:0] from_cores  // 7 bits a core, in any order
+    output wire [30:0]        to_cores,   // to every core alike
+    input  wire [7*CORES-1:0] from_cores  // 7 bits per core, in any order
 );
 
-  localparam [3:0] CODE_WRITE = 4'h2, CODE_NOTHING = 4'hF;
-  localparam [3:0] SIGNATURE = 4'hA;
+  // SEARCH: for the start of the frame. HEADER and PAYLOAD: with the CRC behind each. WAIT: until the core has done
+  // what it was told. DATA: with the CRC behind it. SENT: the last bit is on tdo. SILENT: zeros until Capture-DR.
+  localparam [2:0] SILENT = 0, SEARCH = 1, HEADER = 2, PAYLOAD = 3, HEAD = 4, WAIT = 5, DATA = 6, SENT = 7;
+
+  reg [2:0] state = SILENT;
+  wire      in_header = state == HEADER, in_payload = state == PAYLOAD, in_head = state == HEAD, in_data = state == DATA;
 
   wire capturing = sel & capture;
   wire shifting = sel & shift;
-  wire updating = sel & update;
 
-  // CRC-16/X-25, one bit.
-  function [15:0] crc_step(input [15:0] crc, input data);
-    crc_step = {1'b0, crc[15:1]} ^ (crc[0] ^ data ? 16'h8408 : 16'h0000);
-  endfunction
-
-  // --- What the cores say: a core that is not meant says 0, so they are ORed. ---
+  // --- What the cores say. A core that is not meant says 0, so all are ORed; if two are meant, neither is obeyed. ---
 
   reg [6:0] reply;
+  reg       clash;
   integer   i;
   always @* begin
     reply = 7'b0;
-    for (i = 0; i < CORES; i = i + 1) reply = reply | from_cores[7*i+:7];
+    clash = 1'b0;
+    for (i = 0; i < CORES; i = i + 1) begin
+      clash = clash | reply[0] & from_cores[7*i];
+      reply = reply | from_cores[7*i+:7];
+    end
   end
 
-  wire takes, rejects, refuses;         // of the frame that is in the receiver
-  wire waits;                           // a command of the last accepted frame's core waits for the design clock
-  wire data, more, length_bit;          // of its result: this bit, whether there is one, a bit of the length
-  assign {length_bit, more, data, waits, refuses, rejects, takes} = reply;
+  wire knows, takes, refuses;     // the header: a core has this index and code; wants the payload; will not obey
+  wire waits, overlaps;           // the answer has to wait for the design clock; flag 3
+  wire more, data;                // payload or data: there is a bit more; that bit, of data
+  assign {data, more, overlaps, waits, refuses, takes, knows} = reply & {7{~clash}};
 
-  // --- Receiver. The last 24 bits stand in `tail`, so that a payload comes out of it just in time for a core to
-  // hold all of it at Update-DR. The CRC runs 16 bits late: at Update-DR it covers all but the CRC itself. ---
+  // --- Counter: 24 bits of header from 8, then 32 of CRC from 32; 32 of the other CRCs, and 8 of the head, from 0
+  // or 32. The core counts payload and data. ---
 
-  reg  [23:0]          tail = 24'b0;
-  reg  [15:0]          crc = 16'hFFFF;
-  reg                  in_frame = 1'b0;
-  reg  [LENGTH_BITS:0] length = {LENGTH_BITS + 1{1'b0}};  // of the payload, negative while the frame is too short
-
-  wire [3:0] frame_core = tail[3:0];
-  wire [3:0] frame_code = tail[7:4];
-  wire       length_is_full = length[LENGTH_BITS] & ~length[LENGTH_BITS-1];  // longer than any payload: stays
+  reg  [5:0] count = 6'd0;
+  wire       at_crc = in_header ? count[5] : (in_payload | in_data) & ~more;
+  wire       crc_ends = &count[4:0] & (count[5] | ~in_header);
 
   always @(posedge tck)
-    if (capturing) begin
-      tail <= 24'b0;
-      crc <= 16'hFFFF;
-      in_frame <= 1'b0;
-      length <= ~{{LENGTH_BITS - 2{1'b0}}, 3'd7};  // -8: the core and the code are counted too
-    end else if (shifting) begin
-      tail <= {tdi, tail[23:1]};
-      if (tail[7] & ~tail[8]) in_frame <= 1'b1;
-      if (in_frame) crc <= crc_step(crc, tail[8]);
-      if (in_frame & ~length_is_full) length <= length + 1'b1;
-    end
+    if (shifting)
+      case (state)
+        SEARCH:        count <= 6'd8;
+        WAIT:          count <= 6'd0;
+        PAYLOAD, DATA: if (at_crc) count <= count + 6'd1;
+        default:       count <= count + 6'd1;
+      endcase
 
-  wire crc_holds = ~length[LENGTH_BITS] & (tail[23:8] == (~crc ^ length[15:0]));
-  wire well_formed = crc_holds & (frame_code == CODE_WRITE | length == {LENGTH_BITS + 1{1'b0}});
-  wire obey = updating & well_formed;
+  // --- CRC-32: one for the whole scan. It goes round once during each CRC, so it is what it was when that ends. ---
 
-  // --- The fate of the last frame, and the last accepted one. A frame that finds no core, or no such code, is
-  // accepted too, and returns nothing. ---
-
-  reg       rejected = 1'b0, no_such = 1'b0, refused = 1'b0;
-  reg [3:0] last_core = 4'h0;
-  reg [3:0] last_code = CODE_NOTHING;
+  reg  [31:0] crc = 32'b0;
+  wire        head_bit;
+  wire        covered = in_head ? head_bit : in_data ? data : tdi;
+  wire        agrees = tdi != crc[0];
 
   always @(posedge tck)
-    if (updating) begin
-      rejected <= ~well_formed | rejects;
-      no_such <= well_formed & ~(takes | rejects | refuses);
-      refused <= well_formed & refuses;
-      if (well_formed & ~rejects & ~refuses) begin
-        last_core <= frame_core;
-        last_code <= frame_code;
-      end
-    end
+    if (shifting)
+      if (state == SEARCH) crc <= 32'hFFFFFFFF;
+      else if (at_crc) crc <= {crc[0], crc[31:1]};
+      else if (state != WAIT) crc <= {1'b0, crc[31:1]} ^ (crc[0] ^ covered ? 32'hEDB88320 : 32'h0);
 
-  // --- Sender: head, data, CRC, zeros. `place` counts the bits of the head, stands still at 16 during the data
-  // and goes on through the CRC. The CRC is made of what went out, so it holds whatever came from the cores. ---
+  // --- Receiver. While the start is searched for, the last bit of the header is the bit before this one. ---
 
-  reg  [5:0]  place = 6'd0;
-  reg  [15:0] answer_crc = 16'hFFFF;
-  reg         pending = 1'b0;  // as of Capture-DR
+  reg [23:0] header = 24'b0;  // tag (16), core (4), code (4)
+  reg        refused = 1'b0;
 
-  wire [15:0] head = {SIGNATURE, last_core, last_code, pending, refused, no_such, rejected};
-  wire        in_head = place[5:4] == 2'd0;
-  wire        behind_head = place[5:4] == 2'd1;
-  wire        in_data = behind_head & more;
-  wire        in_crc = behind_head & ~more;
-  wire        tdo_is_covered = in_head | place[3:0] == 4'd0;
+  // One TCK after the last bit of a CRC that holds, in whatever state the TAP is then.
+  reg        accepted = 1'b0;  // of the header
+  reg        obeyed = 1'b0;    // of the payload
+
+  always @(posedge tck) begin
+    accepted <= shifting & in_header & crc_ends & agrees;
+    obeyed <= shifting & in_payload & crc_ends & agrees;
+    if (capturing) header[23] <= 1'b0;
+    else if (shifting & (state == SEARCH | in_header & ~count[5])) header <= {tdi, header[23:1]};
+    if (shifting & in_header) refused <= refuses | clash;
+  end
 
   always @(posedge tck)
-    if (capturing) begin
-      pending <= waits;
-      tdo <= head[0];
-      place <= 6'd1;
-      answer_crc <= 16'hFFFF;
-    end else if (shifting) begin
-      tdo <= in_head & head[place[3:0]] | in_data & data | in_crc & (~answer_crc[1] ^ length_bit);
-      if (in_head | in_crc) place <= place + 6'd1;
-      answer_crc <= tdo_is_covered ? crc_step(answer_crc, tdo) : {1'b0, answer_crc[15:1]};
-    end
+    if (capturing) state <= SEARCH;
+    else if (shifting)
+      case (state)
+        SEARCH:  if (header[23] & ~tdi) state <= HEADER;
+        HEADER:  if (at_crc & ~agrees) state <= SILENT;
+                 else if (crc_ends) state <= takes ? PAYLOAD : HEAD;
+        PAYLOAD: if (at_crc & ~agrees) state <= SILENT;
+                 else if (crc_ends) state <= HEAD;
+        HEAD:    if (&count[2:0]) state <= WAIT;
+        WAIT:    if (~waits) state <= DATA;
+        DATA:    if (crc_ends) state <= SENT;
+        default: state <= SILENT;
+      endcase
+
+  // --- Sender ---
+
+  wire [7:0] head = {4'hA, overlaps, refused, ~knows, 1'b0};
+  assign head_bit = head[count[2:0]];
 
   initial tdo = 1'b0;
 
-  wire [20:0] frame_length;
-  wire        unused_bit;
-  assign {unused_bit, frame_length} = {{22 - LENGTH_BITS{1'b0}}, length[LENGTH_BITS-1:0]};
-  assign to_cores = {capturing, shifting, tail[0], obey, frame_core, frame_code, frame_length,
-                     last_core, last_code, pending, behind_head, place[3:0]};
+  always @(posedge tck)
+    if (capturing) tdo <= 1'b1;
+    else if (shifting) tdo <= in_head & head_bit | state == WAIT & ~waits | in_data & (more ? data : ~crc[0]);
+
+  assign to_cores = {header, tdi, shifting, in_payload, in_data, accepted, obeyed, shifting & state == SENT};
 
 endmodule
 

@@ -10,8 +10,7 @@ module qor_input_port #(
     parameter EDGE_CAPTURE = 0  // see pulses shorter than a clock: two flip-flops an input that the pin clocks
 ) (
     input  wire             clk,
-    input  wire             sync_settled,
-    input  wire             async_settled,
+    input  wire             settled,
     input  wire             take,
     input  wire [WIDTH-1:0] pins,
 
@@ -23,7 +22,8 @@ module qor_input_port #(
     output wire [WIDTH-1:0] clocked_down
 );
 
-  reg  [WIDTH-1:0] now = 0, earlier = 0;
+  wire [WIDTH-1:0] now;
+  reg  [WIDTH-1:0] earlier = 0;
   wire [WIDTH-1:0] rise = now & ~earlier, fall = ~now & earlier;
 
   reg  [WIDTH-1:0] live_up = 0, live_down = 0;
@@ -32,18 +32,21 @@ module qor_input_port #(
 
   generate
     if (SYNCHRONOUS != 0) begin : direct
-      always @(posedge clk) now <= pins;
+      reg [WIDTH-1:0] sampled = 0;
+      always @(posedge clk) sampled <= pins;
+      assign now = sampled;
     end else begin : synchronised
       // Crossing to clk: two flip-flops, of which only the second is used. Bits of a port may arrive a clock apart.
-      reg [WIDTH-1:0] first = 0;
-      always @(posedge clk) {now, first} <= {first, pins};
+      (* ASYNC_REG = "TRUE", keep *) reg [WIDTH-1:0] first = 0, second = 0;
+      always @(posedge clk) {second, first} <= {first, pins};
+      assign now = second;
     end
 
     // Activity as the design clock samples it. A change in the clock of a take is not lost: it is either delivered
     // in that clock or begins the next collection.
     if (SYNCHRONOUS != 0) begin : one_clock_late
       always @(posedge clk)
-        if (!sync_settled) begin
+        if (!settled) begin
           live_up <= 0;
           live_down <= 0;
         end else begin
@@ -55,7 +58,7 @@ module qor_input_port #(
       assign clocked_down = live_down;
     end else begin : at_once
       always @(posedge clk)
-        if (!async_settled | take) begin
+        if (!settled | take) begin
           live_up <= 0;
           live_down <= 0;
         end else begin
@@ -74,8 +77,8 @@ module qor_input_port #(
       // before the take, whose flag tells it. So there is nothing to clear. An edge on its way to clk during a take
       // that tells an earlier one changes nothing either; if it lasts, the sampled activity tells it next time.
       wire [WIDTH-1:0] rose, fell;
-      reg  [WIDTH-1:0] rose_first = 0, rose_now = 0, rose_seen = 0;
-      reg  [WIDTH-1:0] fell_first = 0, fell_now = 0, fell_seen = 0;
+      (* ASYNC_REG = "TRUE", keep *) reg [WIDTH-1:0] rose_first = 0, rose_now = 0, fell_first = 0, fell_now = 0;
+      reg [WIDTH-1:0] rose_seen = 0, fell_seen = 0;
       genvar           i;
       for (i = 0; i < WIDTH; i = i + 1) begin : pin
         reg rise_step = 1'b0, fall_step = 1'b0;
@@ -87,7 +90,7 @@ module qor_input_port #(
       always @(posedge clk) begin
         {rose_now, rose_first} <= {rose_first, rose};
         {fell_now, fell_first} <= {fell_first, fell};
-        if (take | ~async_settled) begin
+        if (take | ~settled) begin
           rose_seen <= rose_now;
           fell_seen <= fell_now;
         end
@@ -99,8 +102,6 @@ module qor_input_port #(
       assign down = clocked_down;
     end
   endgenerate
-
-  wire unused = &{1'b0, sync_settled, async_settled};
 
 endmodule
 

@@ -16,7 +16,6 @@ module qor_sim_tap #(
     output wire [3:0] user_sel,       // bit n-1: USERn is selected
     output wire       capture,        // levels, for all user chains alike
     output wire       shift,
-    output wire       update,
     input  wire [3:0] user_tdo,       // 0 of a chain that is not there
     output wire       run_test_idle   // that state: with TMS low, the next TCK stays in it
 );
@@ -53,7 +52,6 @@ module qor_sim_tap #(
 
   assign capture = state == CAPTURE_DR;
   assign shift = state == SHIFT_DR;
-  assign update = state == UPDATE_DR;
   assign run_test_idle = state == RUN_TEST_IDLE;
 
   reg [IR_LENGTH-1:0] shifted_ir = CAPTURED_IR;

@@ -19,7 +19,6 @@ module qor_vio #(
     input  wire sel,
     input  wire capture,
     input  wire shift,
-    input  wire update,
     input  wire tdi,
     output wire tdo,
 
@@ -30,15 +29,13 @@ module qor_vio #(
     output wire [SYNC_OUT == 0 ? 0 : SYNC_OUT-1 : 0]   sync_out    // synchronous to clk
 );
 
-  localparam PAYLOAD_BITS = 2 * ASYNC_OUT + 17 * SYNC_OUT;
-
-  wire [46:0] to_core;
+  wire [30:0] to_core;
   wire [6:0]  from_core;
 
   qor_hub #(
-      .CORES(1), .LENGTH_BITS(PAYLOAD_BITS < 65536 ? 16 : $clog2(PAYLOAD_BITS + 1))
+      .CORES(1)
   ) hub (
-      .tck(tck), .sel(sel), .capture(capture), .shift(shift), .update(update), .tdi(tdi), .tdo(tdo),
+      .tck(tck), .sel(sel), .capture(capture), .shift(shift), .tdi(tdi), .tdo(tdo),
       .to_cores(to_core), .from_cores(from_core)
   );
 

@@ -1,7 +1,7 @@
 // A VIO core: virtual inputs and outputs of a design, behind a hub.
 //
-// Codes 02 (write), 03 and 05 (snapshot) and 04 (acknowledge), beside those that every core knows. All registers
-// are 0 at power-up; there is no reset, and a reset of the TAP leaves the outputs as they are.
+// Codes 02 and 0A (write), 03, 05, 0B and 0D (read), beside those that every core knows. All registers are 0 at
+// power-up; there is no reset, and a reset of the TAP leaves the outputs as they are.
 `default_nettype none
 
 module qor_vio_core #(
@@ -22,7 +22,7 @@ module qor_vio_core #(
     parameter CG_MINOR_ALPHA = 0
 ) (
     input  wire        tck,
-    input  wire [46:0] to_core,
+    input  wire [30:0] to_core,
     output wire [6:0]  from_core,
 
     input  wire                                         clk,        // design clock
@@ -32,7 +32,7 @@ module qor_vio_core #(
     output wire [SYNC_OUT == 0 ? 0 : SYNC_OUT-1 : 0]   sync_out    // synchronous to clk
 );
 
-  localparam [3:0]  CODE_WRITE = 4'h2, CODE_READ = 4'h3, CODE_ACKNOWLEDGE = 4'h4, CODE_READ_AGAIN = 4'h5;
+  localparam [2:0]  WRITE = 3'd2, READ = 3'd3, READ_AGAIN = 3'd5;  // of a code; its bit 3 is set in a repeat
   localparam        PAYLOAD_BITS = 2 * ASYNC_OUT + 17 * SYNC_OUT;
   localparam        ASYNC_RECORD = 4, SYNC_RECORD = 6;  // bits an input
   localparam        RECORD_BITS = ASYNC_RECORD * ASYNC_IN + SYNC_RECORD * SYNC_IN;
@@ -46,51 +46,55 @@ module qor_vio_core #(
   localparam [127:0] STATUS_WORD = VERSION < 8'h62 ? {56'b0, NARROW, HEAD} :
                                    VERSION < 8'hA0 ? {24'b0, WIDE, HEAD} : {4'b0, WIDE, CG, HEAD};
 
-  wire        capturing, shifting, payload_bit, obey, result_seen;
-  wire [20:0] frame_length;
   wire [3:0]  code;
+  wire [15:0] tag;
+  wire        payload_bit, payload_shift, accepted, obeyed, sent;
+  wire        playing, pending, merging;  // trains; a snapshot; with the activity of the record before
 
-  wire is_write = code == CODE_WRITE;
-  wire is_read = code == CODE_READ | code == CODE_READ_AGAIN;
-  wire is_acknowledge = code == CODE_ACKNOWLEDGE;
-  wire write_blocked, write_pending, snapshot_pending;
-  wire rejects = is_write & frame_length != PAYLOAD_BITS[20:0];
-  wire refuses = is_write & ~rejects & write_blocked | is_acknowledge & ~result_seen;
-  wire does = obey & ~rejects & ~refuses;
+  // A repeat of what was done already, by the same tag, is not done again.
+  reg  [15:0] written = 16'h0, asked = 16'h0;
+  wire        is_write = code[2:0] == WRITE;
+  wire        is_read = code[2:0] == READ | code[2:0] == READ_AGAIN;
+  wire        was_written = code[3] & tag == written;
+  wire        was_asked = code[3] & tag == asked;
+  wire        of_another_host = code[3] & tag[15:4] != written[15:4];
+  wire        refuses = is_write & ~was_written & (playing | of_another_host);
+  wire        asks = accepted & is_read & ~was_asked;
 
-  reg [RECORD_BITS == 0 ? 0 : RECORD_BITS-1 : 0] records = 0;  // the delivery register, on clk
+  always @(posedge tck) begin
+    if (obeyed) written <= tag;
+    if (asks) asked <= tag;
+  end
+
+  reg [RECORD_BITS == 0 ? 0 : RECORD_BITS-1 : 0] records = 0;  // what a read delivers, on clk
 
   qor_core_link #(
-      .INDEX(INDEX), .STATUS_WORD(STATUS_WORD), .RECORD_BITS(RECORD_BITS)
+      .INDEX(INDEX), .STATUS_WORD(STATUS_WORD), .PAYLOAD_BITS(PAYLOAD_BITS), .RECORD_BITS(RECORD_BITS)
   ) link (
-      .tck(tck), .to_core(to_core), .from_core(from_core),
-      .capturing(capturing), .shifting(shifting), .payload_bit(payload_bit),
-      .frame_length(frame_length), .frame_code(code), .obey(obey), .result_seen(result_seen),
-      .knows_code(is_write | is_read | is_acknowledge), .rejects(rejects), .refuses(refuses),
-      .pending(write_pending | snapshot_pending), .records(records)
+      .tck(tck), .to_core(to_core), .from_core(from_core), .code(code), .tag(tag),
+      .payload_bit(payload_bit), .payload_shift(payload_shift), .accepted(accepted), .obeyed(obeyed), .sent(sent),
+      .knows_code(is_write | is_read), .takes(is_write & ~was_written & ~refuses), .refuses(refuses),
+      .waits(is_write & playing | is_read & pending), .overlaps(is_read & merging), .records(records)
   );
 
   qor_outputs #(
       .ASYNC(ASYNC_OUT), .SYNC(SYNC_OUT)
   ) outputs (
-      .tck(tck), .capturing(capturing), .shifting(shifting), .payload_bit(payload_bit),
-      .write(does & is_write), .blocked(write_blocked), .pending(write_pending),
+      .tck(tck), .payload_shift(payload_shift), .payload_bit(payload_bit), .write(obeyed), .busy(playing),
       .clk(clk), .async_out(async_out), .sync_out(sync_out)
   );
 
-  wire take, merge, sync_settled, async_settled;
+  wire take, merge, settled;
 
   qor_snapshot snapshot (
-      .tck(tck), .request(does & is_read), .always_merge(code == CODE_READ_AGAIN),
-      .acknowledge(does & is_acknowledge), .pending(snapshot_pending),
-      .clk(clk), .take(take), .merge(merge), .sync_settled(sync_settled), .async_settled(async_settled)
+      .tck(tck), .request(asks), .always_merge(code[2:0] == READ_AGAIN), .delivered(sent & is_read),
+      .pending(pending), .merging(merging), .clk(clk), .take(take), .merge(merge), .settled(settled)
   );
 
-  // The record of input 0 is the last to be delivered: digit k of the records is bit RECORD_BITS-1-k. Activity that
-  // was delivered before stays if it is to be merged.
+  // The record of input 0 is the last to be delivered: digit k of the records is bit RECORD_BITS-1-k.
   generate
     if (RECORD_BITS == 0) begin : without_records
-      wire unused = &{1'b0, take, merge, sync_settled, async_settled};
+      wire unused = &{1'b0, take, merge, settled};
     end
 
     if (ASYNC_IN == 0) begin : without_async_in
@@ -102,7 +106,7 @@ module qor_vio_core #(
       qor_input_port #(
           .WIDTH(ASYNC_IN), .SYNCHRONOUS(0), .EDGE_CAPTURE(EDGE_CAPTURE)
       ) port (
-          .clk(clk), .sync_settled(sync_settled), .async_settled(async_settled), .take(take),
+          .clk(clk), .settled(settled), .take(take),
           .pins(async_in), .value(value), .up(up), .down(down),
           .clocked_up(unused_up), .clocked_down(unused_down)
       );
@@ -127,7 +131,7 @@ module qor_vio_core #(
       qor_input_port #(
           .WIDTH(SYNC_IN), .SYNCHRONOUS(1), .EDGE_CAPTURE(EDGE_CAPTURE)
       ) port (
-          .clk(clk), .sync_settled(sync_settled), .async_settled(async_settled), .take(take),
+          .clk(clk), .settled(settled), .take(take),
           .pins(sync_in), .value(value), .up(up), .down(down),
           .clocked_up(clocked_up), .clocked_down(clocked_down)
       );

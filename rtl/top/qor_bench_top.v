@@ -27,21 +27,21 @@ module qor_bench_top #(
 );
 
   wire [3:0] user_sel;
-  wire       capture, shift, update, hub_tdo;
+  wire       capture, shift, hub_tdo;
   wire       unused = &{1'b0, user_sel[3:1]};
 
   qor_sim_tap #(
       .IDCODE(32'h0A5F1093), .IR_LENGTH(6)
   ) tap (
       .tck(tck), .tms(tms), .tdi(tdi), .tdo(tdo), .user_sel(user_sel), .capture(capture), .shift(shift),
-      .update(update), .user_tdo({3'b000, hub_tdo}), .run_test_idle(run_test_idle)
+      .user_tdo({3'b000, hub_tdo}), .run_test_idle(run_test_idle)
   );
 
   qor_vio #(
       .ASYNC_IN(ASYNC_IN), .SYNC_IN(SYNC_IN), .ASYNC_OUT(ASYNC_OUT), .SYNC_OUT(SYNC_OUT),
       .EDGE_CAPTURE(EDGE_CAPTURE), .MAJOR(MAJOR), .MINOR(MINOR)
   ) vio (
-      .tck(tck), .sel(user_sel[0]), .capture(capture), .shift(shift), .update(update), .tdi(tdi), .tdo(hub_tdo),
+      .tck(tck), .sel(user_sel[0]), .capture(capture), .shift(shift), .tdi(tdi), .tdo(hub_tdo),
       .clk(clk), .async_in(async_in), .sync_in(sync_in), .async_out(async_out), .sync_out(sync_out)
   );
 

@@ -11,7 +11,7 @@ module qor_demo_cpld (
 );
 
   wire [3:0] user_sel;
-  wire       capture, shift, update, hub_tdo;
+  wire       capture, shift, hub_tdo;
   wire [3:0] async_out, sync_out;
   wire       unused = &{1'b0, user_sel[3:1], async_out, sync_out};
 
@@ -28,13 +28,13 @@ module qor_demo_cpld (
       .IDCODE(32'h1234567B), .IR_LENGTH(8)
   ) tap (
       .tck(tck), .tms(tms), .tdi(tdi), .tdo(tdo), .user_sel(user_sel), .capture(capture), .shift(shift),
-      .update(update), .user_tdo({3'b000, hub_tdo}), .run_test_idle(run_test_idle)
+      .user_tdo({3'b000, hub_tdo}), .run_test_idle(run_test_idle)
   );
 
   qor_vio #(
       .MAJOR(6), .MINOR(1), .ASYNC_IN(16), .SYNC_IN(16), .ASYNC_OUT(4), .SYNC_OUT(4)
   ) vio (
-      .tck(tck), .sel(user_sel[0]), .capture(capture), .shift(shift), .update(update), .tdi(tdi), .tdo(hub_tdo),
+      .tck(tck), .sel(user_sel[0]), .capture(capture), .shift(shift), .tdi(tdi), .tdo(hub_tdo),
       .clk(clk), .async_in(later), .sync_in(later), .async_out(async_out), .sync_out(sync_out)
   );
 

@@ -13,9 +13,9 @@ module qor_demo_fpga (
   localparam WIDTH = 8;
 
   wire [3:0]       user_sel;
-  wire             capture, shift, update, hub_tdo;
+  wire             capture, shift, hub_tdo;
   wire             unused = &{1'b0, user_sel[3:1]};
-  wire [46:0]      to_cores;
+  wire [30:0]      to_cores;
   wire [6:0]       from_core0, from_core1;
   wire [WIDTH-1:0] async_loop, sync_loop;
 
@@ -23,13 +23,13 @@ module qor_demo_fpga (
       .IDCODE(32'h0A5F1093), .IR_LENGTH(6)
   ) tap (
       .tck(tck), .tms(tms), .tdi(tdi), .tdo(tdo), .user_sel(user_sel), .capture(capture), .shift(shift),
-      .update(update), .user_tdo({3'b000, hub_tdo}), .run_test_idle(run_test_idle)
+      .user_tdo({3'b000, hub_tdo}), .run_test_idle(run_test_idle)
   );
 
   qor_hub #(
       .CORES(2)
   ) hub (
-      .tck(tck), .sel(user_sel[0]), .capture(capture), .shift(shift), .update(update), .tdi(tdi), .tdo(hub_tdo),
+      .tck(tck), .sel(user_sel[0]), .capture(capture), .shift(shift), .tdi(tdi), .tdo(hub_tdo),
       .to_cores(to_cores), .from_cores({from_core1, from_core0})
   );
 
