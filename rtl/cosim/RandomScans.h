@@ -1,9 +1,10 @@
-// Scans such as a host makes, and such as only a broken link or a foreign program makes.
+// Scans such as a host makes, and such as only a broken link or other software makes.
 #pragma once
 
+#include <algorithm>
 #include <random>
 
-#include "sim/Frame.h"
+#include "rtl/cosim/Frames.h"
 
 namespace qorrtl {
 
@@ -20,34 +21,52 @@ class RandomScans {
     return bits;
   }
 
-  /// A DR scan: constant pads, filler, and a frame for core 0 or 1 or for none, with a payload of `payloadBits` if
-  /// it is a write; now and then something is wrong with it. `padsAfter` constant bits follow.
-  qorsim::Bits scan(std::size_t payloadBits, unsigned padsAfter) {
-    constexpr unsigned codes[] = {0x0, 0x2, 0x2, 0x2, 0x3, 0x3, 0x3, 0x4, 0x4, 0x4, 0x5, 0xF};
-    const unsigned code = oneIn(16) ? below(16) : codes[below(12)];
-    std::size_t length = code == 2 ? payloadBits : 0;
-    if (oneIn(16)) length = below(static_cast<unsigned>(payloadBits) + 40);
-    qorsim::Bits payload = bits(length);
-    if (code == 2 && oneIn(4)) std::fill(payload.begin(), payload.end(), static_cast<unsigned char>(0));
-    qorsim::appendNumber(payload, oneIn(4) ? below(4) : 0, 4);
-    qorsim::appendNumber(payload, code, 4);
-    qorsim::appendNumber(payload, qorsim::checksum(payload.data(), payload.size(), length), 16);
+  /// A DR scan: constant bits, a frame for core 0 or 1 or for none, with a payload of `payloadBits` if it is a write,
+  /// and room for the answer to it or to a read of `recordBits`; now and then something is wrong with it.
+  qorsim::Bits scan(std::size_t payloadBits, std::size_t recordBits) {
+    const unsigned core = oneIn(4) ? below(4) : 0;
+    const unsigned code = codeOf();
+    const bool writes = (code & 7) == 2;
+    qorsim::Bits payload = bits(oneIn(24) ? below(static_cast<unsigned>(payloadBits) + 40) : payloadBits);
+    if (oneIn(4)) std::fill(payload.begin(), payload.end(), static_cast<unsigned char>(0));
+    const unsigned tag = tagFor(code);
+    const Frame frame =
+        writes && !oneIn(24) ? writeFrame(code, core, tag, payload) : headerFrame(code, core, tag);
     qorsim::Bits scan(below(3), static_cast<unsigned char>(below(2)));
-    scan.resize(scan.size() + 1 + (oneIn(2) ? below(700) : below(30)), 1);
-    scan.push_back(0);
-    scan.insert(scan.end(), payload.begin(), payload.end());
-    if (oneIn(16)) scan[below(static_cast<unsigned>(scan.size()))] ^= 1;
-    if (oneIn(32)) scan.resize(1 + below(static_cast<unsigned>(scan.size())));
-    if (oneIn(64)) scan = bits(1 + below(100));
-    scan.resize(scan.size() + padsAfter, static_cast<unsigned char>(below(2)));
+    scan.insert(scan.end(), frame.bits.begin(), frame.bits.end());
+    const std::size_t answer = std::max<std::size_t>(128, recordBits) + 80 + (writes ? 40 : 0);
+    scan.resize(scan.size() + (oneIn(4) ? below(static_cast<unsigned>(answer)) : answer), 1);
+    return damaged(std::move(scan));
+  }
+
+  /// TCKs in Run-Test/Idle.
+  unsigned idleCycles() { return oneIn(2) ? 0 : below(60); }
+
+ private:
+  unsigned codeOf() {
+    constexpr unsigned codes[] = {0x0, 0x2, 0x2, 0x2, 0xA, 0xA, 0x3, 0x3, 0x3, 0xB, 0xB, 0x5, 0x5, 0xD, 0xF};
+    return oneIn(24) ? below(16) : codes[below(15)];
+  }
+
+  // Few tags, so that repeats meet their first attempts; now and then of another host, or 0.
+  unsigned tagFor(unsigned code) {
+    if (oneIn(16)) return oneIn(2) ? below(0x10000) : below(2) << 4;
+    if ((code & 8) == 0 || oneIn(4)) tag_ = 0x1230 + below(4);
+    return tag_;
+  }
+
+  qorsim::Bits damaged(qorsim::Bits scan) {
+    const auto anywhere = [&] { return below(static_cast<unsigned>(scan.size())); };
+    if (oneIn(16)) scan[anywhere()] ^= 1;
+    if (oneIn(32)) scan.erase(scan.begin() + anywhere());
+    if (oneIn(32)) scan.insert(scan.begin() + anywhere(), static_cast<unsigned char>(below(2)));
+    if (oneIn(24)) scan.resize(1 + anywhere());
+    if (oneIn(32)) return bits(1 + below(300));
     return scan;
   }
 
-  /// TCKs in Run-Test/Idle: none, or as many as the protocol asks for, or more.
-  unsigned idleCycles() { return oneIn(4) ? 0 : 8 + (oneIn(4) ? below(20) : 0); }
-
- private:
   std::mt19937 random_;
+  unsigned tag_ = 0x1230;
 };
 
 /// Where a scan rests, or 0 for nowhere.

@@ -10,6 +10,7 @@ module qor_bench_top #(
     parameter ASYNC_OUT = 8,
     parameter SYNC_OUT = 8,
     parameter EDGE_CAPTURE = 0,
+    parameter GATED = 0,  // the core's TCK runs in Capture-DR and Shift-DR of its own user chain only
     parameter MAJOR = 10,
     parameter MINOR = 0
 ) (
@@ -37,11 +38,15 @@ module qor_bench_top #(
       .user_tdo({3'b000, hub_tdo}), .run_test_idle(run_test_idle)
   );
 
+  reg  enable = 1'b0;
+  wire hub_tck = tck & (GATED == 0 | enable);
+  always @(negedge tck) enable <= user_sel[0] & (capture | shift);
+
   qor_vio #(
       .ASYNC_IN(ASYNC_IN), .SYNC_IN(SYNC_IN), .ASYNC_OUT(ASYNC_OUT), .SYNC_OUT(SYNC_OUT),
       .EDGE_CAPTURE(EDGE_CAPTURE), .MAJOR(MAJOR), .MINOR(MINOR)
   ) vio (
-      .tck(tck), .sel(user_sel[0]), .capture(capture), .shift(shift), .tdi(tdi), .tdo(hub_tdo),
+      .tck(hub_tck), .sel(user_sel[0]), .capture(capture), .shift(shift), .tdi(tdi), .tdo(hub_tdo),
       .clk(clk), .async_in(async_in), .sync_in(sync_in), .async_out(async_out), .sync_out(sync_out)
   );
 
