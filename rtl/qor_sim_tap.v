@@ -16,8 +16,7 @@ module qor_sim_tap #(
     output wire [3:0] user_sel,       // bit n-1: USERn is selected
     output wire       capture,        // levels, for all user chains alike
     output wire       shift,
-    input  wire [3:0] user_tdo,       // 0 of a chain that is not there
-    output wire       run_test_idle   // that state: with TMS low, the next TCK stays in it
+    input  wire [3:0] user_tdo        // 0 of a chain that is not there
 );
 
   localparam [3:0] TEST_LOGIC_RESET = 0, RUN_TEST_IDLE = 1,
@@ -52,7 +51,6 @@ module qor_sim_tap #(
 
   assign capture = state == CAPTURE_DR;
   assign shift = state == SHIFT_DR;
-  assign run_test_idle = state == RUN_TEST_IDLE;
 
   reg [IR_LENGTH-1:0] shifted_ir = CAPTURED_IR;
   reg [IR_LENGTH-1:0] instruction = AT_RESET;

@@ -8,6 +8,17 @@
 
 namespace qorrtl {
 
+struct RandomScan {
+  qorsim::Bits bits;
+  std::size_t headerEnd, frameEnd;  // bits, if nothing is wrong with it
+
+  /// Whether one of them ended in the last TCKs, or may end in the next ones.
+  bool endsBefore(std::size_t bit) const {
+    const auto near = [bit](std::size_t end) { return bit + 4 >= end && bit < end + 20; };
+    return near(headerEnd) || near(frameEnd);
+  }
+};
+
 class RandomScans {
  public:
   explicit RandomScans(unsigned seed) : random_(seed) {}
@@ -23,7 +34,7 @@ class RandomScans {
 
   /// A DR scan: constant bits, a frame for core 0 or 1 or for none, with a payload of `payloadBits` if it is a write,
   /// and room for the answer to it or to a read of `recordBits`; now and then something is wrong with it.
-  qorsim::Bits scan(std::size_t payloadBits, std::size_t recordBits) {
+  RandomScan scan(std::size_t payloadBits, std::size_t recordBits) {
     const unsigned core = oneIn(4) ? below(4) : 0;
     const unsigned code = codeOf();
     const bool writes = (code & 7) == 2;
@@ -32,11 +43,12 @@ class RandomScans {
     const unsigned tag = tagFor(code);
     const Frame frame =
         writes && !oneIn(24) ? writeFrame(code, core, tag, payload) : headerFrame(code, core, tag);
-    qorsim::Bits scan(below(3), static_cast<unsigned char>(below(2)));
-    scan.insert(scan.end(), frame.bits.begin(), frame.bits.end());
-    const std::size_t answer = std::max<std::size_t>(128, recordBits) + 80 + (writes ? 40 : 0);
-    scan.resize(scan.size() + (oneIn(4) ? below(static_cast<unsigned>(answer)) : answer), 1);
-    return damaged(std::move(scan));
+    qorsim::Bits bits(below(3), static_cast<unsigned char>(below(2)));
+    const std::size_t before = bits.size();
+    bits.insert(bits.end(), frame.bits.begin(), frame.bits.end());
+    const std::size_t answer = std::max<std::size_t>(128, recordBits) + 80;
+    bits.resize(bits.size() + (oneIn(4) ? below(static_cast<unsigned>(answer)) : answer), 1);
+    return {damaged(std::move(bits)), before + headerEnd, before + frame.bits.size()};
   }
 
   /// TCKs in Run-Test/Idle.

@@ -18,8 +18,8 @@ void tick(Model& model, Action afterEdge) {
   model.eval();
 }
 
-/// `Model` has the ports tck, tms, tdi, tdo, clk and run_test_idle. Its design clock ticks once for every TCK that
-/// stays in Run-Test/Idle, as that of the simulated board does.
+/// `Model` has the ports tck, tms, tdi, tdo and clk. Its design clock ticks once after every rising edge of TCK, until
+/// it is stopped.
 template <class Model>
 class RtlPins : public qorsim::Pins {
  public:
@@ -33,12 +33,16 @@ class RtlPins : public qorsim::Pins {
   Model& model() { return model_; }
 
   void write(bool tck, bool tms, bool tdi) override {
-    const bool ticks = tck && model_.tck == 0 && model_.run_test_idle != 0 && !tms;
+    const bool rises = tck && model_.tck == 0;
     model_.tms = tms;
     model_.tdi = tdi;
     model_.tck = tck;
     model_.eval();
-    if (!ticks) return;
+    if (rises && ticks_) tickOnce();
+  }
+
+  void stopClock() { ticks_ = false; }
+  void tickOnce() {
     tick(model_, [this] {
       if (!afterEdge_) return;
       afterEdge_(model_);
@@ -60,6 +64,7 @@ class RtlPins : public qorsim::Pins {
  private:
   Model model_;
   std::function<void(Model&)> afterEdge_;
+  bool ticks_ = true;
 };
 
 }  // namespace qorrtl

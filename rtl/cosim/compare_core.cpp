@@ -6,7 +6,7 @@
 #include <deque>
 
 #include "SimDesign.h"
-#include "rtl/cosim/PinsChain.h"
+#include "rtl/cosim/LockStep.h"
 #include "rtl/cosim/RandomScans.h"
 #include "rtl/cosim/RtlPins.h"
 #include "sim/Chain.h"
@@ -20,8 +20,8 @@ using namespace qorsim;
 constexpr unsigned lateness = 2;
 
 // A pulse in the clocks while a snapshot is being taken may be told with an earlier one of the same input, so there are
-// none: snapshots are taken in the first clock after a scan.
-constexpr unsigned clocksOfTake = 4;
+// none: the last snapshot is taken in the first clock after a scan.
+constexpr unsigned clocksOfTake = 4, clocksAfterScan = 24;
 
 // What the pins do in a clock, and what comes out of the synchronous outputs.
 struct Moment {
@@ -42,7 +42,7 @@ void set(Pins& pins, std::uint64_t value) {
 
 class Bench {
  public:
-  Bench() : pins_([this](MODEL&) { ticked(); }), top_(pins_.model()), sim_(1), rtl_(pins_) {
+  Bench() : pins_([this](MODEL&) { ticked(); }), top_(pins_.model()), sim_(1) {
     CoreDescription core;
     core.asyncIn = ASYNC_IN;
     core.syncIn = SYNC_IN;
@@ -54,28 +54,32 @@ class Bench {
     Tap tap(0x0A5F1093, 6);
     tap.hub(1).add(0, std::make_unique<VioCore>(core));
     sim_.add(std::move(tap));
+    both_.clocks(clocksAfterScan);
   }
 
   // False when something differs.
   bool step(bool selects) {
-    Bits expected;
-    if (selects) {
-      appendNumber(expected, random_.oneIn(4) ? random_.below(64) : 2, 6);
-    } else {
-      expected = random_.scan(2 * ASYNC_OUT + 17 * SYNC_OUT, 0);
-    }
-    Bits actual = expected;
-    const std::size_t pauseAt = qorrtl::pausePoint(random_, expected);
-    selects ? sim_.scanIr(expected) : sim_.scanDr(expected);
-    selects ? rtl_.scanIr(actual, pauseAt) : rtl_.scanDr(actual, pauseAt);
-    const unsigned cycles = random_.idleCycles();
-    clocksSinceScan_ = 0;
-    sim_.idle(cycles);
-    rtl_.idle(cycles);
-    return actual == expected && outputsAgree_ && (cycles == 0 || top_.async_out == asyncOut_);
+    mayGlitch_ = false;
+    const bool same = selects ? select() : scan();
+    both_.idle(random_.idleCycles());
+    both_.clocks(clocksOfTake);
+    mayGlitch_ = true;
+    both_.clocks(clocksAfterScan);
+    return same && outputsAgree_ && top_.async_out == asyncOut_;
   }
 
  private:
+  bool select() {
+    Bits ir;
+    appendNumber(ir, random_.oneIn(4) ? random_.below(64) : 2, 6);
+    return both_.scanIr(ir, qorrtl::pausePoint(random_, ir));
+  }
+
+  bool scan() {
+    const qorrtl::RandomScan scan = random_.scan(2 * ASYNC_OUT + 17 * SYNC_OUT, 4 * ASYNC_IN + 6 * SYNC_IN);
+    return both_.scanDr(scan, qorrtl::pausePoint(random_, scan.bits));
+  }
+
   void start(Ports& ports) {
     drive(ports);
     Moment atPowerUp;
@@ -88,8 +92,7 @@ class Bench {
 
   void clock(Ports& ports) {
     if (random_.oneIn(2)) drive(ports);
-    ++clocksSinceScan_;
-    if (EDGE_CAPTURE && clocksSinceScan_ > clocksOfTake) glitch(ports);
+    if (EDGE_CAPTURE && mayGlitch_) glitch(ports);
     asyncOut_ = number(ports.asyncOut);
     late_.push_back({number(ports.asyncIn), number(ports.syncIn), number(ports.asyncInGlitches),
                      number(ports.syncInGlitches), number(ports.syncOut)});
@@ -135,11 +138,11 @@ class Bench {
   std::deque<Moment> late_;
   std::uint64_t asyncOut_ = 0;
   bool outputsAgree_ = true;
-  unsigned clocksSinceScan_ = 0;
+  bool mayGlitch_ = false;
   qorrtl::RtlPins<MODEL> pins_;
   MODEL& top_;
   Chain sim_;
-  qorrtl::PinsChain rtl_;
+  qorrtl::LockStep<MODEL> both_{sim_, pins_};
 };
 
 }  // namespace

@@ -19,7 +19,6 @@ module qor_bench_top #(
     input  wire tdi,
     output wire tdo,
     input  wire clk,
-    output wire run_test_idle,
 
     input  wire [ASYNC_IN == 0 ? 0 : ASYNC_IN-1 : 0]   async_in,
     input  wire [SYNC_IN == 0 ? 0 : SYNC_IN-1 : 0]     sync_in,
@@ -35,7 +34,7 @@ module qor_bench_top #(
       .IDCODE(32'h0A5F1093), .IR_LENGTH(6)
   ) tap (
       .tck(tck), .tms(tms), .tdi(tdi), .tdo(tdo), .user_sel(user_sel), .capture(capture), .shift(shift),
-      .user_tdo({3'b000, hub_tdo}), .run_test_idle(run_test_idle)
+      .user_tdo({3'b000, hub_tdo})
   );
 
   reg  enable = 1'b0;

@@ -6,8 +6,7 @@ module qor_demo_cpld (
     input  wire tms,
     input  wire tdi,
     output wire tdo,
-    input  wire clk,
-    output wire run_test_idle
+    input  wire clk
 );
 
   wire [3:0] user_sel;
@@ -28,7 +27,7 @@ module qor_demo_cpld (
       .IDCODE(32'h1234567B), .IR_LENGTH(8)
   ) tap (
       .tck(tck), .tms(tms), .tdi(tdi), .tdo(tdo), .user_sel(user_sel), .capture(capture), .shift(shift),
-      .user_tdo({3'b000, hub_tdo}), .run_test_idle(run_test_idle)
+      .user_tdo({3'b000, hub_tdo})
   );
 
   qor_vio #(

@@ -6,8 +6,7 @@ module qor_demo_fpga (
     input  wire tms,
     input  wire tdi,
     output wire tdo,
-    input  wire clk,
-    output wire run_test_idle
+    input  wire clk
 );
 
   localparam WIDTH = 8;
@@ -23,7 +22,7 @@ module qor_demo_fpga (
       .IDCODE(32'h0A5F1093), .IR_LENGTH(6)
   ) tap (
       .tck(tck), .tms(tms), .tdi(tdi), .tdo(tdo), .user_sel(user_sel), .capture(capture), .shift(shift),
-      .user_tdo({3'b000, hub_tdo}), .run_test_idle(run_test_idle)
+      .user_tdo({3'b000, hub_tdo})
   );
 
   qor_hub #(

@@ -1,7 +1,4 @@
 // The demo board: a chain of two devices, with the cores and designs of the simulated one.
-//
-// Bench: tick `clk` once for every TCK that stays in Run-Test/Idle, and leave it alone otherwise; then every scan
-// gives the bits of the simulated board.
 `default_nettype none
 
 module qor_demo_top (
@@ -9,19 +6,17 @@ module qor_demo_top (
     input  wire tms,
     input  wire tdi,
     output wire tdo,
-    input  wire clk,
-    output wire run_test_idle
+    input  wire clk
 );
 
   wire between;  // device 1 is nearest to TDI, device 0 to TDO
-  wire unused_run_test_idle;
 
   qor_demo_cpld device1 (
-      .tck(tck), .tms(tms), .tdi(tdi), .tdo(between), .clk(clk), .run_test_idle(unused_run_test_idle)
+      .tck(tck), .tms(tms), .tdi(tdi), .tdo(between), .clk(clk)
   );
 
   qor_demo_fpga device0 (
-      .tck(tck), .tms(tms), .tdi(between), .tdo(tdo), .clk(clk), .run_test_idle(run_test_idle)
+      .tck(tck), .tms(tms), .tdi(between), .tdo(tdo), .clk(clk)
   );
 
 endmodule
