@@ -23,7 +23,7 @@ setup() {
   printf '[[device]]\nidcode = 0x11\n' >empty.toml
   run "$QORVIO" --cable sim:empty.toml --quiet doctor
   [ "$status" -eq 1 ]
-  [ "${lines[0]}" = "FAILED   user registers       no hub signature A behind any user register: all zeros" ]
+  [ "${lines[0]}" = "FAILED   user registers       no debug hub behind any user register: all zeros" ]
   [ "${lines[2]}" = "qorvio: the check failed: user registers" ]
   [ "$("$QORVIO" --cable sim:empty.toml --json doctor 2>&1 | grep -c '"result": "skipped"')" -eq 4 ]
   printf '[[device]]\nidcode = 0x10\n' >even.toml
@@ -31,7 +31,7 @@ setup() {
   [ "${lines[0]}" = "FAILED   idcodes              bit 0 is not 1: 00000010" ]
   printf 'tcks_per_clock = 0\n[[device]]\n[[device.core]]\nuser_chain = 1\nindex = 0\ntype = "vio"\nsync_in = 4\n' >stopped.toml
   run "$QORVIO" --cable sim:stopped.toml --quiet doctor
-  [ "${lines[0]}" = "FAILED   read                 device 0, user chain 1, core 0: design clock stopped" ]
+  [[ ${lines[0]} == "FAILED   read                 device 0, user chain 1, core 0: design clock stopped, "* ]]
 }
 
 @test "play checks a whole table first, then drives it in bursts where it can" {

@@ -5,7 +5,7 @@ load processes
 setup() {
   cd "$BATS_TEST_TMPDIR" || exit 1
   unset QORVIO_SIGNALS
-  export XDG_STATE_HOME=$PWD QORVIO_CORE=0.1.0 QORVIO_CABLE=lossy:6
+  export XDG_STATE_HOME=$PWD QORVIO_CORE=0.1.0 QORVIO_CABLE=lossy:7
 }
 
 remembers() {  # remembers ASYNC KNOWN SYNC KNOWN: what the file holds, which is the only one in its folder
@@ -29,7 +29,7 @@ remembers() {  # remembers ASYNC KNOWN SYNC KNOWN: what the file holds, which is
 }
 
 @test "a command that is killed remembers what it gave before, and at a cable with a long name" {
-  QORVIO_CABLE=lossy:$(printf '%0300d' 6)
+  QORVIO_CABLE=lossy:$(printf '%0300d' 7)
   "$QORVIO_LOSSY" press 'async_out_data[1]' --for 1h 3>&- &
   pid=$!
   catches_interrupt

@@ -42,8 +42,8 @@ std::string idcodes(const std::vector<QorRT::Qor_Device>& devices) {
   return text;
 }
 
-// The first 16 bits that a user register delivers: the head of a hub, if one is there.
-unsigned headBehind(QorRT::Qor_Cable& cable, unsigned device, unsigned userChain) {
+// The first 16 bits that a user register delivers. A hub's are a 1, two TCKs late at most, and zeros.
+unsigned helloBehind(QorRT::Qor_Cable& cable, unsigned device, unsigned userChain) {
   cable.scanIr(device, userChain);
   const std::size_t scan = cable.scanDr(device, Bytes(4, 0xFF), 32, true);
   const Bytes& bits = cable.captured(scan);
@@ -54,14 +54,15 @@ std::string hubs(QorRT::Qor_Cable& cable) {
   std::string found, seen;
   for (unsigned device = 0; device < cable.devices().size(); ++device) {
     for (unsigned chain = 1; chain <= QorRT::Qor_Cable::userChainCount; ++chain) {
-      const unsigned head = headBehind(cable, device, chain);
+      const unsigned hello = helloBehind(cable, device, chain);
       const std::string place = std::to_string(device) + "." + std::to_string(chain);
-      if (head >> 12 == 0xA) found += (found.empty() ? "" : ", ") + place;
-      if (head >> 12 != 0xA && head != 0) seen += ", " + place + " delivers " + hexadecimal(head).substr(4);
+      const bool isHub = hello == 1 || hello == 2 || hello == 4;
+      if (isHub) found += (found.empty() ? "" : ", ") + place;
+      if (!isHub && hello != 0) seen += ", " + place + " delivers " + hexadecimal(hello).substr(4);
     }
   }
   if (found.empty())
-    throw Failure("no hub signature A behind any user register" + (seen.empty() ? ": all zeros" : seen));
+    throw Failure("no debug hub behind any user register" + (seen.empty() ? ": all zeros" : seen));
   return "hubs behind " + found + seen;
 }
 
