@@ -44,6 +44,10 @@ TEST(Session, TellsAnUnknownHandleFromAClosedOne) {
     EXPECT_EQ(thrownBy([=] { QorJtag_session_close(gone); }), thrown);
     EXPECT_EQ(thrownBy([=] { QorJtag_session_setMessageHandler(gone, nullptr); }), thrown);
     EXPECT_EQ(thrownBy([&] { QorJtag_session_getDevices(gone, devices); }), thrown);
+    std::vector<QorJtag_Hub> hubs;
+    QorJtag_Statistics statistics;
+    EXPECT_EQ(thrownBy([&] { QorJtag_session_getHubs(gone, hubs); }), thrown);
+    EXPECT_EQ(thrownBy([&] { QorJtag_session_getStatistics(gone, statistics); }), thrown);
     EXPECT_EQ(thrownBy([=] { QorJtag_target_flush(gone); }), thrown);
     EXPECT_EQ(thrownBy([=] { QorRT::sessionCable(gone); }), thrown);
     EXPECT_EQ(thrownBy([=] { QorRT::onSessionClose(gone, nullptr); }), thrown);
