@@ -112,9 +112,9 @@ Qor_ReadResult Qor_HubAccess::read(std::size_t recordBits, bool keepActivity) {
 Qor_Answer Qor_HubAccess::ask(Qor_Request request, Qor_WaitingRoom& room) {
   Qor_Damage damage;
   Qor_Wait wait;
-  for (bool mayBeDone = false;;) {
+  for (bool mayBeDone = false, isRepeat = false;; isRepeat = true) {
     std::string seen;
-    Qor_Answer answer = exchange(request, room.bits(), seen);
+    Qor_Answer answer = exchange(request, room.bits(), isRepeat, seen);
     const bool isWhole = answer.verdict == Qor_Verdict::good;
     if (isWhole && !answer.isRefused()) {
       room.needed(answer.waited);
@@ -134,12 +134,14 @@ Qor_Answer Qor_HubAccess::ask(Qor_Request request, Qor_WaitingRoom& room) {
   }
 }
 
-/// One attempt; `seen` gets what was wrong with it.
-Qor_Answer Qor_HubAccess::exchange(const Qor_Request& request, std::size_t room, std::string& seen) {
+/// One attempt; `seen` gets what was wrong with it. `selects`: the cable does not rely on the instruction that it
+/// selected before.
+Qor_Answer Qor_HubAccess::exchange(const Qor_Request& request, std::size_t room, bool selects,
+                                   std::string& seen) {
   const Qor_Frame frame(request);
   const std::size_t late = hub().late();
   const std::size_t bitCount = lead_ + late + frame.scanBits(room);
-  const Qor_Bytes bits = run(frame.scan(bitCount), bitCount);
+  const Qor_Bytes bits = run(frame.scan(bitCount), bitCount, selects);
   Qor_Answer answer{Qor_Verdict::noHead};
   if (request.code == Qor_HubCode::status) answer = calibrate(frame, bits, bitCount);
   if (answer.verdict != Qor_Verdict::good) answer = frame.judge({bits, bitCount, lead_ + late});
@@ -163,10 +165,10 @@ Qor_Answer Qor_HubAccess::calibrate(const Qor_Frame& frame, const Qor_Bytes& bit
   return answer;
 }
 
-Qor_Bytes Qor_HubAccess::run(const Qor_Bytes& out, std::size_t bitCount) {
+Qor_Bytes Qor_HubAccess::run(const Qor_Bytes& out, std::size_t bitCount, bool selects) {
   const QueueGuard guard(cable_);
   const auto begin = std::chrono::steady_clock::now();
-  cable_.scanIr(coreRef_.device_index, coreRef_.user_chain_number);
+  cable_.scanIr(coreRef_.device_index, coreRef_.user_chain_number, selects);
   const std::size_t scan = cable_.scanDr(coreRef_.device_index, out, bitCount, true);
   try {
     cable_.flush();

@@ -47,9 +47,9 @@ class Qor_HubAccess {
  private:
   void introduce(std::size_t payloadBits);
   Qor_Answer ask(Qor_Request request, Qor_WaitingRoom& room);
-  Qor_Answer exchange(const Qor_Request& request, std::size_t room, std::string& seen);
+  Qor_Answer exchange(const Qor_Request& request, std::size_t room, bool selects, std::string& seen);
   Qor_Answer calibrate(const Qor_Frame& frame, const Qor_Bytes& bits, std::size_t bitCount);
-  Qor_Bytes run(const Qor_Bytes& out, std::size_t bitCount);
+  Qor_Bytes run(const Qor_Bytes& out, std::size_t bitCount, bool selects);
   QorJtag_Hub hub() const;
   [[noreturn]] void fail(const std::string& text) const;
 
