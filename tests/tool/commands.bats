@@ -64,9 +64,9 @@ CORE   TYPE    VERSION  ASYNC OUT  SYNC OUT  ASYNC IN  SYNC IN
 @test "read shows values in their radix with what moved" {
   run qorvio --core 1.1.0 read async_in_data --radix dec
   [ "${lines[0]}" = "NAME           VALUE  ACTIVITY  SYNC" ]
-  [ "${lines[1]}" = "async_in_data  33     ↕" ]
+  [ "${lines[1]}" = "async_in_data  21     ↕" ]
   run qorvio --core 1.1.0 read 'sync_in_data[0:3]' --radix bin
-  [ "${lines[1]}" = "sync_in_data[0:3]  0b1000  ↕         ↕" ]
+  [ "${lines[1]}" = "sync_in_data[0:3]  0b1010  ↕         ↕" ]
 }
 
 @test "write takes every spelling of a value, and tells it in one exchange" {
@@ -125,7 +125,7 @@ CORE   TYPE    VERSION  ASYNC OUT  SYNC OUT  ASYNC IN  SYNC IN
 
 @test "whole ports, gestures, and settings from environment and file" {
   run qorvio --core 1.1.0 port get async_in
-  [ "${lines[1]}" = "async_in  16     0021   003F  001F" ] || { echo "$output"; false; }
+  [ "${lines[1]}" = "async_in  16     0015   001F  000F" ] || { echo "$output"; false; }
   qorvio port set async_out 5A --mask F0
   qorvio pulse 'sync_out_data[5]' --width 3
   qorvio press 'async_out_data[0]' --for 1ms

@@ -27,14 +27,15 @@ scan() {  # scan PORT COMMAND...: what OpenOCD prints
   [ "$(jq -c . told)" = "{\"host\":\"127.0.0.1\",\"port\":$port,\"board\":\"demo\"}" ]
   run scan "$port" 'irscan fpga.tap 1; echo "fpga [drscan fpga.tap 32 0]"' \
     'irscan cpld.tap 1; echo "cpld [drscan cpld.tap 32 0]"' \
-    'irscan fpga.tap 2; echo "head [drscan fpga.tap 26 0x3C1E001]"'
+    'irscan fpga.tap 2; echo "hello [drscan fpga.tap 32 0]"'
   [ "$status" -eq 0 ]
   [[ $output == *"fpga.tap tap/device found: 0x0a5f1093"* && $output == *"cpld.tap tap/device found: 0x1234567b"* ]]
   [[ $output == *"fpga 0a5f1093"* && $output == *"cpld 1234567b"* && $output != *UNEXPECTED* ]]
-  # The head of the answer tells of the frame before: nothing yet at first, then its code 00.
-  [[ $output == *"head "*a0f0* ]]
-  run scan "$port" 'irscan fpga.tap 2; echo "head [drscan fpga.tap 16 0xFFFF]"'
-  [[ $output == *"head a000"* ]]
+  # A hub says hello with one bit, and nothing more to a scan without a frame.
+  [[ $output == *"hello 00000001"* ]]
+  "$QORVIO" --cable "rbb:127.0.0.1:$port" write async_out_data=5A
+  run "$QORVIO" --cable "rbb:127.0.0.1:$port" read async_in_data
+  [[ ${lines[1]} == "async_in_data  0x5A "* ]]
   kill -INT $pid
   wait $pid
   pid=

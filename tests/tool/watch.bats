@@ -52,7 +52,7 @@ hides() { ! tmux -L "$server" capture-pane -p | grep -qE "$1"; }  # hides REGEX:
   tmux -L "$server" send-keys C-c
   shows 'left with 0'
   run "$QORVIO" --core 1.1.0 watch async_in_data --frames 2 --rate 100 </dev/null
-  [ "${lines[3]}" = "async_in_data  0x0039  ↕               ↕" ]
+  [ "${lines[3]}" = "async_in_data  0x001F  ↕               ↕" ]
 }
 
 @test "lines without room scroll into sight, and a resize redraws all" {
@@ -98,7 +98,7 @@ hides() { ! tmux -L "$server" capture-pane -p | grep -qE "$1"; }  # hides REGEX:
   [ "$status" -eq 1 ]
   [ "${#lines[@]}" -eq 5 ]
   [[ ${lines[0]} == '{"frame":1,"time_s":'* ]]
-  [ "${lines[3]#*'"inputs":'}" = '[{"name":"sync_in_data[3:0]","width":4,"value":"9","shown":"0x9","activity_up":"F","activity_down":"F","sync_activity_up":"F","sync_activity_down":"F","activity_up_since_start":"F","activity_down_since_start":"F","sync_activity_up_since_start":"F","sync_activity_down_since_start":"F"}]}' ]
+  [ "${lines[3]#*'"inputs":'}" = '[{"name":"sync_in_data[3:0]","width":4,"value":"3","shown":"0x3","activity_up":"7","activity_down":"F","sync_activity_up":"7","sync_activity_down":"F","activity_up_since_start":"F","activity_down_since_start":"F","sync_activity_up_since_start":"F","sync_activity_down_since_start":"F"}]}' ]
   [ "${lines[4]}" = "qorvio: device 1, user chain 1, core 0: the link is down" ]
   "$QORVIO" --json watch --rate 100 >told 3>&- &
   pid=$!
