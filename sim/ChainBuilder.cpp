@@ -88,8 +88,7 @@ std::unique_ptr<Chain> ChainBuilder::powerUp() const {
   if (devices_.empty()) throw BoardError("chain", "device", "is missing: a chain has at least one");
   auto chain = std::make_unique<Chain>(tcksPerClock_);
   for (const Device& device : devices_) {
-    Tap tap(device.head.idcode, device.head.irLength,
-            {device.userOpcodes, {device.lateTdi, device.lateTdo}});
+    Tap tap(device.head.idcode, device.head.irLength, {device.userOpcodes, {device.lateTdi, device.lateTdo}});
     for (const PlacedCore& core : device.cores)
       tap.hub(core.userChain).add(core.index, makeCore(core.description));
     chain->add(std::move(tap));

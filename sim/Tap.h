@@ -15,7 +15,8 @@ namespace qorsim {
 
 /// What TAPs differ in beside IDCODE and the length of the IR.
 struct TapOptions {
-  std::vector<std::uint32_t> userOpcodes{2, 3, 4, 5};  ///< of USER1 and so on; those that there are not are left out
+  std::vector<std::uint32_t> userOpcodes{2, 3, 4,
+                                         5};  ///< of USER1 and so on; those that there are not are left out
   Lateness lateness{};
 };
 
