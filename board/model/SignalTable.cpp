@@ -5,6 +5,7 @@
 
 #include "board/model/CoreAddress.h"
 #include "board/model/Errors.h"
+#include "board/model/Spelling.h"
 
 namespace qor {
 namespace {
@@ -27,37 +28,8 @@ bool points(const Signal& signal, Direction direction) {
   return directionOf(signal) == direction;
 }
 
-// How many letters to add, drop or change.
-std::size_t distance(std::string_view a, std::string_view b) {
-  std::vector<std::size_t> row(b.size() + 1);
-  for (std::size_t j = 0; j <= b.size(); ++j) row[j] = j;
-  for (std::size_t i = 1; i <= a.size(); ++i) {
-    std::size_t diagonal = std::exchange(row[0], i);
-    for (std::size_t j = 1; j <= b.size(); ++j) {
-      const std::size_t changed = diagonal + (folded(a[i - 1]) == folded(b[j - 1]) ? 0 : 1);
-      diagonal = std::exchange(row[j], std::min({row[j] + 1, row[j - 1] + 1, changed}));
-    }
-  }
-  return row[b.size()];
-}
-
 const char* wordFor(Direction direction) {
   return direction == Direction::input ? "input" : "output";
-}
-
-// The nearest name, if it is near enough to have been meant.
-const Signal* nearest(const std::vector<Signal>& signals, std::string_view name, Direction direction) {
-  const Signal* best = nullptr;
-  std::size_t least = std::max<std::size_t>(2, name.size() / 3) + 1;
-  for (const Signal& each : signals) {
-    if (!points(each, direction)) continue;
-    const std::size_t far = distance(name, each.name);
-    if (far < least) {
-      least = far;
-      best = &each;
-    }
-  }
-  return best;
 }
 
 bool parseNumber(std::string_view text, unsigned& number) {
@@ -131,8 +103,11 @@ void SignalTable::failUnknown(std::string_view name, Direction direction) const 
   std::string hint;
   if (exact(name, other) != nullptr) {
     hint = std::string(" (it is an ") + wordFor(other) + ")";
-  } else if (const Signal* near = nearest(signals_, name, direction)) {
-    hint = " (did you mean " + near->name + "?)";
+  } else {
+    std::vector<std::string_view> known;
+    for (const Signal& each : signals_)
+      if (points(each, direction)) known.push_back(each.name);
+    hint = didYouMean(name, known);
   }
   throw UnknownSignal(std::string("no ") + wordFor(direction) + " of that name" + hint + ": " +
                       std::string(name));

@@ -1,48 +1,26 @@
 #include "tools/qorvio/Context.h"
 
-#include <cstdlib>
-#include <filesystem>
+#include <cstdio>
 
 #include "board/model/CoreAddress.h"
-#include "board/model/Errors.h"
-#include "board/model/TomlPlace.h"
 #include "board/session/OutputMemory.h"
 
 namespace qor::tool {
-namespace {
 
-void fillFromEnvironment(std::string& value, const char* variable) {
-  const char* const text = std::getenv(variable);
-  if (value.empty() && text != nullptr) value = text;
-}
-
-}  // namespace
-
-void Settings::complete() {
-  fillFromEnvironment(cable, "QORVIO_CABLE");
-  fillFromEnvironment(core, "QORVIO_CORE");
-  fillFromEnvironment(signals, "QORVIO_SIGNALS");
-  const std::string path = "qorvio.toml";
-  if (std::filesystem::exists(path)) {
-    const toml::table parsed = readToml(path);
-    const TomlPlace root(path, parsed, "");
-    root.requireKeys({"cable", "core", "signals"});
-    const auto fill = [&](std::string& value, const char* key) {
-      if (root.has(key) && value.empty()) value = root.at(key).text();
-    };
-    fill(cable, "cable");
-    fill(core, "core");
-    fill(signals, "signals");
+const std::string& Context::cable() {
+  if (settings.cable.empty()) {
+    settings.cable = "sim:";
+    if (!settings.quiet) std::fputs("qorvio: no cable given: the simulated demo board\n", stderr);
   }
-  if (cable.empty()) cable = "sim:";
+  return settings.cable;
 }
 
 Link& Context::link() {
   if (board_) return board_->link();
   if (link_) return *link_;
-  std::unique_ptr<QorRT::Qor_Cable> cable = openCable(settings.cable);
-  if (traffic_ != nullptr) cable = std::make_unique<CountingCable>(std::move(cable), *traffic_);
-  link_ = std::make_unique<Link>(std::move(cable), settings.cable);
+  std::unique_ptr<QorRT::Qor_Cable> opened = openCable(cable());
+  if (traffic_ != nullptr) opened = std::make_unique<CountingCable>(std::move(opened), *traffic_);
+  link_ = std::make_unique<Link>(std::move(opened), cable());
   return *link_;
 }
 

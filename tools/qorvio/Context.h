@@ -7,26 +7,16 @@
 
 #include "board/Board.h"
 #include "board/session/CountingCable.h"
+#include "tools/qorvio/Settings.h"
 
 namespace qor::tool {
-
-/// From the command line, else the environment (QORVIO_CABLE, QORVIO_CORE, QORVIO_SIGNALS), else qorvio.toml in the
-/// working folder.
-struct Settings {
-  std::string cable;
-  std::string core;
-  std::string signals;
-  bool forceCore = false;  ///< --core counts though the signals file is for another one
-  bool json = false;
-  bool quiet = false;
-
-  /// Fills what the command line left empty. Throws WrongUse for a malformed qorvio.toml.
-  void complete();
-};
 
 class Context {
  public:
   Settings settings;
+
+  /// The cable's URL; without one the simulated demo board, and a remark on standard error.
+  const std::string& cable();
 
   /// The session with the board, without setting up a core.
   Link& link();

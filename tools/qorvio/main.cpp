@@ -1,25 +1,45 @@
 #include <cstdio>
 #include <exception>
+#include <iostream>
+#include <iterator>
 
 #include "board/model/Errors.h"
+#include "board/model/Spelling.h"
 #include "os/StandardStreams.h"
-#include "tools/qorvio/commands/Commands.h"
+#include "tools/qorvio/CommandLine.h"
+#include "tools/qorvio/Completion.h"
+#include "tools/qorvio/Manual.h"
+#include "tools/qorvio/terminal/Printable.h"
 
 namespace {
 
 enum ExitStatus { done = 0, deviceFailed = 1, wrongUse = 2 };
 
-constexpr qor::tool::AddCommand commands[] = {
-    qor::tool::addScan,     qor::tool::addInfo,     qor::tool::addSignals, qor::tool::addRead,
-    qor::tool::addWrite,    qor::tool::addGestures, qor::tool::addPort,    qor::tool::addWatch,
-    qor::tool::addRecord,   qor::tool::addPlay,     qor::tool::addDoctor,  qor::tool::addBench,
-    qor::tool::addSimulate,
-};
-
-int complain(const char* what, ExitStatus status) {
+int complain(const std::string& what, int status) {
   std::fflush(stdout);
-  std::fprintf(stderr, "qorvio: %s\n", what);
+  std::fprintf(stderr, "qorvio: %s\n", qor::tool::printable(what).c_str());
   return status;
+}
+
+// What there is at this place of the command line: options, or commands.
+std::vector<std::string> namesKnown(const CLI::App& app, bool areOptions) {
+  std::vector<std::string> names;
+  for (const CLI::App* command : app.get_subcommands([](const CLI::App*) { return true; })) {
+    if (!areOptions) names.push_back(command->get_name());
+    if (areOptions && app.got_subcommand(command)) names = namesKnown(*command, true);
+  }
+  for (const CLI::Option* option : app.get_options())
+    for (const std::string& name : option->get_lnames())
+      if (areOptions) names.push_back("--" + name);
+  return names;
+}
+
+std::string unexpected(const CLI::App& app, const std::string& word) {
+  const bool isOption = word.rfind('-', 0) == 0;
+  if (!isOption && !app.get_subcommands().empty()) return "an argument too many: " + word;
+  const std::vector<std::string> names = namesKnown(app, isOption);
+  return std::string("no such ") + (isOption ? "option" : "command") +
+         qor::didYouMean(word, {names.begin(), names.end()}) + ": " + word;
 }
 
 int runCommand(CLI::App& app, int argc, char** argv) {
@@ -29,9 +49,8 @@ int runCommand(CLI::App& app, int argc, char** argv) {
   } catch (const CLI::Success& asked) {  // help or version
     return app.exit(asked);
   } catch (const CLI::ParseError& error) {
-    if (app.get_subcommands().empty() && !app.remaining().empty())
-      return complain(("no such command: " + app.remaining().front()).c_str(), wrongUse);
-    return complain(error.what(), wrongUse);
+    const std::vector<std::string> rest = app.remaining(true);
+    return complain(rest.empty() ? error.what() : unexpected(app, rest.front()), wrongUse);
   } catch (const qor::WrongUse& error) {
     return complain(error.what(), wrongUse);
   } catch (const std::exception& error) {
@@ -39,29 +58,25 @@ int runCommand(CLI::App& app, int argc, char** argv) {
   }
 }
 
-void addSettings(CLI::App& app, qor::tool::Settings& settings) {
-  app.add_option("--cable", settings.cable,
-                 "the board: sim:, sim:BOARD.toml, rbb:HOST:PORT, openocd:HOST:PORT or openocd:?config=FILE "
-                 "(QORVIO_CABLE)")
-      ->type_name("URL");
-  app.add_option("--core", settings.core, "the core, else the first VIO core (QORVIO_CORE)")
-      ->type_name("DEVICE.CHAIN.INDEX");
-  app.add_option("--signals", settings.signals, "names for its bits (QORVIO_SIGNALS)")->type_name("FILE");
-  app.add_flag("--force-core", settings.forceCore, "use --core though the signals file is for another core");
-  app.add_flag("--json", settings.json, "results as JSON");
-  app.add_flag("--quiet", settings.quiet, "no progress, no remarks");
-  app.parse_complete_callback([&settings] { settings.complete(); });
+// For bash and for the build, not for people: qorvio --complete WORD..., qorvio --man <PAGE.
+bool runHidden(const CLI::App& app, const qor::tool::Settings& settings,
+               const std::vector<std::string>& words) {
+  if (words.empty() || (words[0] != "--complete" && words[0] != "--man")) return false;
+  if (words[0] == "--man") {
+    const std::string page{std::istreambuf_iterator<char>(std::cin), {}};
+    std::printf("%s", qor::tool::manualPage(app, page).c_str());
+  } else {
+    for (const std::string& each : qor::tool::completions(app, settings, {words.begin() + 1, words.end()}))
+      std::printf("%s\n", each.c_str());
+  }
+  return true;
 }
 
 int runTool(int argc, char** argv) {
-  CLI::App app{"Virtual inputs and outputs inside an FPGA, by name.", "qorvio"};
+  CLI::App app;
   qor::tool::Context context;
-  app.require_subcommand(1);
-  app.fallthrough();
-  app.set_version_flag("--version", "qorvio " QORVIO_VERSION);
-  addSettings(app, context.settings);
-  app.footer("Example:\n  qorvio scan\n  qorvio COMMAND --help");
-  for (const qor::tool::AddCommand add : commands) add(app, context);
+  qor::tool::addCommands(app, context);
+  if (runHidden(app, context.settings, {argv + 1, argv + argc})) return done;
   return runCommand(app, argc, argv);
 }
 

@@ -92,7 +92,7 @@ void addBench(CLI::App& app, Context& context) {
   auto polls = std::make_shared<unsigned>(1000);
   CLI::App* command =
       app.add_subcommand("bench", "polls a second, their latency, and what each costs on the wire");
-  command->add_option("--polls", *polls, "how many reads to measure");
+  command->add_option("--polls", *polls, "how many reads to measure")->capture_default_str();
   command->footer("Example:\n  qorvio bench --polls 10000");
   command->callback([&context, polls] { bench(context, *polls); });
 }

@@ -14,7 +14,7 @@ void addInfo(CLI::App& app, Context& context);
 void addSignals(CLI::App& app, Context& context);
 void addRead(CLI::App& app, Context& context);
 void addWrite(CLI::App& app, Context& context);
-void addGestures(CLI::App& app, Context& context);  // pulse, toggle, press
+void addBitCommands(CLI::App& app, Context& context);  // pulse, toggle, press
 void addPort(CLI::App& app, Context& context);
 void addWatch(CLI::App& app, Context& context);
 void addRecord(CLI::App& app, Context& context);

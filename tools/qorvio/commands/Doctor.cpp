@@ -112,8 +112,8 @@ std::vector<Check> checksOf(Context& context, std::unique_ptr<QorRT::Qor_Cable>&
   std::vector<Check> checks{
       {"cable", "is the address right, the server running, the adapter plugged in, the board powered?",
        [&] {
-         cable = openCable(context.settings.cable);
-         return context.settings.cable;
+         cable = openCable(context.cable());
+         return context.cable();
        }},
       {"chain", "is the board powered, and TDO connected?",
        [&] {
@@ -165,8 +165,8 @@ void doctor(Context& context, bool mayWrite) {
     json.push_back(
         {{"step", check.name}, {"result", result}, {"seen", seen}, {"next", isFailure ? check.next : ""}});
     if (context.settings.json || (context.settings.quiet && !isFailure)) continue;
-    const Ink ink = isFailure ? Ink::red : result == "ok" ? Ink::green : Ink::dim;
-    std::printf("%s  %-20s %s\n", inked(ink, result + std::string(7 - result.size(), ' ')).c_str(),
+    const Color ink = isFailure ? Color::red : result == "ok" ? Color::green : Color::dim;
+    std::printf("%s  %-20s %s\n", colored(ink, result + std::string(7 - result.size(), ' ')).c_str(),
                 check.name, seen.c_str());
     if (isFailure) std::printf("         %-20s %s\n", "", check.next);
   }

@@ -47,8 +47,7 @@ void addPlay(CLI::App& app, Context& context) {
   CLI::App* command = app.add_subcommand("play", "drives outputs from a table of values");
   command->add_option("FILE", options->file, "CSV: names of outputs, and below them a row of values each")
       ->required();
-  command->add_option("--rate", options->rate,
-                      "rows a second; as fast as the cable goes when it is not given");
+  command->add_option("--rate", options->rate, "rows per second; without it as fast as the cable allows");
   command->footer(
       "A first column time_s tells when each row is to be sent, in seconds from the start, as record writes "
       "it (a\n"

@@ -86,13 +86,13 @@ void addPort(CLI::App& app, Context& context) {
   command->require_subcommand(1);
   auto name = std::make_shared<std::string>();
   CLI::App* getCommand = command->add_subcommand("get", "values and activity flags of the input ports");
-  getCommand->add_option("PORT", *name, "async_in or sync_in; both when it is not given");
+  getCommand->add_option("PORT", *name, "the port; without a name both")->type_name("async_in|sync_in");
   getCommand->footer("Example:\n  qorvio port get sync_in");
   getCommand->callback([&context, name] { get(context, *name); });
   auto options = std::make_shared<SetOptions>();
   CLI::App* setCommand =
       command->add_subcommand("set", "an output port; with a mask, only the bits that it has set");
-  setCommand->add_option("PORT", options->port, "async_out or sync_out")->required();
+  setCommand->add_option("PORT", options->port, "the port")->type_name("async_out|sync_out")->required();
   setCommand->add_option("VALUE", options->value, "hexadecimal, or with 0x, 0b, 0d")->required();
   setCommand->add_option("--mask", options->mask, "the bits to drive; the others keep what they have");
   setCommand->footer("Example:\n  qorvio port set async_out 5A --mask F0");

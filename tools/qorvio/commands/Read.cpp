@@ -28,7 +28,7 @@ void printTable(const std::vector<Signal>& signals, const std::vector<Sample>& s
     const Activity activity = activityOf(each, sample);
     const char* const both = arrow(activity.up, activity.down);
     const bool moved = activity.up || activity.down;
-    table.add({each.name, shown(each, value, radix), inked(moved ? Ink::green : Ink::dim, both),
+    table.add({each.name, shown(each, value, radix), Cell(both, moved ? Color::green : Color::dim),
                each.port == Port::syncIn ? arrow(activity.syncUp, activity.syncDown) : ""});
   }
   std::printf("%s", table.text().c_str());
@@ -50,8 +50,10 @@ void addRead(CLI::App& app, Context& context) {
   auto options = std::make_shared<ReadOptions>();
   CLI::App* command =
       app.add_subcommand("read", "values of inputs, and what moved since they were read last");
-  command->add_option("NAME", options->names, "inputs; all when none is named. NAME[7:4] is a part of one");
-  command->add_option("--radix", options->radix, "hex, bin, dec or signed, in the place of the file's");
+  command->add_option("INPUT", options->names,
+                      "inputs; without a name all of them. NAME[7:4] is a part of one");
+  command->add_option("--radix", options->radix, "instead of the radix that the signals file gives")
+      ->type_name("hex|bin|dec|signed");
   command->footer("Example:\n  qorvio --core 1.1.0 read --radix dec async_in_data sync_in_data[3:0]");
   command->callback([&context, options] { read(context, *options); });
 }

@@ -91,11 +91,11 @@ void record(Context& context, const RecordOptions& options) {
 void addRecord(CLI::App& app, Context& context) {
   auto options = std::make_shared<RecordOptions>();
   CLI::App* command = app.add_subcommand("record", "samples of inputs, to a file");
-  command->add_option("NAME", options->names, "inputs; all when none is named");
+  command->add_option("INPUT", options->names, "inputs; without a name all of them");
   command->add_option("--samples", options->samples, "how many");
   command->add_option("--for", options->time, "how long, such as 10s");
-  command->add_option("--out", options->out, "a .vcd, .csv or .jsonl file")->required();
-  command->add_option("--rate", options->rate, "polls a second; the cable's full rate when it is not given");
+  command->add_option("--out", options->out, "a .vcd, .csv or .jsonl file")->required()->type_name("FILE");
+  command->add_option("--rate", options->rate, "polls per second; without it as many as the cable allows");
   command->footer(
       "Polls that were missed at the rate are counted in the file. Ctrl-C ends the recording.\n\n"
       "Example:\n  qorvio --core 1.1.0 record async_in_data --for 10s --rate 100 --out counter.vcd");

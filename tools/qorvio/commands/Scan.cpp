@@ -41,7 +41,7 @@ void printJson(const std::vector<QorRT::Qor_Device>& devices, const std::vector<
   std::printf("%s\n", json{{"devices", chain}}.dump(2).c_str());
 }
 
-std::vector<std::string> row(const FoundCore& core) {
+std::vector<Cell> row(const FoundCore& core) {
   const QORVIO_CORE_INFO& info = core.info;
   const auto number = [&](unsigned width) { return core.isVio() ? std::to_string(width) : "-"; };
   return {refText(core.ref),

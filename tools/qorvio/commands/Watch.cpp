@@ -9,6 +9,7 @@
 #include "tools/qorvio/InputJson.h"
 #include "tools/qorvio/InputWatch.h"
 #include "tools/qorvio/commands/Commands.h"
+#include "tools/qorvio/terminal/Printable.h"
 #include "tools/qorvio/terminal/Screen.h"
 #include "tools/qorvio/terminal/WatchTables.h"
 
@@ -55,11 +56,13 @@ class LiveWatch {
   LiveWatch(InputWatch& watch, OutputTable outputs)
       : watch_(watch), inputs_(watch), outputs_(std::move(outputs)) {}
 
-  std::string update(std::size_t rows) {
+  std::string update(os::TerminalSize size) {
     std::vector<std::string> foot = {"", "frame " + std::to_string(watch_.frames()) +
                                              "   j k choose, space toggle, p pulse, c clear, q quit"};
-    if (!status_.empty()) foot.push_back(status_);
-    return screen_.update(rows, {&inputs_.lines(watch_), &between_, &outputs_.lines()}, std::move(foot));
+    if (!status_.empty()) foot.push_back(printable(status_));
+    for (std::string& line : foot) line = shortened(line, size.columns);
+    const auto &inputs = inputs_.lines(watch_, size.columns), &outputs = outputs_.lines(size.columns);
+    return screen_.update(size.rows, {&inputs, &between_, &outputs}, std::move(foot), chosenLine());
   }
 
   void press(os::Key key) {
@@ -80,12 +83,16 @@ class LiveWatch {
   }
 
  private:
+  static constexpr std::ptrdiff_t farAway = 1'000'000;
+
+  std::size_t chosenLine() const { return watch_.inputs().size() + 2 + outputs_.chosenLine(); }
+
   void obey(os::Key key) {
     switch (key) {
       case 'j':
       case 'k':
         key == 'j' ? outputs_.chooseNext() : outputs_.chooseBefore();
-        return screen_.reveal(watch_.inputs().size() + 2 + outputs_.chosenLine());
+        return screen_.reveal(chosenLine());
       case ' ':
         return outputs_.toggleChosen();
       case 'p':
@@ -95,6 +102,9 @@ class LiveWatch {
       case os::keyUp:
       case os::keyDown:
         return screen_.scroll(key == os::keyUp ? -1 : 1);
+      case os::keyHome:
+      case os::keyEnd:
+        return screen_.scroll(key == os::keyHome ? -farAway : farAway);
       case os::keyPageUp:
       case os::keyPageDown:
         return screen_.scrollPages(key == os::keyPageUp ? -1 : 1);
@@ -118,7 +128,7 @@ constexpr int keysAtOnce = 16;
 bool showWithKeys(LiveWatch& live, os::Terminal& terminal, const Frames& frames) {
   do {
     if (terminal.takeResized()) live.redraw();
-    if (!terminal.write(live.update(terminal.size().rows))) return false;
+    if (!terminal.write(live.update(terminal.size()))) return false;
     milliseconds wait = frames.nap();
     for (int i = 0; i < keysAtOnce; ++i, wait = milliseconds(0)) {
       const os::Key key = terminal.key(wait);
@@ -157,10 +167,11 @@ void print(InputWatch& watch, Frames& frames, Text text) {
 }
 
 void printTables(InputWatch& watch, Frames& frames) {
+  constexpr auto unlimited = static_cast<std::size_t>(-1);
   InputTable table(watch);
   print(watch, frames, [&] {
     std::string text;
-    for (const std::string& line : table.lines(watch)) text += line + '\n';
+    for (const std::string& line : table.lines(watch, unlimited)) text += line + '\n';
     return text + '\n';
   });
 }
@@ -199,12 +210,12 @@ void runWatch(Context& context, const WatchOptions& options) {
 void addWatch(CLI::App& app, Context& context) {
   auto options = std::make_shared<WatchOptions>();
   CLI::App* command = app.add_subcommand("watch", "inputs in a live table; keys toggle and pulse outputs");
-  command->add_option("NAME", options->names, "inputs; all when none is named");
-  command->add_option("--rate", options->rate, "frames a second");
-  command->add_option("--frames", options->frames, "how many; without end when it is not given");
+  command->add_option("INPUT", options->names, "inputs; without a name all of them");
+  command->add_option("--rate", options->rate, "frames per second")->capture_default_str();
+  command->add_option("--frames", options->frames, "how many; without a number until it is stopped");
   command->footer(
-      "Keys: j k choose an output bit, space toggles it, p pulses it, c clears, arrows, PgUp and PgDn "
-      "scroll,\n"
+      "Keys: j k choose an output bit, space toggles it, p pulses it, c clears, arrows, PgUp, PgDn, "
+      "Home and End scroll,\n"
       "q quits. Without a terminal the table is printed frame after frame, with --json a line of JSON a "
       "frame.\n\n"
       "Example:\n  qorvio watch --rate 20\n  qorvio --json watch --frames 3 async_in_data");

@@ -10,7 +10,8 @@ namespace qor::tool {
 void addWrite(CLI::App& app, Context& context) {
   auto texts = std::make_shared<std::vector<std::string>>();
   CLI::App* command = app.add_subcommand("write", "values for outputs, all in one exchange");
-  command->add_option("NAME=VALUE", *texts, "digits in the signal's radix, 0x, 0b, 0d, or an enumerated name")
+  command
+      ->add_option("OUTPUT=VALUE", *texts, "digits in the signal's radix, 0x, 0b, 0d, or an enumerated name")
       ->required();
   command->footer(
       "NAME.pulsetrain=V0,V1,... plays up to 16 values, one a clock of the design; the last one stays.\n\n"

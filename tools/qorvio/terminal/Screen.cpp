@@ -27,11 +27,14 @@ std::string notice(std::size_t above, std::size_t below) {
 
 }  // namespace
 
-std::string Screen::update(std::size_t rows, const Parts& body, std::vector<std::string> foot) {
+std::string Screen::update(std::size_t rows, const Parts& body, std::vector<std::string> foot,
+                           std::size_t pinned) {
   const std::size_t count = countOf(body);
-  window_ = count;
-  if (count + foot.size() > rows) window_ = rows > foot.size() + 2 ? rows - foot.size() - 1 : 1;
-  top_ = std::min(top_, count - std::min(count, window_));
+  place(rows, count, foot.size());
+  if (pinned < count && !isInWindow(pinned)) {
+    foot.insert(foot.begin(), linesOf(body, pinned, 1).front());
+    place(rows, count, foot.size());
+  }
   if (window_ < count) foot.push_back(notice(top_, count - top_ - window_));
   std::vector<std::string> lines = linesOf(body, top_, window_);
   lines.insert(lines.end(), foot.begin(), foot.end());
@@ -50,6 +53,13 @@ std::string Screen::update(std::size_t rows, const Parts& body, std::vector<std:
     if (lines[i] != shown_[i]) text += "\033[" + std::to_string(i + 1) + ";1H\033[K" + lines[i];
   shown_ = std::move(lines);
   return text;
+}
+
+// How much of the body is seen, with so many lines below it and one that says what is not.
+void Screen::place(std::size_t rows, std::size_t count, std::size_t feet) {
+  window_ = count;
+  if (count + feet > rows) window_ = rows > feet + 2 ? rows - feet - 1 : 1;
+  top_ = std::min(top_, count - std::min(count, window_));
 }
 
 void Screen::scroll(std::ptrdiff_t lines) {

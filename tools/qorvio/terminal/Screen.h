@@ -13,10 +13,14 @@ using Parts = std::vector<const std::vector<std::string>*>;
 /// A body of any number of lines, seen through a window that can be scrolled, and a foot that is always seen.
 class Screen {
  public:
+  static constexpr std::size_t none = static_cast<std::size_t>(-1);
+
   /// What to write to a terminal with so many rows: the lines that differ from those that stand there, each addressed by
   /// its row, and everything when the number of rows has changed. When the body has more lines than there is room for,
-  /// a last line says how many are not shown.
-  std::string update(std::size_t rows, const Parts& body, std::vector<std::string> foot);
+  /// a last line says how many are not shown. The pinned line of the body is always seen: when it is outside the window, above
+  /// the foot.
+  std::string update(std::size_t rows, const Parts& body, std::vector<std::string> foot,
+                     std::size_t pinned = none);
 
   /// From the next update on the window stands so many lines or windows further down, as far as the body goes.
   /// @{
@@ -34,6 +38,9 @@ class Screen {
   const std::vector<std::string>& shown() const { return shown_; }
 
  private:
+  void place(std::size_t rows, std::size_t count, std::size_t feet);
+  bool isInWindow(std::size_t line) const { return line >= top_ && line - top_ < window_; }
+
   std::vector<std::string> shown_;
   std::size_t rows_ = 0;
   std::size_t top_ = 0;     // the first line in the window

@@ -2,73 +2,88 @@
 
 #include <algorithm>
 #include <cstdlib>
+#include <numeric>
+
 #include "os/StandardStreams.h"
+#include "tools/qorvio/terminal/Printable.h"
 
 namespace qor::tool {
 namespace {
 
-bool isContinuation(char byte) {
-  return (static_cast<unsigned char>(byte) & 0xC0) == 0x80;
-}
+constexpr std::size_t gap = 2, narrowest = 7;
 
-const char* escapeOf(Ink ink) {
-  switch (ink) {
-    case Ink::dim:
+const char* escapeOf(Color color) {
+  switch (color) {
+    case Color::dim:
       return "\033[2m";
-    case Ink::green:
+    case Color::green:
       return "\033[32m";
-    case Ink::red:
+    case Color::red:
       return "\033[31m";
-    case Ink::yellow:
+    case Color::yellow:
       return "\033[33m";
-    case Ink::bold:
+    case Color::bold:
       return "\033[1m";
-    case Ink::plain:
+    case Color::plain:
       break;
   }
   return "";
 }
 
-}  // namespace
-
-std::size_t columns(const std::string& text) {
-  std::size_t count = 0;
-  for (std::size_t i = 0; i < text.size(); ++i) {
-    if (text[i] == '\033') {
-      i = std::min(text.find('m', i), text.size());
-    } else if (!isContinuation(text[i])) {
-      ++count;
-    }
-  }
-  return count;
+std::size_t total(const std::vector<std::size_t>& widths) {
+  return std::accumulate(widths.begin(), widths.end(), gap * (widths.size() - 1));
 }
 
-void Table::add(std::vector<std::string> row) {
+}  // namespace
+
+std::string colored(Color color, const std::string& text) {
+  static const bool isWanted = os::isTerminal(os::Stream::output) && std::getenv("NO_COLOR") == nullptr;
+  return isWanted && color != Color::plain ? escapeOf(color) + text + "\033[0m" : text;
+}
+
+void Table::add(std::vector<Cell> row) {
   rows_.emplace_back();
   lines_.emplace_back();
   set(rows_.size() - 1, std::move(row));
 }
 
-void Table::set(std::size_t index, std::vector<std::string> row) {
+void Table::set(std::size_t index, std::vector<Cell> row) {
   widths_.resize(std::max(widths_.size(), row.size()));
   for (std::size_t i = 0; i < row.size(); ++i) {
-    const std::size_t width = columns(row[i]);
-    hasGrown_ = hasGrown_ || width > widths_[i];
+    row[i].text = printable(row[i].text);
+    const std::size_t width = columnsOf(row[i].text);
+    isRefit_ = isRefit_ || width > widths_[i];
     widths_[i] = std::max(widths_[i], width);
   }
   rows_[index] = std::move(row);
   stale_.push_back(index);
 }
 
-const std::vector<std::string>& Table::lines() {
-  if (hasGrown_) {
+const std::vector<std::string>& Table::lines(std::size_t width) {
+  if (isRefit_ || width != width_) {
+    fit(width);
     for (std::size_t i = 0; i < rows_.size(); ++i) lines_[i] = laidOut(rows_[i]);
   } else {
     for (std::size_t i : stale_) lines_[i] = laidOut(rows_[i]);
   }
   stale_.clear();
-  hasGrown_ = false;
   return lines_;
+}
+
+// Takes from the widest column until all fit, or until none can give more; then from the right whole columns.
+void Table::fit(std::size_t width) {
+  fitted_ = widths_;
+  while (!fitted_.empty() && total(fitted_) > width) {
+    const auto widest = std::max_element(fitted_.begin(), fitted_.end());
+    const std::size_t excess = total(fitted_) - width;
+    if (*widest > narrowest) {
+      *widest = std::max(narrowest, *widest - std::min(excess, *widest));
+    } else {
+      fitted_.pop_back();
+    }
+  }
+  width_ = width;
+  isRefit_ = false;
 }
 
 std::string Table::text() {
@@ -77,19 +92,15 @@ std::string Table::text() {
   return text;
 }
 
-std::string Table::laidOut(const std::vector<std::string>& row) const {
+std::string Table::laidOut(const std::vector<Cell>& row) const {
   std::string line;
-  for (std::size_t i = 0; i < row.size(); ++i) {
-    line += row[i];
-    line.append(widths_[i] - columns(row[i]) + 2, ' ');
+  std::size_t pending = 0;  // blanks, if anything follows
+  for (std::size_t i = 0; i < std::min(row.size(), fitted_.size()); ++i) {
+    const std::string text = shortened(row[i].text, fitted_[i]);
+    if (!text.empty()) line.append(std::exchange(pending, 0), ' ') += colored(row[i].color, text);
+    pending += fitted_[i] - columnsOf(text) + gap;
   }
-  line.erase(line.find_last_not_of(' ') + 1);
   return line;
-}
-
-std::string inked(Ink ink, const std::string& text) {
-  static const bool coloured = os::isTerminal(os::Stream::output) && std::getenv("NO_COLOR") == nullptr;
-  return coloured && ink != Ink::plain ? escapeOf(ink) + text + "\033[0m" : text;
 }
 
 }  // namespace qor::tool

@@ -9,7 +9,7 @@ InputTable::InputTable(const InputWatch& watch)
   for (const Signal& each : watch.inputs()) table_.add({each.name});
 }
 
-const std::vector<std::string>& InputTable::lines(InputWatch& watch) {
+const std::vector<std::string>& InputTable::lines(InputWatch& watch, std::size_t width) {
   Bytes value;
   for (std::size_t i : watch.takeChanged()) {
     const Signal& input = watch.inputs()[i];
@@ -20,7 +20,7 @@ const std::vector<std::string>& InputTable::lines(InputWatch& watch) {
                        input.port == Port::syncIn ? arrow(now.syncUp, now.syncDown) : "",
                        arrow(ever.up, ever.down)});
   }
-  return table_.lines();
+  return table_.lines(width);
 }
 
 OutputTable::OutputTable(Board& board) : board_(board), table_({"  OUTPUT", "LAST GIVEN"}) {

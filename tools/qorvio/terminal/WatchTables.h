@@ -15,7 +15,7 @@ class InputTable {
   explicit InputTable(const InputWatch& watch);
 
   /// Formats the rows of the inputs that changed, which it takes.
-  const std::vector<std::string>& lines(InputWatch& watch);
+  const std::vector<std::string>& lines(InputWatch& watch, std::size_t width);
 
  private:
   Table table_;
@@ -27,7 +27,7 @@ class OutputTable {
   /// The board must outlive it.
   explicit OutputTable(Board& board);
 
-  const std::vector<std::string>& lines() { return table_.lines(); }
+  const std::vector<std::string>& lines(std::size_t width) { return table_.lines(width); }
 
   /// Chooses the next one, or the one before; the first and last ones stay.
   void chooseNext() { choose(chosen_ + 1); }

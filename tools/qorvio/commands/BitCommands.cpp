@@ -43,9 +43,9 @@ void addPulse(CLI::App& app, Context& context) {
   auto options = std::make_shared<PulseOptions>();
   CLI::App* command =
       app.add_subcommand("pulse", "one bit of a synchronous output high for a clock of the design");
-  command->add_option("NAME", options->name, "the output bit")->required();
-  command->add_option("--width", options->width, "clocks that it is high: 1 to 15");
-  command->add_option("--at", options->at, "the step at which it rises: 0 to 14");
+  command->add_option("OUTPUT", options->name, "the output bit")->required();
+  command->add_option("--width", options->width, "clocks that it is high: 1 to 15")->capture_default_str();
+  command->add_option("--at", options->at, "the step at which it rises: 0 to 14")->capture_default_str();
   command->footer("Example:\n  qorvio pulse sync_out_data[5] --width 3");
   command->callback([&context, options] {
     const Signal signal = context.signals().find(options->name, Direction::output);
@@ -61,7 +61,7 @@ void addToggle(CLI::App& app, Context& context) {
   auto options = std::make_shared<Options>();
   CLI::App* command =
       app.add_subcommand("toggle", "one output bit to the opposite of what it was given last");
-  command->add_option("NAME", options->name, "the output bit")->required();
+  command->add_option("OUTPUT", options->name, "the output bit")->required();
   command->add_option("--assume", options->assumed,
                       "what it was given last, where that is not known: 0 or 1");
   command->footer(
@@ -85,8 +85,8 @@ void addPress(CLI::App& app, Context& context) {
   auto options = std::make_shared<PressOptions>();
   CLI::App* command =
       app.add_subcommand("press", "one output bit to 1, and after a while to 0, like a button");
-  command->add_option("NAME", options->name, "the output bit")->required();
-  command->add_option("--for", options->time, "how long, such as 100ms or 2s");
+  command->add_option("OUTPUT", options->name, "the output bit")->required();
+  command->add_option("--for", options->time, "how long, such as 100ms or 2s")->capture_default_str();
   command->footer(
       "Ctrl-C releases it before its time.\n\nExample:\n  qorvio press async_out_data[0] --for 1s");
   command->callback([&context, options] { press(context, *options); });
@@ -94,7 +94,7 @@ void addPress(CLI::App& app, Context& context) {
 
 }  // namespace
 
-void addGestures(CLI::App& app, Context& context) {
+void addBitCommands(CLI::App& app, Context& context) {
   addPulse(app, context);
   addToggle(app, context);
   addPress(app, context);
