@@ -4,7 +4,8 @@ export BATS_TEST_TIMEOUT=60
 
 setup() {
   cd "$BATS_TEST_TMPDIR" || exit 1
-  unset QORVIO_CABLE QORVIO_CORE QORVIO_SIGNALS
+  unset QORVIO_CORE QORVIO_SIGNALS
+  export QORVIO_CABLE=sim:
   export XDG_STATE_HOME=$PWD
 }
 

@@ -1,8 +1,9 @@
-# Drawings of recordings. Needs QORVIO, the tool, and QORVIO_SOURCES, the sources.
+# Drawings of recordings. Needs QORVIO, the tool.
 
 setup() {
   cd "$BATS_TEST_TMPDIR" || exit 1
-  unset QORVIO_CABLE QORVIO_CORE QORVIO_SIGNALS
+  unset QORVIO_CORE QORVIO_SIGNALS
+  export QORVIO_CABLE=sim:
   cat >small.vcd <<'VCD'
 $timescale 1 us $end
 $scope module top $end
@@ -31,8 +32,6 @@ x!
 VCD
 }
 
-render() { "$QORVIO_SOURCES/scripts/render-vcd" "$@"; }
-
 draws() {  # draws TEXT...: each of them is part of the drawing
   local text
   for text in "$@"; do
@@ -41,39 +40,47 @@ draws() {  # draws TEXT...: each of them is part of the drawing
 }
 
 @test "bits are waves, vectors hexadecimal lanes, and what is unknown or missed is hatched" {
-  render small.vcd out.svg
+  umask 077
+  "$QORVIO" render small.vcd out.svg
+  [ "$(stat -c %a out.svg)" = 600 ]
   # Names of eight letters leave the lanes 90.4 to 944.
   draws '>bit</text>' 'd="M90.4 44H303.8V22H517.2"' '<rect fill="url(#unknown)" x="517.2" y="22" width="426.8"' \
     '>bus&lt;5:0&gt;</text>' '>02</text>' '>2A</text>' '<rect fill="url(#unknown)" x="303.8" y="56" width="213.4"' \
     'x="303.8" y="16" width="213.4" height="68"><title>polls missed</title>' '>200 µs</text>'
   [ "$(grep -c moved out.svg)" -eq 0 ]
-  cp small.vcd width=9.vcd
-  render width=9.vcd again.svg
-  cmp out.svg again.svg
-  render small.vcd out.svg --signals bit_moved,bit --from 0.2ms --to 300us
-  draws '>bit_moved</text>' '>bit</text>' 'd="M97.7 78H520.8V56H944.0"' '>200 µs</text>' '>300 µs</text>'
+  "$QORVIO" render small.vcd out.svg --only bit_moved,bit --from 0.2ms --to 300us
+  draws '>bit_moved</text>' '>bit</text>' 'd="M97.7 78H520.8V56H944"' '>200 µs</text>' '>300 µs</text>'
   [ "$(grep -c bus out.svg)" -eq 0 ]
-}
-
-@test "a recording is drawn under the names that it was given" {
-  "$QORVIO" --quiet --core 1.1.0 record 'async_in_data[3]' sync_in_data --samples 5 --rate 1000 --out counter.vcd
-  render counter.vcd out.svg --signals 'async_in_data[3]'
+  "$QORVIO" --quiet --core 1.1.0 record 'async_in_data[3]' sync_in_data --samples 5 --rate 1000 --out out.vcd
+  "$QORVIO" render out.vcd --only 'async_in_data[3]'
   draws '>async_in_data_3_</text>' 'class="wave"'
 }
 
-@test "what cannot be drawn says why and leaves no file" {
-  while IFS='|' read -r options said; do
-    run render $options
-    echo "$options: exit $status, says: $output"
+@test "what is no dump, or would be drawn without end, is refused with its line" {
+  while IFS='|' read -r edit options said; do
+    sed "$edit" small.vcd >bad.vcd
+    run "$QORVIO" render bad.vcd bad.svg $options
+    echo "$edit $options: exit $status, says: $output"
     [ "$status" -eq 2 ]
-    [ "$output" = "render-vcd: $said" ]
+    [ "$output" = "qorvio: $said" ]
     [ ! -e bad.svg ]
   done <<'CASES'
-small.vcd bad.svg --signals bits|no signal of that name: bits
-small.vcd bad.svg --from 2|not a time such as 250us, 10ms or 1.5s: 2
-small.vcd bad.svg --from 2ms|nothing between these times: 0.002 s to 0.001 s
-none.vcd bad.svg|cannot read the file: none.vcd
-/dev/null bad.svg|not a value change dump: /dev/null
-small.vcd bad.svg --frm 2ms|no such option: --frm
+|--only bits|no signal of that name (did you mean bit?): bits
+|--from 2|not a time such as 100ms, 10s or 2m: 2
+|--from 2ms|nothing to draw between these times: steps 2000 to 1000
+1,$d||not a value change dump: bad.vcd
+s/^b1x/b<script>/||bad.vcd:18: the digits of a value are 0, 1, x and z: <script>
+s/^b1x/r<script>/||bad.vcd:18: not a real number: <script>
+s/^b1x/b1111111/||bad.vcd:18: a value wider than its variable: 1111111
+s/#1000/#9007199254740992/||bad.vcd:24: a time is a number below 2^53: 9007199254740992
+s/#1000/#1e3/||bad.vcd:24: a time is a number below 2^53: 1e3
+s/#1000/#100/||bad.vcd:24: a time before the one above it: #100
+s/wire 6/wire 999999999/||bad.vcd:5: a width is 1 to 1048576 bits: 999999999
+s/^1!/1?/||bad.vcd:17: no variable has this identifier: ?
+s/1 us/1 week/||bad.vcd:1: not a timescale such as 10 ns: 1week
+/^#1000/a $comment||bad.vcd:25: no $end: $comment
 CASES
+  sed 's/ bit / <a\&"\x1b> /' small.vcd >out.vcd
+  "$QORVIO" render out.vcd
+  draws '>&lt;a&amp;&quot;\x1B&gt;</text>'
 }

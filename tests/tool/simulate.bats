@@ -4,7 +4,8 @@ load processes
 
 setup() {
   cd "$BATS_TEST_TMPDIR" || exit 1
-  unset QORVIO_CABLE QORVIO_CORE QORVIO_SIGNALS
+  unset QORVIO_CORE QORVIO_SIGNALS
+  export QORVIO_CABLE=sim:
 }
 
 serve() {  # serve ARGUMENTS: starts the board, and waits until it tells where

@@ -7,7 +7,7 @@ namespace {
 
 constexpr AddCommand commands[] = {
     addScan,  addInfo,   addSignals, addRead,   addWrite, addBitCommands, addPort,
-    addWatch, addRecord, addPlay,    addDoctor, addBench, addSimulate,
+    addWatch, addRecord, addPlay,    addDoctor, addBench, addSimulate,    addRender,
 };
 
 }  // namespace

@@ -22,5 +22,6 @@ void addPlay(CLI::App& app, Context& context);
 void addDoctor(CLI::App& app, Context& context);
 void addBench(CLI::App& app, Context& context);
 void addSimulate(CLI::App& app, Context& context);
+void addRender(CLI::App& app, Context& context);
 
 }  // namespace qor::tool
