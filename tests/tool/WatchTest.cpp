@@ -73,8 +73,9 @@ TEST(Table, LaysOutAgainWhatWasSetOrAllWhenAColumnGrows) {
   EXPECT_THAT(table.lines(), ElementsAre("A  B", "x  1", "y  3"));
   table.set(1, {"long", "1"});
   EXPECT_THAT(table.lines(), ElementsAre("A     B", "long  1", "y     3"));
-  table.set(1, {"x", "1"});
-  EXPECT_THAT(table.lines(), ElementsAre("A     B", "x     1", "y     3"));
+  table.set(1, {"0x00000000010000000000", "日本"});
+  EXPECT_THAT(table.lines(19), ElementsAre("A              B", "0x00…≠0…00000  日本", "y              3"));
+  EXPECT_THAT(table.lines(8), ElementsAre("A", "0…≠0…00", "y"));
 }
 
 // The demo board loops the outputs of its first core back.

@@ -43,7 +43,7 @@ counted() {
   missed=$(tail -n +2 fast.csv | awk -F, '{ sum += $2 } END { print sum }')
   [ "$missed" -gt 0 ]
   samples=$(grep -c 0x fast.csv)
-  [ "$(cat told)" = "{\"samples\": $samples, \"missed\": $missed}" ]
+  [ "$(tr -d ' \n' <told)" = "{\"samples\":$samples,\"missed\":$missed}" ]
   [ $((samples + missed)) -eq 5000000 ]
 }
 
@@ -53,7 +53,9 @@ counted() {
   catches_interrupt
   sleep 0.3
   kill -INT $pid
-  wait $pid
+  status=0
+  wait $pid || status=$?
+  [ "$status" -eq 130 ]
   [[ $(cat told) == "$(grep -c 0x long.csv) samples in long.csv"* ]]
 }
 

@@ -1,8 +1,6 @@
 #include "tools/qorvio/Assignments.h"
 
-#include <cstdio>
-
-#include <nlohmann/json.hpp>
+#include "tools/qorvio/Report.h"
 
 namespace qor::tool {
 
@@ -14,7 +12,7 @@ void printWritten(const Context& context, const std::vector<Assignment>& assignm
     for (const Bytes& step : each.steps) steps.push_back(hexText(step, each.signal.width()));
     json.push_back({{"name", each.signal.name}, {"width", each.signal.width()}, {"steps", steps}});
   }
-  std::printf("%s\n", json.dump(2).c_str());
+  print({{}, json}, true);
 }
 
 }  // namespace qor::tool

@@ -5,12 +5,17 @@
 namespace qor::tool {
 namespace {
 
-constexpr AddCommand commands[] = {
-    addScan,  addInfo,   addSignals, addRead,   addWrite, addBitCommands, addPort,
-    addWatch, addRecord, addPlay,    addDoctor, addBench, addSimulate,    addRender,
+constexpr AddCommand scriptCommands[] = {
+    addScan, addInfo,   addSignals, addRead,   addWrite,  addOutputs, addBitCommands, addPort,
+    addWait, addExpect, addEvents,  addRecord, addRender, addPlay,    addDoctor,      addBench,
 };
+constexpr AddCommand otherCommands[] = {addWatch, addRun, addSimulate};
 
 }  // namespace
+
+void addScriptCommands(CLI::App& app, Context& context) {
+  for (const AddCommand add : scriptCommands) add(app, context);
+}
 
 void addCommands(CLI::App& app, Context& context) {
   app.name("qorvio");
@@ -21,7 +26,8 @@ void addCommands(CLI::App& app, Context& context) {
   context.settings.addOptions(app);
   app.parse_complete_callback([&context] { context.settings.complete(); });
   app.footer("Example:\n  qorvio scan\n  qorvio COMMAND --help");
-  for (const AddCommand add : commands) add(app, context);
+  addScriptCommands(app, context);
+  for (const AddCommand add : otherCommands) add(app, context);
 }
 
 }  // namespace qor::tool

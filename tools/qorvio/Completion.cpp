@@ -5,6 +5,7 @@
 #include <string_view>
 #include <utility>
 
+#include "board/model/SignalFile.h"
 #include "board/model/SignalTable.h"
 
 namespace qor::tool {

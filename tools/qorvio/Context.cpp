@@ -35,6 +35,7 @@ Board& Context::board() {
   if (!settings.core.empty()) options.core = parseRef(settings.core);
   options.forceCore = settings.forceCore;
   options.stateFolder = userStateFolder();
+  options.stop = [this] { return stop_ != nullptr && stop_->asked(); };
   const SignalTable& signals = file();
   link();
   board_ = std::make_unique<Board>(std::move(link_), signals, std::move(options));

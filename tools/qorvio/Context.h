@@ -7,6 +7,7 @@
 
 #include "board/Board.h"
 #include "board/session/CountingCable.h"
+#include "os/Stop.h"
 #include "tools/qorvio/Settings.h"
 
 namespace qor::tool {
@@ -39,11 +40,31 @@ class Context {
   /// The signals file with the whole ports of the cores.
   const SignalTable& signals() { return board().signals(); }
 
+  /// How the program is to end when nothing fails: 0, or 128 and the signal that ended a command before its time.
+  /// @{
+  int exitStatus() const { return exitStatus_; }
+  void endBySignal(int signal) { exitStatus_ = signal == 0 ? 0 : 128 + signal; }
+  /// @}
+
+  /// While it lives, waits of the board end when the stop is asked for.
+  class StopScope {
+   public:
+    StopScope(Context& context, const os::Stop& stop) : context_(context) { context_.stop_ = &stop; }
+    StopScope(const StopScope&) = delete;
+    StopScope& operator=(const StopScope&) = delete;
+    ~StopScope() { context_.stop_ = nullptr; }
+
+   private:
+    Context& context_;
+  };
+
  private:
   Traffic* traffic_ = nullptr;
   std::unique_ptr<Link> link_;
   std::unique_ptr<Board> board_;
   std::optional<SignalTable> file_;
+  const os::Stop* stop_ = nullptr;
+  int exitStatus_ = 0;
 };
 
 }  // namespace qor::tool

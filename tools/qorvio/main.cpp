@@ -42,10 +42,10 @@ std::string unexpected(const CLI::App& app, const std::string& word) {
          qor::didYouMean(word, {names.begin(), names.end()}) + ": " + word;
 }
 
-int runCommand(CLI::App& app, int argc, char** argv) {
+int runCommand(CLI::App& app, const qor::tool::Context& context, int argc, char** argv) {
   try {
     app.parse(argc, argv);
-    return done;
+    return context.exitStatus();
   } catch (const CLI::Success& asked) {  // help or version
     return app.exit(asked);
   } catch (const CLI::ParseError& error) {
@@ -54,7 +54,7 @@ int runCommand(CLI::App& app, int argc, char** argv) {
   } catch (const qor::WrongUse& error) {
     return complain(error.what(), wrongUse);
   } catch (const std::exception& error) {
-    return complain(error.what(), deviceFailed);
+    return complain(error.what(), context.exitStatus() != 0 ? context.exitStatus() : deviceFailed);
   }
 }
 
@@ -77,7 +77,7 @@ int runTool(int argc, char** argv) {
   qor::tool::Context context;
   qor::tool::addCommands(app, context);
   if (runHidden(app, context.settings, {argv + 1, argv + argc})) return done;
-  return runCommand(app, argc, argv);
+  return runCommand(app, context, argc, argv);
 }
 
 }  // namespace

@@ -5,8 +5,11 @@
 
 #include <nlohmann/json.hpp>
 
+#include "board/model/CoreAddress.h"
 #include "board/model/Errors.h"
 #include "board/session/CountingCable.h"
+#include "tools/qorvio/Number.h"
+#include "tools/qorvio/Report.h"
 #include "tools/qorvio/commands/Commands.h"
 #include "tools/qorvio/terminal/Table.h"
 
@@ -51,39 +54,37 @@ std::string decimals(double number, int digits) {
   return text;
 }
 
-void print(const Figures& figures, bool asJson) {
+Report reportOf(const Figures& figures) {
   const auto polls = static_cast<double>(figures.latencies.size());
   const auto each = [&](std::uint64_t count) { return static_cast<double>(count) / polls; };
   const double rate = polls / figures.seconds, median = percentile(figures.latencies, 0.5),
                worst = percentile(figures.latencies, 0.99);
-  if (asJson) {
-    const nlohmann::ordered_json json{{"polls", figures.latencies.size()},
-                                      {"polls_per_second", rate},
-                                      {"median_us", median},
-                                      {"percentile_99_us", worst},
-                                      {"exchanges_per_poll", each(figures.traffic.exchanges)},
-                                      {"scans_per_poll", each(figures.traffic.scans)},
-                                      {"bits_per_poll", each(figures.traffic.bits)},
-                                      {"idle_tcks_per_poll", each(figures.traffic.idle)}};
-    std::printf("%s\n", json.dump(2).c_str());
-    return;
-  }
+  const nlohmann::ordered_json json{{"polls", figures.latencies.size()},
+                                    {"polls_per_second", rate},
+                                    {"median_us", median},
+                                    {"percentile_99_us", worst},
+                                    {"exchanges_per_poll", each(figures.traffic.exchanges)},
+                                    {"scans_per_poll", each(figures.traffic.scans)},
+                                    {"bits_per_poll", each(figures.traffic.bits)},
+                                    {"idle_tcks_per_poll", each(figures.traffic.idle)}};
   Table table({"FIGURE", "VALUE"});
-  table.add({"polls a second", decimals(rate, 0)});
+  table.add({"polls per second", decimals(rate, 0)});
   table.add({"median latency", decimals(median, 1) + " us"});
   table.add({"99th percentile", decimals(worst, 1) + " us"});
-  table.add({"exchanges a poll", decimals(each(figures.traffic.exchanges), 2)});
-  table.add({"scans a poll", decimals(each(figures.traffic.scans), 2)});
-  table.add({"bits on the wire a poll", decimals(each(figures.traffic.bits), 1)});
-  table.add({"idle TCKs a poll", decimals(each(figures.traffic.idle), 1)});
-  std::printf("%s", table.text().c_str());
+  table.add({"exchanges per poll", decimals(each(figures.traffic.exchanges), 2)});
+  table.add({"scans per poll", decimals(each(figures.traffic.scans), 2)});
+  table.add({"bits on the wire per poll", decimals(each(figures.traffic.bits), 1)});
+  table.add({"idle TCKs per poll", decimals(each(figures.traffic.idle), 1)});
+  return {table.text(), json};
 }
 
 void bench(Context& context, unsigned polls) {
-  if (polls == 0) throw WrongUse("nothing to measure: --polls 0");
   Traffic traffic;
   context.countTraffic(traffic);
-  print(measure(context.core(), polls, traffic), context.settings.json);
+  Core& core = context.core();
+  if (core.info().async_input_count == 0 && core.info().sync_input_count == 0)
+    throw WrongUse("this core has no inputs to poll: " + refText(core.ref()));
+  print(reportOf(measure(core, polls, traffic)), context.settings.json);
 }
 
 }  // namespace
@@ -91,8 +92,10 @@ void bench(Context& context, unsigned polls) {
 void addBench(CLI::App& app, Context& context) {
   auto polls = std::make_shared<unsigned>(1000);
   CLI::App* command =
-      app.add_subcommand("bench", "polls a second, their latency, and what each costs on the wire");
-  command->add_option("--polls", *polls, "how many reads to measure")->capture_default_str();
+      app.add_subcommand("bench", "polls per second, their latency, and what each costs on the wire");
+  command->add_option("--polls", *polls, "how many reads to measure")
+      ->capture_default_str()
+      ->check(wholeNumber(1, 1'000'000'000));
   command->footer("Example:\n  qorvio bench --polls 10000");
   command->callback([&context, polls] { bench(context, *polls); });
 }

@@ -1,4 +1,4 @@
-// pulse, toggle, press: what one does to a bit at the bench.
+// pulse, toggle, press: one bit of an output.
 #include <chrono>
 #include <optional>
 
@@ -6,6 +6,7 @@
 #include "board/model/Errors.h"
 #include "os/Stop.h"
 #include "tools/qorvio/Assignments.h"
+#include "tools/qorvio/Number.h"
 #include "tools/qorvio/commands/Commands.h"
 
 namespace qor::tool {
@@ -44,8 +45,12 @@ void addPulse(CLI::App& app, Context& context) {
   CLI::App* command =
       app.add_subcommand("pulse", "one bit of a synchronous output high for a clock of the design");
   command->add_option("OUTPUT", options->name, "the output bit")->required();
-  command->add_option("--width", options->width, "clocks that it is high: 1 to 15")->capture_default_str();
-  command->add_option("--at", options->at, "the step at which it rises: 0 to 14")->capture_default_str();
+  command->add_option("--width", options->width, "clocks that it is high: 1 to 15")
+      ->capture_default_str()
+      ->check(wholeNumber(1, 15));
+  command->add_option("--at", options->at, "the step at which it rises: 0 to 14")
+      ->capture_default_str()
+      ->check(wholeNumber(0, 14));
   command->footer("Example:\n  qorvio pulse sync_out_data[5] --width 3");
   command->callback([&context, options] {
     const Signal signal = context.signals().find(options->name, Direction::output);

@@ -21,6 +21,11 @@ void addRecord(CLI::App& app, Context& context);
 void addPlay(CLI::App& app, Context& context);
 void addDoctor(CLI::App& app, Context& context);
 void addBench(CLI::App& app, Context& context);
+void addWait(CLI::App& app, Context& context);
+void addExpect(CLI::App& app, Context& context);
+void addEvents(CLI::App& app, Context& context);
+void addOutputs(CLI::App& app, Context& context);
+void addRun(CLI::App& app, Context& context);
 void addSimulate(CLI::App& app, Context& context);
 void addRender(CLI::App& app, Context& context);
 

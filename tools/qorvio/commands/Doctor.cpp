@@ -1,14 +1,17 @@
-// Checks from the cable up, each told with what was seen and what to try next.
+// Checks from the cable up, each with what was seen and what to try next.
 #include <algorithm>
 #include <cstdio>
 #include <functional>
+#include <optional>
 
 #include <nlohmann/json.hpp>
 
 #include "board/model/CoreAddress.h"
 #include "board/model/Errors.h"
 #include "os/Stop.h"
+#include "tools/qorvio/Report.h"
 #include "tools/qorvio/commands/Commands.h"
+#include "tools/qorvio/terminal/Printable.h"
 #include "tools/qorvio/terminal/Table.h"
 
 namespace qor::tool {
@@ -24,10 +27,6 @@ std::string hexadecimal(unsigned number) {
   char text[16];
   std::snprintf(text, sizeof text, "%08X", number);
   return text;
-}
-
-std::string counted(std::size_t count, const char* what) {
-  return std::to_string(count) + " " + what + (count == 1 ? "" : "s");
 }
 
 std::string idcodes(const std::vector<QorRT::Qor_Device>& devices) {
@@ -82,8 +81,8 @@ std::string layout(Link& link, const Core& core) {
          " async " + std::to_string(info.sync_input_count) + " sync";
 }
 
-// Writes a pattern and its opposite, and puts back what the outputs were last known to hold.
-std::string loop(Core& core) {
+// Writes a pattern and its opposite, and gives the outputs again what they were last given.
+std::string loop(Core& core, bool isForced) {
   const unsigned width = std::min(core.info().async_output_count, core.info().async_input_count);
   if (width == 0) return "nothing to compare: no asynchronous port in both directions";
   Signal outputs{"async_out_data", Port::asyncOut}, inputs{"async_in_data", Port::asyncIn};
@@ -91,7 +90,10 @@ std::string loop(Core& core) {
     outputs.bits.push_back(bit);
     inputs.bits.push_back(bit);
   }
-  const Bytes before = core.lastGiven(outputs).value_or(Bytes(byteCount(width)));
+  const std::optional<Bytes> known = core.lastGiven(outputs);
+  if (!known && !isForced)
+    throw Failure("what the outputs were last given is not known; --force drives them and leaves zeros");
+  const Bytes before = known.value_or(Bytes(byteCount(width)));
   Sample sample = emptySample(core.info());
   Bytes pattern((width + 7) / 8), value;
   bool follows = true;
@@ -108,7 +110,13 @@ std::string loop(Core& core) {
                  : "the design does not loop its outputs back";
 }
 
-std::vector<Check> checksOf(Context& context, std::unique_ptr<QorRT::Qor_Cable>& cable, bool mayWrite) {
+struct DoctorOptions {
+  bool mayWrite = false;
+  bool isForced = false;
+};
+
+std::vector<Check> checksOf(Context& context, std::unique_ptr<QorRT::Qor_Cable>& cable,
+                            const DoctorOptions& options) {
   std::vector<Check> checks{
       {"cable", "is the address right, the server running, the adapter plugged in, the board powered?",
        [&] {
@@ -122,7 +130,9 @@ std::vector<Check> checksOf(Context& context, std::unique_ptr<QorRT::Qor_Cable>&
        }},
       {"idcodes", "compare with the data sheets; a slower TCK helps on long wires",
        [&] { return idcodes(cable->devices()); }},
-      {"user registers", "is the design with the core loaded, and its hub on a user register?",
+      {"user registers",
+       "is the design with the core loaded, and its hub on a user register? "
+       "Other user registers: cable ...?board=FILE, in it a line user_opcodes = [0x02, 0x03] for the device",
        [&] { return hubs(*cable); }},
       {"cores", "do core indexes collide, or does the hub have none?",
        [&] {
@@ -137,21 +147,23 @@ std::vector<Check> checksOf(Context& context, std::unique_ptr<QorRT::Qor_Cable>&
        [&] {
          Sample sample = emptySample(context.core().info());
          context.core().read(sample);
-         return std::string("inputs delivered, CRC right");
+         const QORVIO_CORE_INFO& info = context.core().info();
+         const unsigned bits = info.async_input_count + info.sync_input_count;
+         return bits == 0 ? "this core has no inputs" : counted(bits, "input") + " delivered, CRC right";
        }},
   };
-  if (mayWrite) {
-    checks.push_back(
-        {"write and read back", "is the clock of the design running?", [&] { return loop(context.core()); }});
+  if (options.mayWrite) {
+    checks.push_back({"write and read back", "is the clock of the design running?",
+                      [&] { return loop(context.core(), options.isForced); }});
   }
   return checks;
 }
 
-void doctor(Context& context, bool mayWrite) {
+void doctor(Context& context, const DoctorOptions& options) {
   std::unique_ptr<QorRT::Qor_Cable> cable;
   nlohmann::ordered_json json = nlohmann::ordered_json::array();
   std::string failed;
-  for (const Check& check : checksOf(context, cable, mayWrite)) {
+  for (const Check& check : checksOf(context, cable, options)) {
     std::string result = "ok", seen;
     try {
       if (failed.empty()) seen = check.run();
@@ -167,24 +179,27 @@ void doctor(Context& context, bool mayWrite) {
     if (context.settings.json || (context.settings.quiet && !isFailure)) continue;
     const Color ink = isFailure ? Color::red : result == "ok" ? Color::green : Color::dim;
     std::printf("%s  %-20s %s\n", colored(ink, result + std::string(7 - result.size(), ' ')).c_str(),
-                check.name, seen.c_str());
+                check.name, printable(seen).c_str());
     if (isFailure) std::printf("         %-20s %s\n", "", check.next);
   }
-  if (context.settings.json) std::printf("%s\n", json.dump(2).c_str());
+  if (context.settings.json) print({{}, json}, true);
   if (!failed.empty()) throw Failure("the check failed: " + failed);
 }
 
 }  // namespace
 
 void addDoctor(CLI::App& app, Context& context) {
-  auto dry = std::make_shared<bool>(false);
+  auto options = std::make_shared<DoctorOptions>();
   CLI::App* command =
       app.add_subcommand("doctor", "checks everything from the cable up, and says what to try");
-  command->add_flag("--no-write", *dry, "leave the outputs alone");
+  command->add_flag("--write", options->mayWrite,
+                    "drive the outputs for a moment, to see whether they are read back");
+  command->add_flag("--force", options->isForced,
+                    "drive them even if it is not known what they were last given");
   command->footer(
-      "Outputs are driven for a moment, and then set to what this tool last gave them.\n\n"
-      "Example:\n  qorvio --cable sim:board.toml doctor --no-write");
-  command->callback([&context, dry] { doctor(context, !*dry); });
+      "Outputs are left alone without --write; with it they get again what this tool last gave them.\n\n"
+      "Example:\n  qorvio --cable sim:board.toml doctor");
+  command->callback([&context, options] { doctor(context, *options); });
 }
 
 }  // namespace qor::tool

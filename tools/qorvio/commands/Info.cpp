@@ -3,20 +3,21 @@
 #include <nlohmann/json.hpp>
 
 #include "board/model/CoreAddress.h"
+#include "tools/qorvio/Report.h"
 #include "tools/qorvio/commands/Commands.h"
 #include "tools/qorvio/terminal/Table.h"
 
 namespace qor::tool {
 namespace {
 
-void print(const QORVIO_CORE_INFO& info, QOR_CORE_REF ref, bool asJson) {
+Report reportOf(const QORVIO_CORE_INFO& info, QOR_CORE_REF ref) {
   nlohmann::ordered_json json{{"core", refText(ref)}};
   Table table({"FIELD", refText(ref)});
   for (const QorRT::QorVIO_CoreField& field : QorRT::QorVIO_coreFields) {
     json[field.name] = info.*field.member;
     table.add({field.name, std::to_string(info.*field.member)});
   }
-  std::printf("%s", asJson ? (json.dump(2) + "\n").c_str() : table.text().c_str());
+  return {table.text(), json};
 }
 
 }  // namespace
@@ -26,7 +27,7 @@ void addInfo(CLI::App& app, Context& context) {
   command->footer("Example:\n  qorvio --core 1.1.0 info");
   command->callback([&context] {
     const QOR_CORE_REF ref = context.coreRef();
-    print(readInfo(context.link(), ref), ref, context.settings.json);
+    print(reportOf(readInfo(context.link(), ref), ref), context.settings.json);
   });
 }
 

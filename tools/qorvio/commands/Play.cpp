@@ -5,7 +5,9 @@
 #include "board/model/Errors.h"
 #include "board/record/Player.h"
 #include "os/Stop.h"
+#include "tools/qorvio/Report.h"
 #include "tools/qorvio/commands/Commands.h"
+#include "tools/qorvio/terminal/Printable.h"
 
 namespace qor::tool {
 namespace {
@@ -17,15 +19,10 @@ struct PlayOptions {
   double rate = 0;
 };
 
-void print(const Played& played, bool isTimed, bool asJson) {
-  if (asJson) {
-    std::printf("{\"rows\": %zu, \"exchanges\": %zu, \"late\": %zu}\n", played.rows, played.exchanges,
-                played.late);
-    return;
-  }
-  std::printf("%zu rows in %zu exchanges", played.rows, played.exchanges);
-  if (isTimed) std::printf(", %zu late", played.late);
-  std::printf("\n");
+Report reportOf(const Played& played, bool isTimed) {
+  std::string text = counted(played.rows, "row") + " in " + counted(played.exchanges, "exchange");
+  if (isTimed) text += ", " + std::to_string(played.late) + " late";
+  return {text + "\n", {{"rows", played.rows}, {"exchanges", played.exchanges}, {"late", played.late}}};
 }
 
 void play(Context& context, const PlayOptions& options) {
@@ -37,7 +34,7 @@ void play(Context& context, const PlayOptions& options) {
   const Played played = qor::play(context.board(), script, period, [&stop] { return stop.asked(); });
   context.board().rememberOutputs();
   if (context.settings.json || !context.settings.quiet)
-    print(played, script.hasTimes() || options.rate != 0, context.settings.json);
+    print(reportOf(played, script.hasTimes() || options.rate != 0), context.settings.json);
 }
 
 }  // namespace

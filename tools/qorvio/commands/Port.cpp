@@ -5,6 +5,7 @@
 
 #include "board/model/Errors.h"
 #include "tools/qorvio/Assignments.h"
+#include "tools/qorvio/Report.h"
 #include "tools/qorvio/commands/Commands.h"
 #include "tools/qorvio/terminal/Table.h"
 
@@ -75,7 +76,7 @@ void get(Context& context, const std::string& name) {
                     {"activity_down", down}});
     if (isSynchronous) json.back().update({{"sync_activity_up", syncUp}, {"sync_activity_down", syncDown}});
   }
-  std::printf("%s", context.settings.json ? (json.dump(2) + "\n").c_str() : table.text().c_str());
+  print({table.text(), json}, context.settings.json);
 }
 
 }  // namespace

@@ -1,6 +1,7 @@
 #include <cstdio>
 
 #include "tools/qorvio/InputJson.h"
+#include "tools/qorvio/Report.h"
 #include "tools/qorvio/commands/Commands.h"
 #include "tools/qorvio/terminal/Arrow.h"
 #include "tools/qorvio/terminal/Table.h"
@@ -13,25 +14,21 @@ struct ReadOptions {
   std::string radix;
 };
 
-void printJson(const std::vector<Signal>& signals, const std::vector<Sample>& samples, const Radix* radix) {
+Report reportOf(const std::vector<Signal>& signals, const std::vector<Sample>& samples, const Radix* radix) {
   nlohmann::ordered_json json = nlohmann::ordered_json::array();
-  for (const Signal& each : signals) json.push_back(jsonOf(each, samples[each.core], radix));
-  std::printf("%s\n", json.dump(2).c_str());
-}
-
-void printTable(const std::vector<Signal>& signals, const std::vector<Sample>& samples, const Radix* radix) {
   Table table({"NAME", "VALUE", "ACTIVITY", "SYNC"});
   Bytes value;
   for (const Signal& each : signals) {
     const Sample& sample = samples[each.core];
     extract(each, sample.values(each.port), value);
     const Activity activity = activityOf(each, sample);
-    const char* const both = arrow(activity.up, activity.down);
     const bool moved = activity.up || activity.down;
-    table.add({each.name, shown(each, value, radix), Cell(both, moved ? Color::green : Color::dim),
+    table.add({each.name, shown(each, value, radix),
+               Cell(arrow(activity.up, activity.down), moved ? Color::green : Color::dim),
                each.port == Port::syncIn ? arrow(activity.syncUp, activity.syncDown) : ""});
+    json.push_back(jsonOf(each, sample, radix));
   }
-  std::printf("%s", table.text().c_str());
+  return {table.text(), json};
 }
 
 void read(Context& context, const ReadOptions& options) {
@@ -40,8 +37,7 @@ void read(Context& context, const ReadOptions& options) {
   const std::vector<Signal> signals = context.signals().select(options.names, Direction::input);
   Subscription inputs(context.board().poller(), signals);
   context.board().poller().poll();
-  (context.settings.json ? printJson : printTable)(signals, inputs.look(),
-                                                   options.radix.empty() ? nullptr : &radix);
+  print(reportOf(signals, inputs.look(), options.radix.empty() ? nullptr : &radix), context.settings.json);
 }
 
 }  // namespace

@@ -6,7 +6,10 @@
 #include "board/record/Recording.h"
 #include "os/StandardStreams.h"
 #include "os/Stop.h"
+#include "tools/qorvio/Number.h"
+#include "tools/qorvio/Report.h"
 #include "tools/qorvio/commands/Commands.h"
+#include "tools/qorvio/terminal/Printable.h"
 
 namespace qor::tool {
 namespace {
@@ -63,27 +66,25 @@ class Progress {
   nanoseconds drawn_{0};
 };
 
-Recorded recordWithProgress(Board& board, const std::vector<Signal>& signals, const std::string& path,
+Recorded recordWithProgress(Context& context, const std::vector<Signal>& signals, const std::string& path,
                             const Limits& limits, bool wanted) {
   Progress progress(wanted, limits);
   const os::Stop stop;
-  return recordTo(
-      path, board.poller(), signals, limits, [&stop] { return stop.asked(); },
-      [&](const Recorded& recorded, nanoseconds now) { progress.show(recorded.samples, now); });
+  const Recorded recorded = recordTo(
+      path, context.board().poller(), signals, limits, [&stop] { return stop.asked(); },
+      [&](const Recorded& soFar, nanoseconds now) { progress.show(soFar.samples, now); });
+  context.endBySignal(stop.signal());
+  return recorded;
 }
 
 void record(Context& context, const RecordOptions& options) {
   const Limits limits = limitsOf(options);
   const std::vector<Signal> signals = context.signals().select(options.names, Direction::input);
+  if (signals.empty()) throw WrongUse("no inputs to record");
   const Settings& settings = context.settings;
-  const Recorded recorded =
-      recordWithProgress(context.board(), signals, options.out, limits, !settings.quiet);
-  if (settings.json) {
-    std::printf("{\"samples\": %llu, \"missed\": %llu}\n", static_cast<unsigned long long>(recorded.samples),
-                static_cast<unsigned long long>(recorded.missed));
-  } else if (!settings.quiet) {
-    std::printf("%s\n", summary(recorded, options.out).c_str());
-  }
+  const Recorded recorded = recordWithProgress(context, signals, options.out, limits, !settings.quiet);
+  const std::string told = settings.quiet ? "" : printable(summary(recorded, options.out)) + "\n";
+  print({told, {{"samples", recorded.samples}, {"missed", recorded.missed}}}, settings.json);
 }
 
 }  // namespace
@@ -92,7 +93,7 @@ void addRecord(CLI::App& app, Context& context) {
   auto options = std::make_shared<RecordOptions>();
   CLI::App* command = app.add_subcommand("record", "samples of inputs, to a file");
   command->add_option("INPUT", options->names, "inputs; without a name all of them");
-  command->add_option("--samples", options->samples, "how many");
+  command->add_option("--samples", options->samples, "how many")->check(wholeNumber(1, 1'000'000'000'000));
   command->add_option("--for", options->time, "how long, such as 10s");
   command->add_option("--out", options->out, "a .vcd, .csv or .jsonl file")->required()->type_name("FILE");
   command->add_option("--rate", options->rate, "polls per second; without it as many as the cable allows");

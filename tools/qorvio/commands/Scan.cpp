@@ -3,17 +3,19 @@
 #include <nlohmann/json.hpp>
 
 #include "board/model/CoreAddress.h"
+#include "tools/qorvio/Report.h"
 #include "tools/qorvio/commands/Commands.h"
 #include "tools/qorvio/terminal/Table.h"
 
 namespace qor::tool {
 namespace {
 
-using nlohmann::json;
+using json = nlohmann::ordered_json;
 
-std::string hexadecimal(unsigned number) {
+std::string idcodeOf(const QorRT::Qor_Device& device) {
+  if (device.idcode == 0) return "none";
   char text[16];
-  std::snprintf(text, sizeof text, "%08X", number);
+  std::snprintf(text, sizeof text, "%08X", device.idcode);
   return text;
 }
 
@@ -26,19 +28,19 @@ json jsonOf(const FoundCore& core) {
   return entry;
 }
 
-void printJson(const std::vector<QorRT::Qor_Device>& devices, const std::vector<FoundCore>& cores) {
+json jsonOf(const std::vector<QorRT::Qor_Device>& devices, const std::vector<FoundCore>& cores) {
   json chain = json::array();
   for (unsigned device = 0; device < devices.size(); ++device) {
     json found = json::array();
     for (const FoundCore& core : cores)
       if (core.ref.device_index == device) found.push_back(jsonOf(core));
     chain.push_back({{"device", device},
-                     {"idcode", devices[device].idcode},
+                     {"idcode", idcodeOf(devices[device])},
                      {"name", devices[device].name},
                      {"ir_length", devices[device].irLength},
                      {"cores", found}});
   }
-  std::printf("%s\n", json{{"devices", chain}}.dump(2).c_str());
+  return {{"devices", chain}};
 }
 
 std::vector<Cell> row(const FoundCore& core) {
@@ -53,17 +55,16 @@ std::vector<Cell> row(const FoundCore& core) {
           number(info.sync_input_count)};
 }
 
-void printTables(const std::vector<QorRT::Qor_Device>& devices, const std::vector<FoundCore>& cores) {
+std::string tablesOf(const std::vector<QorRT::Qor_Device>& devices, const std::vector<FoundCore>& cores) {
   Table chain({"DEVICE", "IDCODE", "NAME", "IR"});
   for (unsigned device = 0; device < devices.size(); ++device) {
-    chain.add({std::to_string(device),
-               devices[device].idcode != 0 ? hexadecimal(devices[device].idcode) : "none",
+    chain.add({std::to_string(device), idcodeOf(devices[device]),
                devices[device].name.empty() ? "-" : devices[device].name,
                std::to_string(devices[device].irLength)});
   }
   Table found({"CORE", "TYPE", "VERSION", "ASYNC OUT", "SYNC OUT", "ASYNC IN", "SYNC IN"});
   for (const FoundCore& core : cores) found.add(row(core));
-  std::printf("%s\n%s", chain.text().c_str(), found.text().c_str());
+  return chain.text() + "\n" + found.text();
 }
 
 }  // namespace
@@ -75,7 +76,7 @@ void addScan(CLI::App& app, Context& context) {
   command->callback([&context] {
     const std::vector<QorRT::Qor_Device> devices = context.link().devices();
     const std::vector<FoundCore> cores = findCores(context.link());
-    (context.settings.json ? printJson : printTables)(devices, cores);
+    print({tablesOf(devices, cores), jsonOf(devices, cores)}, context.settings.json);
   });
 }
 

@@ -4,7 +4,9 @@
 
 #include "board/model/CoreAddress.h"
 #include "board/model/Errors.h"
+#include "tools/qorvio/Report.h"
 #include "tools/qorvio/commands/Commands.h"
+#include "tools/qorvio/terminal/Printable.h"
 #include "tools/qorvio/terminal/Table.h"
 
 namespace qor::tool {
@@ -25,7 +27,7 @@ nlohmann::ordered_json jsonOf(const Signal& signal) {
           {"description", signal.description}};
 }
 
-void list(const std::vector<Signal>& signals, bool asJson) {
+Report listed(const std::vector<Signal>& signals) {
   nlohmann::ordered_json json = nlohmann::ordered_json::array();
   Table table({"NAME", "PORT", "WIDTH", "BITS", "RADIX", "DESCRIPTION"});
   for (const Signal& each : signals) {
@@ -33,7 +35,7 @@ void list(const std::vector<Signal>& signals, bool asJson) {
     table.add({each.name, portName(each.port), std::to_string(each.width()), bitsText(each.bits),
                radixName(each.radix), each.description});
   }
-  std::printf("%s", asJson ? (json.dump(2) + "\n").c_str() : table.text().c_str());
+  return {table.text(), json};
 }
 
 std::string coresOf(Context& context) {
@@ -50,18 +52,14 @@ void check(Context& context) {
     infos.push_back(readInfo(context.link(), context.file().cores()[i]));
   const std::string cores = coresOf(context);
   const std::vector<std::string> wrong = signalsOutsideCore(context.file(), infos);
-  if (context.settings.json) {
-    std::printf(
-        "%s\n",
-        nlohmann::json{{"signals", context.file().fileSignals()}, {"outside", wrong}}.dump(2).c_str());
-  } else {
-    for (const std::string& each : wrong) std::printf("%s\n", each.c_str());
-  }
+  Report report{{}, {{"signals", context.file().fileSignals()}, {"outside", wrong}}};
+  for (const std::string& each : wrong) report.text += printable(each) + "\n";
+  if (wrong.empty() && !context.settings.quiet)
+    report.text = counted(context.file().fileSignals(), "signal") + ", all fit core " + cores + "\n";
+  print(report, context.settings.json);
   if (!wrong.empty())
     throw WrongUse("signals do not fit core " + cores + ": " + std::to_string(wrong.size()) + " of " +
                    std::to_string(context.file().fileSignals()));
-  if (!context.settings.json && !context.settings.quiet)
-    std::printf("%zu signals, all fit core %s\n", context.file().fileSignals(), cores.c_str());
 }
 
 }  // namespace
@@ -73,7 +71,7 @@ void addSignals(CLI::App& app, Context& context) {
   command->require_subcommand(0, 1);
   auto namesOnly = std::make_shared<bool>(false);
   command->add_flag("--names", *namesOnly, "the names alone, one a line");
-  command->add_subcommand("check", "holds the signals file against the core")
+  command->add_subcommand("check", "checks the signals file against the core")
       ->footer("Example:\n  qorvio --signals bench.toml signals check")
       ->callback([&context] { check(context); });
   command->add_subcommand("init", "writes a first signals file for the core")
@@ -84,8 +82,8 @@ void addSignals(CLI::App& app, Context& context) {
   command->callback([&context, command, namesOnly] {
     if (!command->get_subcommands().empty()) return;
     const std::vector<Signal>& signals = context.signals().signals();
-    if (!*namesOnly) return list(signals, context.settings.json);
-    for (const Signal& each : signals) std::printf("%s\n", each.name.c_str());
+    if (!*namesOnly) return print(listed(signals), context.settings.json);
+    for (const Signal& each : signals) std::printf("%s\n", printable(each.name).c_str());
   });
 }
 

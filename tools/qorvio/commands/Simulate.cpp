@@ -7,7 +7,10 @@
 #include "Sim.h"
 #include "board/model/Errors.h"
 #include "os/Stop.h"
+#include "tools/qorvio/Number.h"
+#include "tools/qorvio/Report.h"
 #include "tools/qorvio/commands/Commands.h"
+#include "tools/qorvio/terminal/Printable.h"
 
 namespace qor::tool {
 namespace {
@@ -29,12 +32,12 @@ std::unique_ptr<qorsim::Pins> powerUp(const std::string& board) {
 
 void printPlace(const std::string& board, unsigned port, bool json) {
   if (json) {
-    const nlohmann::ordered_json place{
-        {"host", host}, {"port", port}, {"board", board.empty() ? "demo" : board}};
-    std::printf("%s\n", place.dump().c_str());
+    std::printf(
+        "%s\n",
+        jsonLine({{"host", host}, {"port", port}, {"board", board.empty() ? "demo" : board}}).c_str());
   } else {
     std::printf("serving %s on %s:%u; cable rbb:%s:%u; Ctrl-C ends it\n",
-                board.empty() ? "the demo board" : board.c_str(), host, port, host, port);
+                board.empty() ? "the demo board" : printable(board).c_str(), host, port, host, port);
   }
   std::fflush(stdout);
 }
@@ -44,8 +47,9 @@ void simulate(const Settings& settings, const SimulateOptions& options) {
   qorsim::BitbangServer server(*pins, options.port);
   const os::Stop stop;
   printPlace(options.board, server.port(), settings.json);
-  server.serve([&stop] { return stop.asked(); },
-               [](const std::string& reason) { std::fprintf(stderr, "qorvio: %s\n", reason.c_str()); });
+  server.serve(
+      [&stop] { return stop.asked(); },
+      [](const std::string& reason) { std::fprintf(stderr, "qorvio: %s\n", printable(reason).c_str()); });
 }
 
 }  // namespace
@@ -54,7 +58,8 @@ void addSimulate(CLI::App& app, Context& context) {
   auto options = std::make_shared<SimulateOptions>();
   CLI::App* command = app.add_subcommand("simulate", "a simulated board, kept alive for other programs");
   command->add_option("BOARD", options->board, "a file that describes it; the demo board without one");
-  command->add_option("--port", options->port, "where it listens on this machine; any free port without it");
+  command->add_option("--port", options->port, "where it listens on this machine; any free port without it")
+      ->check(wholeNumber(0, 65535));
   command->footer(
       "It speaks remote_bitbang to one client after another, and stays as each leaves it.\n\n"
       "Example:\n  qorvio simulate --port 9824");

@@ -8,6 +8,8 @@
 #include "os/Terminal.h"
 #include "tools/qorvio/InputJson.h"
 #include "tools/qorvio/InputWatch.h"
+#include "tools/qorvio/Number.h"
+#include "tools/qorvio/Report.h"
 #include "tools/qorvio/commands/Commands.h"
 #include "tools/qorvio/terminal/Printable.h"
 #include "tools/qorvio/terminal/Screen.h"
@@ -184,7 +186,7 @@ void printJson(InputWatch& watch, Frames& frames) {
       const Signal& input = watch.inputs()[i];
       nlohmann::ordered_json entry = jsonOf(input, watch.sample(input));
       addActivity(entry, input, watch.sinceStart(input), "_since_start");
-      entries[i] = entry.dump();
+      entries[i] = jsonLine(entry);
     }
     const auto time = std::chrono::duration_cast<std::chrono::microseconds>(Clock::now() - begin);
     std::string text = "{\"frame\":" + std::to_string(watch.frames()) +
@@ -212,7 +214,8 @@ void addWatch(CLI::App& app, Context& context) {
   CLI::App* command = app.add_subcommand("watch", "inputs in a live table; keys toggle and pulse outputs");
   command->add_option("INPUT", options->names, "inputs; without a name all of them");
   command->add_option("--rate", options->rate, "frames per second")->capture_default_str();
-  command->add_option("--frames", options->frames, "how many; without a number until it is stopped");
+  command->add_option("--frames", options->frames, "how many; without a number until it is stopped")
+      ->check(wholeNumber(1, 1'000'000'000'000));
   command->footer(
       "Keys: j k choose an output bit, space toggles it, p pulses it, c clears, arrows, PgUp, PgDn, "
       "Home and End scroll,\n"

@@ -100,6 +100,10 @@ std::string printable(std::string_view text) {
   return safe;
 }
 
+std::string counted(std::size_t count, const std::string& what) {
+  return std::to_string(count) + " " + what + (count == 1 ? "" : "s");
+}
+
 std::size_t columnsOf(std::string_view text) {
   std::size_t columns = 0;
   for (std::size_t i = 0; i < text.size();) {

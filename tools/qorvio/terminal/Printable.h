@@ -9,6 +9,9 @@ namespace qor::tool {
 /// The text with control characters, and bytes that are not UTF-8, written as \x1B and so on. Line ends and tabs stay.
 std::string printable(std::string_view text);
 
+/// "1 core", "2 cores".
+std::string counted(std::size_t count, const std::string& what);
+
 /// How many columns a terminal gives to printable text: two for a wide character, none for one that combines.
 std::size_t columnsOf(std::string_view text);
 

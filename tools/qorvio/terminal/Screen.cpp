@@ -1,6 +1,7 @@
 #include "tools/qorvio/terminal/Screen.h"
 
 #include <algorithm>
+#include <utility>
 
 namespace qor::tool {
 namespace {
@@ -31,6 +32,7 @@ std::string Screen::update(std::size_t rows, const Parts& body, std::vector<std:
                            std::size_t pinned) {
   const std::size_t count = countOf(body);
   place(rows, count, foot.size());
+  bringIntoWindow(std::exchange(revealed_, none));
   if (pinned < count && !isInWindow(pinned)) {
     foot.insert(foot.begin(), linesOf(body, pinned, 1).front());
     place(rows, count, foot.size());
@@ -62,15 +64,16 @@ void Screen::place(std::size_t rows, std::size_t count, std::size_t feet) {
   top_ = std::min(top_, count - std::min(count, window_));
 }
 
+void Screen::bringIntoWindow(std::size_t line) {
+  if (line == none) return;
+  if (line < top_) top_ = line;
+  if (line >= top_ + window_) top_ = line - window_ + 1;
+}
+
 void Screen::scroll(std::ptrdiff_t lines) {
   const auto up = static_cast<std::size_t>(std::max<std::ptrdiff_t>(0, -lines));
   top_ += static_cast<std::size_t>(std::max<std::ptrdiff_t>(0, lines));
   top_ -= std::min(top_, up);
-}
-
-void Screen::reveal(std::size_t line) {
-  if (line < top_) top_ = line;
-  if (line >= top_ + window_) top_ = line - window_ + 1;
 }
 
 }  // namespace qor::tool

@@ -29,7 +29,7 @@ class Screen {
   /// @}
 
   /// From the next update on the line of the body is in the window.
-  void reveal(std::size_t line);
+  void reveal(std::size_t line) { revealed_ = line; }
 
   /// What stands on the terminal is not known any more: the next update writes everything.
   void forget() { rows_ = 0; }
@@ -39,11 +39,13 @@ class Screen {
 
  private:
   void place(std::size_t rows, std::size_t count, std::size_t feet);
+  void bringIntoWindow(std::size_t line);
   bool isInWindow(std::size_t line) const { return line >= top_ && line - top_ < window_; }
 
   std::vector<std::string> shown_;
   std::size_t rows_ = 0;
-  std::size_t top_ = 0;     // the first line in the window
+  std::size_t top_ = 0;  // the first line in the window
+  std::size_t revealed_ = none;
   std::size_t window_ = 1;  // how many lines of the body are seen
 };
 
