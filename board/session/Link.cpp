@@ -1,5 +1,6 @@
 #include "board/session/Link.h"
 
+#include <stdexcept>
 #include <utility>
 
 #include "QorVIO_Core.h"
@@ -50,6 +51,8 @@ void findBehind(Link& link, unsigned device, unsigned userChain, std::vector<Fou
 std::unique_ptr<QorRT::Qor_Cable> openCable(const std::string& url) {
   try {
     return QorRT::openCable(url.c_str());
+  } catch (const std::logic_error& error) {  // the URL itself
+    throw WrongUse("cannot open the cable " + url + ": " + error.what());
   } catch (const std::exception& error) {
     throw Failure("cannot open the cable " + url + ": " + error.what());
   }

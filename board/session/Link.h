@@ -13,7 +13,7 @@
 
 namespace qor {
 
-/// Throws Failure, "cannot open the cable URL: why".
+/// Throws "cannot open the cable URL: why": WrongUse for a malformed URL, else Failure.
 QORBOARD_API std::unique_ptr<QorRT::Qor_Cable> openCable(const std::string& url);
 
 /// Keeps the session's messages, and throws them as Failure.

@@ -113,6 +113,7 @@ CORE   TYPE    VERSION  ASYNC OUT  SYNC OUT  ASYNC IN  SYNC IN
   fails 2 "a rate is 0.001 to 1000000000 a second: nan" record --samples 1 --rate nan --out never.csv
   fails 2 "a rate is 0.001 to 1000000000 a second: 1e-12" play never.csv --rate 1e-12
   fails 2 "a rate is 0.01 to 1000 a second: 2000" watch --rate 2000
+  fails 2 'cannot open the cable demo: the cable URL "demo" has no colon after its kind' --cable demo scan
   fails 2 "no such command (did you mean read?): raed" raed
   fails 2 "an output is given two values: async_out_data" write async_out_data=1 ASYNC_OUT_DATA=2
   signals_file
