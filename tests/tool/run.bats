@@ -58,8 +58,8 @@ SCRIPT
     [ "$status" -eq 2 ]
     [ "$output" = "qorvio: $said" ]
   done <<'CASES'
-frob|-:1: no such command in a script: frob
-write async_out_data=1FF|-:1: async_out_data has 8 bits, too few for the value: 1FF
+frob|stdin:1: no such command in a script: frob
+write async_out_data=1FF|stdin:1: async_out_data has 8 bits, too few for the value: 1FF
 echo "open|stdin:1: a quote that does not end: "
 CASES
 }

@@ -14,6 +14,8 @@
 namespace qor::tool {
 namespace {
 
+constexpr const char* standardInput = "stdin";
+
 struct RunOptions {
   std::string file;
   bool asTap = false;
@@ -67,7 +69,7 @@ std::vector<Step> stepsIn(std::istream& script, const std::string& name) {
 }
 
 std::vector<Step> readScript(const std::string& file) {
-  if (file == "-") return stepsIn(std::cin, "stdin");
+  if (file == standardInput) return stepsIn(std::cin, file);
   std::ifstream script(file);
   if (!script) throw WrongUse("cannot read the file: " + file);
   return stepsIn(script, file);
@@ -123,12 +125,13 @@ void obeyAt(Context& context, const Step& step, const std::string& file) {
 }
 
 void run(Context& context, const RunOptions& options) {
-  const std::vector<Step> steps = readScript(options.file);
+  const std::string file = options.file == "-" ? standardInput : options.file;
+  const std::vector<Step> steps = readScript(file);
   if (options.asTap) std::printf("1..%zu\n", steps.size());
   for (std::size_t i = 0; i < steps.size(); ++i) {
     const std::string what = std::to_string(i + 1) + " - " + printable(steps[i].text) + "\n";
     try {
-      obeyAt(context, steps[i], options.file);
+      obeyAt(context, steps[i], file);
     } catch (const std::exception& error) {
       if (options.asTap)
         std::printf("not ok %sBail out! %s\n", what.c_str(), printable(error.what()).c_str());
