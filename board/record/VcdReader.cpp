@@ -68,8 +68,10 @@ class VcdReader {
   }
 
   void takeSection(std::string_view keyword) {
+    const std::size_t begin = line_;
     std::vector<std::string_view> words;
     for (std::string_view word = next(); word != "$end"; word = next()) {
+      if (word.empty()) line_ = begin;
       if (word.empty()) fail("no $end", keyword);
       if (words.size() < 8) words.push_back(word);  // of a comment nobody needs more
     }

@@ -49,7 +49,7 @@ draws() {  # draws TEXT...: each of them is part of the drawing
     'x="303.8" y="16" width="213.4" height="68"><title>polls missed</title>' '>200 µs</text>'
   [ "$(grep -c moved out.svg)" -eq 0 ]
   "$QORVIO" render small.vcd out.svg --only bit_moved,bit --from 0.2ms --to 300us
-  draws '>bit_moved</text>' '>bit</text>' 'd="M97.7 78H520.8V56H944"' '>200 µs</text>' '>300 µs</text>'
+  draws '>bit_moved</text>' '>bit</text>' 'd="M97.7 78H520.9V56H944"' '>200 µs</text>' '>300 µs</text>'
   [ "$(grep -c bus out.svg)" -eq 0 ]
   "$QORVIO" --quiet --core 1.1.0 record 'async_in_data[3]' sync_in_data --samples 5 --rate 1000 --out out.vcd
   "$QORVIO" render out.vcd --only 'async_in_data[3]'

@@ -33,18 +33,21 @@ setup() {
 }
 
 @test "a script is one session, and stops at its first failure with its line" {
+  for port in async_out async_in; do
+    printf '[[signal]]\nname = "level"\nport = "%s"\nbits = "7:0"\n' $port
+  done >level.toml
   cat >good.qv <<'SCRIPT'
 # outputs are looped back on this board
-write async_out_data=5A --verify
-expect 'async_in_data == 5A' 'async_in_data moves'
-toggle async_out_data[0]
-outputs async_out_data
+write level=5A --verify
+toggle level[0]
+expect 'level == 5B' 'level[0] rises'
+outputs level
 sleep 1ms
 echo all "is  well"
 SCRIPT
-  run "$QORVIO" run good.qv
+  run "$QORVIO" --signals level.toml run good.qv
   [ "$status" -eq 0 ]
-  [ "${lines[*]}" = "async_out_data[0] = 1 NAME            LAST GIVEN async_out_data  0x5B all is  well" ]
+  [ "${lines[*]}" = "level[0] = 1 NAME   LAST GIVEN level  0x5B all is  well" ]
   printf 'write async_out_data=1\n\nexpect async_in_data==2\necho never\n' >bad.qv
   run "$QORVIO" run bad.qv --tap
   [ "$status" -eq 1 ]
