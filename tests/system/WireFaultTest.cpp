@@ -33,6 +33,7 @@ class FaultyPins : public qorsim::Pins {
   void write(bool tck, bool tms, bool tdi) override {
     if (fault == Fault::die && --countdown <= 0) throw std::runtime_error("the simulation ends here");
     board_->write(tck, tms, tdi);
+    ++writes;
   }
   bool tdo() override {
     while (fault == Fault::withhold) std::this_thread::sleep_for(std::chrono::milliseconds(5));
@@ -46,6 +47,8 @@ class FaultyPins : public qorsim::Pins {
     countdown = steps;
     fault = next;
   }
+
+  std::atomic<unsigned> writes{0};  // two a TCK
 
  private:
   std::unique_ptr<qorsim::Pins> board_ = qorsim::demoBoard().pins();
@@ -429,6 +432,29 @@ TEST(Cables, TakeNoStandardStream) {
       close(kept[each]);
     }
     EXPECT_EQ(taken, "") << url;
+  }
+}
+
+// Only as long as nothing went wrong: the chain has no other way back to the instruction.
+TEST(ChainsOfOurOwn, SelectAnInstructionOnce) {
+  ServedBoard served;
+  setenv("QORVIO_BOARD_PORT", served.port().c_str(), 1);
+  for (const std::string& url :
+       {"rbb:127.0.0.1:" + served.port(),
+        std::string("openocd:?config=" QORVIO_SOURCE_DIR "/rtl/cosim/openocd.cfg")}) {
+    const auto cable = QorRT::openCable(url.c_str());
+    const auto hasIrScan = [&](unsigned device, unsigned userChain, bool always) {
+      served.pins.writes = 0;
+      cable->scanIr(device, userChain, always);
+      cable->scanDr(device, {1}, 8, true);
+      cable->flush();
+      return served.pins.writes > 2 * (9 + 14);  // both devices' bits, and the walks of one scan or two
+    };
+    EXPECT_TRUE(hasIrScan(0, 1, false)) << url;
+    EXPECT_FALSE(hasIrScan(0, 1, false)) << url;
+    EXPECT_TRUE(hasIrScan(0, 1, true)) << url;
+    EXPECT_TRUE(hasIrScan(0, 2, false)) << url;
+    EXPECT_TRUE(hasIrScan(1, 2, false)) << url;
   }
 }
 

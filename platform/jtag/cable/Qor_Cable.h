@@ -35,7 +35,7 @@ struct Qor_Scan {
   Kind kind;                         ///< says which of the other members count
   unsigned device = 0;               ///< ir, dr
   unsigned userChain = 0;            ///< ir: the device selects USERn, all others BYPASS
-  bool always = false;               ///< ir: must not be left out
+  bool always = true;                ///< ir: must not be left out
   unsigned cycles = 0;               ///< idle: TCKs in Run-Test/Idle
   std::vector<unsigned char> out{};  ///< dr: the last bits before Update-DR; ones fill whatever stands before
   std::size_t bitCount = 0;          ///< dr
@@ -61,10 +61,10 @@ class QOR_API Qor_Cable {
   /// What stands on the chain, in device-index order. Valid as long as the cable.
   virtual const std::vector<Qor_Device>& devices() const = 0;
 
-  /// Queues: the device selects its USERn register (n = `userChain`), all others BYPASS. A cable may leave the scan
-  /// out when it knows that they do so already, unless `always` is true, as it is after an answer that was wrong.
-  /// Throws logic_error, queueing nothing, for a device beyond the chain or a user chain that is not 1 to 4.
-  void scanIr(unsigned device, unsigned userChain, bool always = false);
+  /// Queues: the device selects its USERn register (n = `userChain`), all others BYPASS. Unless `always` is true, as
+  /// it must be after an answer that was wrong, a cable whose chain nobody else uses leaves the scan out when they do
+  /// so already. Throws logic_error, queueing nothing, for a device beyond the chain or a user chain that is not 1 to 4.
+  void scanIr(unsigned device, unsigned userChain, bool always = true);
 
   /// Queues a DR scan of `bitCount` bits of that device: `out` holds them (as many bytes as they need, else
   /// logic_error). Returns the number under which captured() gives the bits that come back, if `capture` asks
