@@ -18,7 +18,9 @@ std::unique_ptr<Core> makeCore(const CoreDescription& core) {
 }  // namespace
 
 ChainBuilder& ChainBuilder::device(unsigned idcode) {
-  devices_.push_back({{idcode, "device" + std::to_string(devices_.size()), 6}});
+  Device added;
+  added.head = {idcode, "device" + std::to_string(devices_.size()), 6};
+  devices_.push_back(std::move(added));
   return *this;
 }
 
