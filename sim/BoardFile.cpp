@@ -1,5 +1,7 @@
-#include "platform/jtag/cable/boardfile/BoardFile.h"
+#include <algorithm>
+
 #include "Sim.h"
+#include "platform/jtag/cable/boardfile/BoardFile.h"
 #include "platform/jtag/cable/boardfile/TomlFile.h"
 #include "platform/jtag/cable/boardfile/TomlKeys.h"
 #include "sim/BoardError.h"
@@ -60,11 +62,17 @@ void addCore(const TomlEntry& table, ChainBuilder& board) {
   }
 }
 
+std::vector<unsigned> opcodesOf(const QorRT::UserOpcodes& all) {
+  const auto end = std::find(all.begin(), all.end(), QorRT::noOpcode);
+  return {all.begin(), end};
+}
+
 void addDevice(const QorRT::BoardDevice& device, ChainBuilder& board) {
   board.device(device.idcode.value_or(0));
   if (!device.name.empty()) board.named(device.name);
   try {
     if (device.irLength) board.irLength(*device.irLength);
+    if (device.userOpcodes) board.userOpcodes(opcodesOf(*device.userOpcodes));
   } catch (const BoardError& error) {
     device.table.failAt(error.key(), error.problem());
   }
