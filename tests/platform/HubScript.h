@@ -7,12 +7,6 @@
 
 #include "tests/platform/WireBits.h"
 
-inline Bits crc32Of(const Bits& bits) {
-  std::uint32_t crc = 0xFFFFFFFF;
-  for (const char bit : bits) crc = ((crc & 1) != 0) != (bit == '1') ? crc >> 1 ^ 0xEDB88320 : crc >> 1;
-  return bitsOf(~crc, 32);
-}
-
 /// A frame that stands at the beginning of a scan.
 struct SentFrame {
   explicit SentFrame(const Bits& scan) : header(scan.substr(2, 24)), bits(scan.size()) {

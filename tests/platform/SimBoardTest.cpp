@@ -114,6 +114,7 @@ TEST_F(BoardFiles, errorsSayWhereAndWhat) {
       {"device=[]", ":1: device: must be an array of tables, is an array"},
       {"tcks_per_clock=-1\n[[device]]", ":1: tcks_per_clock: must be 0 to 4294967295, is -1"},
       {"[[device]]\nidcode=\"1\"", ":2: device[0].idcode: must be a whole number, is \"1\""},
+      {"[[device]]\nuser_opcodes=[62, 63]", ":2: device[0].user_opcodes: must be 0 to 62, is 63"},
       {"[[device]]\nname=1", ":2: device[0].name: must be a text, is 1"},
       {"colour=6\n[[device]]", ":1: colour: is no key of a board file"},
       {core, ":2: device[0].core[0].type: is missing"},

@@ -20,12 +20,6 @@ class SimHost {
     return text;
   }
 
-  static Bits crcOf(const Bits& bits) {
-    unsigned crc = 0xFFFFFFFF;
-    for (const char bit : bits) crc = crc >> 1 ^ (((crc & 1) != 0) != (bit == '1') ? 0xEDB88320 : 0);
-    return bitsOf(~crc, 32);
-  }
-
   /// One DR scan; returns the bits that came back.
   Bits scan(const Bits& out) {
     const std::size_t number = cable_.scanDr(device_, bytesOf(out), out.size(), true);
@@ -37,14 +31,14 @@ class SimHost {
   }
 
   static Bits frame(const Bits& header, const Bits& payload = "") {
-    return "10" + header + crcOf(header) + (payload.empty() ? "" : payload + crcOf(header + payload));
+    return "10" + header + crc32Of(header) + (payload.empty() ? "" : payload + crc32Of(header + payload));
   }
 
-  /// Sends a frame with room for `count` digits and `room` waiting bits; fewer than none cut the scan short. Returns "HEAD DIGITS", the head in hexadecimal; "HEAD waits"; "silent"; or "damaged".
-  std::string send(unsigned code, unsigned tag, std::size_t count = 0, const std::string& digits = "",
-                   int room = 8) {
+  /// Sends a frame with room for `count` digits and 8 waiting bits. Returns "HEAD DIGITS", the head in hexadecimal;
+  /// "HEAD waits"; "silent"; or "damaged".
+  std::string send(unsigned code, unsigned tag, std::size_t count = 0, const std::string& digits = "") {
     const Bits head = header(code, tag), payload = reversed(digits), out = frame(head, payload);
-    const Bits in = scan(out + Bits(late_ + 42 + count + static_cast<std::size_t>(room), '1'));
+    const Bits in = scan(out + Bits(late_ + 50 + count, '1'));
     const std::size_t signature = in.find('1', 1);
     if (in[0] != '1' || signature == Bits::npos) return "silent";
     const bool isTaken = signature > late_ + out.size();
@@ -57,7 +51,7 @@ class SimHost {
     const std::size_t one = in.find('1', 9);
     if (one == Bits::npos) return hexOf(head) + " waits";
     const Bits data = head[1] == '1' || head[2] == '1' ? "" : in.substr(one + 1, count);
-    const Bits due = data + crcOf(understood + head + data), rest = in.substr(one + 1);
+    const Bits due = data + crc32Of(understood + head + data), rest = in.substr(one + 1);
     if (rest.size() < due.size() || rest != due + Bits(rest.size() - due.size(), '0')) return "damaged";
     return hexOf(head) + (data.empty() ? "" : " " + reversed(data));
   }

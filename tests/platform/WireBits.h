@@ -4,6 +4,7 @@
 
 #include <algorithm>
 #include <cstddef>
+#include <cstdint>
 #include <string>
 #include <vector>
 
@@ -57,4 +58,11 @@ inline Bits noise(std::size_t count, unsigned seed = 1) {
     bits += (state & 1) != 0 ? '1' : '0';
   }
   return bits;
+}
+
+/// CRC-32 of the bits, as it is sent.
+inline Bits crc32Of(const Bits& bits) {
+  std::uint32_t crc = 0xFFFFFFFF;
+  for (const char bit : bits) crc = ((crc & 1) != 0) != (bit == '1') ? crc >> 1 ^ 0xEDB88320 : crc >> 1;
+  return bitsOf(~crc, 32);
 }
