@@ -34,39 +34,44 @@ module qor_core_link #(
   localparam       LONGEST = PAYLOAD_BITS > RECORD_BITS ? PAYLOAD_BITS : RECORD_BITS;
   localparam       PLACE_BITS = LONGEST < 256 ? 8 : $clog2(LONGEST + 1);
 
-  wire       shifting, in_payload, in_data, any_accepted, any_obeyed, any_sent;
+  wire       shifting, answering, streaming, any_accepted, any_obeyed, any_sent;
   wire [3:0] core;
-  assign {tag, core, code, payload_bit, shifting, in_payload, in_data, any_accepted, any_obeyed, any_sent} = to_core;
+  assign {tag, core, code, payload_bit, shifting, answering, streaming, any_accepted, any_obeyed, any_sent} = to_core;
 
   wire meant = core == INDEX[3:0];
   wire is_status = code == CODE_STATUS;
   wire is_read = code[2:0] == 3'd3 | code[2:0] == 3'd5;
+  wire knows = knows_code | is_status | code == CODE_NOTHING;
   assign accepted = any_accepted & meant;
   assign obeyed = any_obeyed & meant;
   assign sent = any_sent & meant;
 
-  // The status word is a table, not registers; the records are delivered from where they are kept.
-  reg  [PLACE_BITS-1:0] place = 0;  // of the bit that is shifted next, in payload or data
+  // The bit of payload or data that is next, and whether there is one, are found out a TCK before they are needed: so
+  // `place` is that of the bit after it, and before the first bit 0 is looked up. The status word is a table, not
+  // registers; the records are delivered from where they are kept.
+  reg  [PLACE_BITS-1:0] place = 1;
+  reg                   more = 1'b0, data = 1'b0;
+  wire [PLACE_BITS-1:0] looked_up = {place[PLACE_BITS-1:1], place[0] & streaming};
   wire                  record_bit;
-  wire more = in_payload ? place != PAYLOAD_BITS[PLACE_BITS-1:0] :
-              is_status ? ~place[7] : is_read & place != RECORD_BITS[PLACE_BITS-1:0];
-  wire data = is_status ? STATUS_WORD[place[6:0]] : record_bit;
-  wire knows = knows_code | is_status | code == CODE_NOTHING;
-  assign payload_shift = shifting & in_payload & meant & more;
+  assign payload_shift = shifting & streaming & ~answering & more;
 
   always @(posedge tck)
-    if (~(in_payload | in_data)) place <= 0;
-    else if (shifting & more) place <= place + 1'b1;
+    if (~streaming | shifting & more) begin
+      place <= streaming ? place + 1'b1 : 1;
+      more <= meant & (~answering ? looked_up != PAYLOAD_BITS[PLACE_BITS-1:0] :
+                       is_status ? ~looked_up[7] : is_read & looked_up != RECORD_BITS[PLACE_BITS-1:0]);
+      data <= meant & (is_status ? STATUS_WORD[looked_up[6:0]] : record_bit);
+    end
 
   generate
     if (RECORD_BITS < 2) begin : at_most_one
       assign record_bit = records[0];
     end else begin : several
-      assign record_bit = records[place[$clog2(RECORD_BITS)-1:0]];
+      assign record_bit = records[looked_up[$clog2(RECORD_BITS)-1:0]];
     end
   endgenerate
 
-  assign from_core = {7{meant}} & {data, more, overlaps, waits, refuses, takes, knows};
+  assign from_core = {data, more, {5{meant}} & {overlaps, waits, refuses, takes, knows}};
 
 endmodule
 

@@ -19,9 +19,10 @@ module qor_hub #(
 
   // SEARCH: for the start of the frame. HEADER and PAYLOAD: with the CRC behind each. WAIT: until the core has done
   // what it was told. DATA: with the CRC behind it. SENT: the last bit is on tdo. SILENT: zeros until Capture-DR.
-  localparam [2:0] SILENT = 0, SEARCH = 1, HEADER = 2, PAYLOAD = 3, HEAD = 4, WAIT = 5, DATA = 6, SENT = 7;
+  localparam [2:0] SEARCH = 0, HEADER = 1, PAYLOAD = 2, SILENT = 3, HEAD = 4, WAIT = 5, DATA = 6, SENT = 7;
 
   reg [2:0] state = SILENT;
+  wire      answering = state[2];
   wire      in_header = state == HEADER, in_payload = state == PAYLOAD, in_head = state == HEAD, in_data = state == DATA;
 
   wire capturing = sel & capture;
@@ -118,7 +119,7 @@ module qor_hub #(
     if (capturing) tdo <= 1'b1;
     else if (shifting) tdo <= in_head & head_bit | state == WAIT & ~waits | in_data & (more ? data : ~crc[0]);
 
-  assign to_cores = {header, tdi, shifting, in_payload, in_data, accepted, obeyed, shifting & state == SENT};
+  assign to_cores = {header, tdi, shifting, answering, in_payload | in_data, accepted, obeyed, shifting & state == SENT};
 
 endmodule
 

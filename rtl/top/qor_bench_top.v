@@ -30,7 +30,7 @@ module qor_bench_top #(
   wire       capture, shift, hub_tdo;
   wire       unused = &{1'b0, user_sel[3:1]};
 
-  qor_sim_tap #(
+  qor_tap #(
       .IDCODE(32'h0A5F1093), .IR_LENGTH(6)
   ) tap (
       .tck(tck), .tms(tms), .tdi(tdi), .tdo(tdo), .user_sel(user_sel), .capture(capture), .shift(shift),

@@ -23,7 +23,7 @@ module qor_demo_cpld (
     later <= late;
   end
 
-  qor_sim_tap #(
+  qor_tap #(
       .IDCODE(32'h1234567B), .IR_LENGTH(8)
   ) tap (
       .tck(tck), .tms(tms), .tdi(tdi), .tdo(tdo), .user_sel(user_sel), .capture(capture), .shift(shift),

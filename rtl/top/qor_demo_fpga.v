@@ -18,7 +18,7 @@ module qor_demo_fpga (
   wire [6:0]       from_core0, from_core1;
   wire [WIDTH-1:0] async_loop, sync_loop;
 
-  qor_sim_tap #(
+  qor_tap #(
       .IDCODE(32'h0A5F1093), .IR_LENGTH(6)
   ) tap (
       .tck(tck), .tms(tms), .tdi(tdi), .tdo(tdo), .user_sel(user_sel), .capture(capture), .shift(shift),

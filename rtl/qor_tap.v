@@ -1,11 +1,11 @@
-// A TAP after IEEE 1149.1 for simulation: IDCODE, BYPASS and four user chains. Powers up in Test-Logic-Reset; there
-// is no TRST.
+// A TAP after IEEE 1149.1, for devices that give a design none and for simulation: IDCODE, BYPASS and four user chains.
+// Powers up in Test-Logic-Reset; there is no TRST.
 //
 // Instructions: 1 is IDCODE, n + 1 is USERn, all others are BYPASS. An IDCODE parameter of 0 makes a device without
 // one, which starts in BYPASS.
 `default_nettype none
 
-module qor_sim_tap #(
+module qor_tap #(
     parameter [31:0] IDCODE = 32'h0,
     parameter        IR_LENGTH = 6  // 4 to 32
 ) (
@@ -13,7 +13,7 @@ module qor_sim_tap #(
     input  wire       tms,
     input  wire       tdi,
     output reg        tdo,            // changes at the falling edge of TCK
-    output wire [3:0] user_sel,       // bit n-1: USERn is selected
+    output reg  [3:0] user_sel,       // bit n-1: USERn is selected
     output wire       capture,        // levels, for all user chains alike
     output wire       shift,
     input  wire [3:0] user_tdo        // 0 of a chain that is not there
@@ -63,33 +63,27 @@ module qor_sim_tap #(
     if (state == TEST_LOGIC_RESET) instruction <= AT_RESET;
     else if (state == UPDATE_IR) instruction <= shifted_ir;
 
-  genvar n;
-  generate
-    for (n = 1; n <= 4; n = n + 1) begin : user
-      localparam [IR_LENGTH-1:0] OPCODE = n + 1;
-      assign user_sel[n-1] = instruction == OPCODE;
-    end
-  endgenerate
+  // In time for Capture-DR, and without the half TCK that the instruction itself leaves.
+  reg     is_idcode = IDCODE != 0, is_user = 1'b0;
+  integer n;
+  initial user_sel = 4'b0;
+  always @(posedge tck) begin
+    for (n = 1; n <= 4; n = n + 1) user_sel[n-1] <= instruction == n[IR_LENGTH-1:0] + 1;
+    is_user <= instruction >= 2 && instruction <= 5;
+    is_idcode <= IDCODE != 0 && instruction == OPCODE_IDCODE;
+  end
 
-  wire       is_idcode = IDCODE != 0 && instruction == OPCODE_IDCODE;
-  reg [31:0] idcode = IDCODE;
-  reg        bypass = 1'b0;
-
+  // IDCODE, or BYPASS in its lowest bit.
+  reg [31:0] shifted_dr = IDCODE;
   always @(posedge tck)
-    if (capture) begin
-      idcode <= IDCODE;
-      bypass <= 1'b0;
-    end else if (shift) begin
-      idcode <= {tdi, idcode[31:1]};
-      bypass <= tdi;
-    end
+    if (capture) shifted_dr <= is_idcode ? IDCODE : 32'b0;
+    else if (shift) shifted_dr <= {tdi, shifted_dr[31:2], is_idcode ? shifted_dr[1] : tdi};
 
   initial tdo = 1'b0;
 
   always @(negedge tck)
     if (state == SHIFT_IR) tdo <= shifted_ir[0];
-    else if (|user_sel) tdo <= |(user_sel & user_tdo);
-    else tdo <= is_idcode ? idcode[0] : bypass;
+    else tdo <= is_user ? |(user_sel & user_tdo) : shifted_dr[0];
 
 endmodule
 
