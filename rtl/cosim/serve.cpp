@@ -7,8 +7,8 @@
 #include <string>
 
 #include "BitbangServer.h"
-#include "Vqor_demo_top.h"
 #include "rtl/cosim/RtlPins.h"
+#include MODEL_HEADER
 
 namespace {
 
@@ -24,7 +24,7 @@ int main(int argc, char** argv) {
   try {
     std::signal(SIGINT, interrupt);
     std::signal(SIGTERM, interrupt);
-    qorrtl::RtlPins<Vqor_demo_top> pins;
+    qorrtl::RtlPins<MODEL> pins;
     qorsim::BitbangServer server(pins, static_cast<std::uint16_t>(argc > 1 ? std::stoul(argv[1]) : 0));
     std::printf("%u\n", unsigned{server.port()});
     std::fflush(stdout);

@@ -1,7 +1,9 @@
 // A device with two cores on user chain 1: a VIO core, whose outputs come back as inputs, and one of another type.
 `default_nettype none
 
-module qor_demo_fpga (
+module qor_demo_fpga #(
+    parameter REGISTER = ""  // a primitive of ../families, modelled in ../cosim; or a TAP on four pins
+) (
     input  wire tck,
     input  wire tms,
     input  wire tdi,
@@ -11,38 +13,70 @@ module qor_demo_fpga (
 
   localparam WIDTH = 8;
 
-  wire [3:0]       user_sel;
-  wire             capture, shift, hub_tdo;
-  wire             unused = &{1'b0, user_sel[3:1]};
+  wire             user_tck, sel, capture, shift, user_tdi, user_tdo;
   wire [30:0]      to_cores;
   wire [6:0]       from_core0, from_core1;
   wire [WIDTH-1:0] async_loop, sync_loop;
 
-  qor_tap #(
-      .IDCODE(32'h0A5F1093), .IR_LENGTH(6)
-  ) tap (
-      .tck(tck), .tms(tms), .tdi(tdi), .tdo(tdo), .user_sel(user_sel), .capture(capture), .shift(shift),
-      .user_tdo({3'b000, hub_tdo})
-  );
+  /* verilator lint_off WIDTH */  // names of different lengths are compared
+  generate
+    if (REGISTER == "JTAGG") begin : jtagg
+      qor_jtagg #(
+          .PRIMITIVE(REGISTER)
+      ) user (
+          .pin_tck(tck), .pin_tms(tms), .pin_tdi(tdi), .pin_tdo(tdo),
+          .tck(user_tck), .sel(sel), .capture(capture), .shift(shift), .tdi(user_tdi), .tdo(user_tdo)
+      );
+    end else if (REGISTER == "EG_PHY_CONFIG") begin : eg_phy_config
+      wire unused;
+      qor_jtagg #(
+          .PRIMITIVE(REGISTER)
+      ) user (
+          .pin_tck(1'b0), .pin_tms(1'b0), .pin_tdi(1'b0), .pin_tdo(unused),
+          .tck(user_tck), .sel(sel), .capture(capture), .shift(shift), .tdi(user_tdi), .tdo(user_tdo)
+      );
+      assign tdo = user.eg_phy_config.register.pin_tdo;
+    end else if (REGISTER == "BSCANE2") begin : bscane2
+      qor_bscan #(
+          .PRIMITIVE(REGISTER)
+      ) user (
+          .tck(user_tck), .sel(sel), .capture(capture), .shift(shift), .tdi(user_tdi), .tdo(user_tdo)
+      );
+      assign tdo = user.bscane2.register.pin_tdo;
+    end else if (REGISTER == "BSCAN_SPARTAN3") begin : bscan_spartan3
+      qor_bscan #(
+          .PRIMITIVE(REGISTER)
+      ) user (
+          .tck(user_tck), .sel(sel), .capture(capture), .shift(shift), .tdi(user_tdi), .tdo(user_tdo)
+      );
+      assign tdo = user.pair.bscan_spartan3.register.pin_tdo;
+    end else begin : four_pins
+      qor_four_pins user (
+          .pin_tck(tck), .pin_tms(tms), .pin_tdi(tdi), .pin_tdo(tdo),
+          .tck(user_tck), .sel(sel), .capture(capture), .shift(shift), .tdi(user_tdi), .tdo(user_tdo)
+      );
+    end
+  endgenerate
+  /* verilator lint_on WIDTH */
 
   qor_hub #(
       .CORES(2)
   ) hub (
-      .tck(tck), .sel(user_sel[0]), .capture(capture), .shift(shift), .tdi(tdi), .tdo(hub_tdo),
+      .tck(user_tck), .sel(sel), .capture(capture), .shift(shift), .tdi(user_tdi), .tdo(user_tdo),
       .to_cores(to_cores), .from_cores({from_core1, from_core0})
   );
 
   qor_vio_core #(
       .INDEX(0), .ASYNC_IN(WIDTH), .SYNC_IN(WIDTH), .ASYNC_OUT(WIDTH), .SYNC_OUT(WIDTH)
   ) core0 (
-      .tck(tck), .to_core(to_cores), .from_core(from_core0), .clk(clk),
+      .tck(user_tck), .to_core(to_cores), .from_core(from_core0), .clk(clk),
       .async_in(async_loop), .sync_in(sync_loop), .async_out(async_loop), .sync_out(sync_loop)
   );
 
   qor_other_core #(
       .INDEX(1), .TYPE(7)
   ) core1 (
-      .tck(tck), .to_core(to_cores), .from_core(from_core1)
+      .tck(user_tck), .to_core(to_cores), .from_core(from_core1)
   );
 
 endmodule

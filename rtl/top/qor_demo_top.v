@@ -1,7 +1,9 @@
 // The demo board: a chain of two devices, with the cores and designs of the simulated one.
 `default_nettype none
 
-module qor_demo_top (
+module qor_demo_top #(
+    parameter REGISTER = ""  // of device 0
+) (
     input  wire tck,
     input  wire tms,
     input  wire tdi,
@@ -15,7 +17,9 @@ module qor_demo_top (
       .tck(tck), .tms(tms), .tdi(tdi), .tdo(between), .clk(clk)
   );
 
-  qor_demo_fpga device0 (
+  qor_demo_fpga #(
+      .REGISTER(REGISTER)
+  ) device0 (
       .tck(tck), .tms(tms), .tdi(between), .tdo(tdo), .clk(clk)
   );
 
