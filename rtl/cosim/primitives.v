@@ -33,36 +33,6 @@ module BSCANE2 #(
   assign {DRCK, RESET, RUNTEST, UPDATE} = 4'b0;
 endmodule
 
-// No TCK, but one for each of two chains that runs in its own Capture-DR and Shift-DR.
-module BSCAN_SPARTAN3 (
-    output wire CAPTURE,
-    output wire DRCK1,
-    output wire DRCK2,
-    output wire RESET,
-    output wire SEL1,
-    output wire SEL2,
-    output wire SHIFT,
-    output wire TDI,
-    output wire UPDATE,
-    input  wire TDO1,
-    input  wire TDO2
-);
-  wire       tck = qor_demo_top.device0.tck;
-  wire [1:0] unused;
-  wire       pin_tdo;
-  reg  [2:1] enable = 2'b00;
-  qor_tap #(
-      .IDCODE(32'h0A5F1093)
-  ) tap (
-      .tck(tck), .tms(qor_demo_top.device0.tms), .tdi(qor_demo_top.device0.tdi), .tdo(pin_tdo),
-      .user_sel({unused, SEL2, SEL1}), .capture(CAPTURE), .shift(SHIFT), .user_tdo({2'b00, TDO2, TDO1})
-  );
-  always @(negedge tck) enable <= {2{CAPTURE | SHIFT}} & {SEL2, SEL1};
-  assign {DRCK2, DRCK1} = {2{tck}} & enable;
-  assign TDI = qor_demo_top.device0.tdi;
-  assign {RESET, UPDATE} = 2'b00;
-endmodule
-
 // TDI comes a TCK late; no select and no capture line.
 module JTAGG #(
     parameter ER1 = "ENABLED",

@@ -37,19 +37,10 @@ module qor_demo_fpga #(
       );
       assign tdo = user.eg_phy_config.register.pin_tdo;
     end else if (REGISTER == "BSCANE2") begin : bscane2
-      qor_bscan #(
-          .PRIMITIVE(REGISTER)
-      ) user (
+      qor_bscan user (
           .tck(user_tck), .sel(sel), .capture(capture), .shift(shift), .tdi(user_tdi), .tdo(user_tdo)
       );
-      assign tdo = user.bscane2.register.pin_tdo;
-    end else if (REGISTER == "BSCAN_SPARTAN3") begin : bscan_spartan3
-      qor_bscan #(
-          .PRIMITIVE(REGISTER)
-      ) user (
-          .tck(user_tck), .sel(sel), .capture(capture), .shift(shift), .tdi(user_tdi), .tdo(user_tdo)
-      );
-      assign tdo = user.pair.bscan_spartan3.register.pin_tdo;
+      assign tdo = user.register.pin_tdo;
     end else begin : four_pins
       qor_four_pins user (
           .pin_tck(tck), .pin_tms(tms), .pin_tdi(tdi), .pin_tdo(tdo),
