@@ -34,7 +34,7 @@ Words joined(const Words& pieces) {
 bool isPlain(const std::string& text) {
   return std::all_of(text.begin(), text.end(), [](unsigned char letter) {
     return letter >= 0x80 || std::isalnum(letter) != 0 ||
-           std::string_view("_-./:=[]").find(letter) != std::string_view::npos;
+           std::string_view("_-./:=[]").find(static_cast<char>(letter)) != std::string_view::npos;
   });
 }
 
