@@ -1,0 +1,233 @@
+"""Attacks on the command line: hostile servers, hostile files, folders of somebody else, killed processes, missing
+standard descriptors. usage: attack.py BIN, the folder of the built programs. Nothing may crash, hang, grow without
+limit, run a program or send control characters to the terminal.
+"""
+import itertools
+import os
+import pathlib
+import resource
+import shutil
+import signal
+import socket
+import subprocess
+import sys
+import tempfile
+import threading
+import time
+
+from hostile_server import MODES
+
+HERE = pathlib.Path(__file__).resolve().parent
+BIN = pathlib.Path(sys.argv[1]).resolve()
+QORVIO = str(BIN / "qorvio")
+HANGS = 60             # seconds: whoever takes so long waits without end
+LARGEST = 600 * 1024   # KiB of memory; sanitizers take some 200 of them
+SCRATCH = pathlib.Path(tempfile.mkdtemp())
+results = []
+
+
+def check(name, failure):
+    """Counts one attack; `failure` says what was wrong, or is empty."""
+    results.append(failure)
+    if failure:
+        print(f"FAILED  {name}: {failure}", flush=True)
+
+
+def run(*arguments, cwd=SCRATCH, **options):
+    environment = {**os.environ, "HOME": str(SCRATCH), "XDG_STATE_HOME": str(SCRATCH / "state")}
+    environment.update(options.pop("env", {}))
+    return subprocess.run([QORVIO, *arguments], cwd=cwd, env=environment, capture_output=True, timeout=HANGS,
+                          stdin=subprocess.DEVNULL, **options)
+
+
+def misbehaviour(attempt, statuses):
+    """What is wrong with a run: a crash, a hang, memory, an odd exit status, control characters, no message."""
+    try:
+        done = attempt()
+    except subprocess.TimeoutExpired:
+        return f"still running after {HANGS} s"
+    text = done.stderr.decode(errors="replace")
+    if b"Sanitizer" in done.stderr or b"runtime error" in done.stderr or done.returncode < 0:
+        return f"crashed ({done.returncode}): {text[:400]}"
+    if done.returncode not in statuses:
+        return f"exit status {done.returncode}: {text[:200]}"
+    if any(c < 32 and c != 10 or c == 127 for c in done.stderr + done.stdout):
+        return f"control characters reach the terminal: {text[:200]!r}"
+    if done.returncode != 0 and not text.startswith("qorvio: "):
+        return f"no message: {text[:200]!r}"
+    if resource.getrusage(resource.RUSAGE_CHILDREN).ru_maxrss > LARGEST:
+        return f"took {resource.getrusage(resource.RUSAGE_CHILDREN).ru_maxrss} KiB"
+    return ""
+
+
+def attack_by_servers():
+    for kind, modes in MODES.items():
+        for mode in modes:
+            server = subprocess.Popen([sys.executable, HERE / "hostile_server.py", kind, mode],
+                                      stdout=subprocess.PIPE, stderr=subprocess.DEVNULL)
+            port = server.stdout.readline().decode().strip()
+            prefix = {"bitbang": "rbb", "tcl": "openocd"}[kind]
+            url = f"{prefix}:127.0.0.1:{port}?timeout=1"
+            for command in (["scan"], ["read"], ["doctor"]):
+                # A chain of nothing but ones or zeros may be scanned in vain, never with values.
+                check(f"{kind} {mode} {command[0]}", misbehaviour(lambda: run("--cable", url, *command), (1, 2)))
+            server.kill()
+            server.wait()
+
+
+def hostile_files():
+    """Name and content of files that are no TOML, or too much of it."""
+    yield "dotted", "a." * 31000 + "a = 1"
+    yield "table", "[" + "a." * 31000 + "a]"
+    yield "array", "a = " + "[" * 31000 + "]" * 31000
+    yield "inline", "a = " + "{a=" * 31000 + "1" + "}" * 31000
+    yield "large", "# " + "x" * (8 << 20)
+    yield "nul", "a\0b = 1"
+    yield "bytes", b"\xff\xfe\x00\x01" * 100
+    yield "escape", 'core = "\x1b[2J"\nname = "\\u001b[2J"'
+    yield "key", '"\\u001b]0;x\\u0007" = 1'
+    yield "name", '[[signal]]\nname = "$(touch ran)"\nport = "async_out"\nbits = 0'
+    yield "vcd", '[[signal]]\nname = "$end"\nport = "async_in"\nbits = 0'
+
+
+def attack_by_files():
+    uses = {
+        "sim:FILE": lambda path: ["--cable", f"sim:{path}", "read"],
+        "board=FILE": lambda path: ["--cable", f"rbb:127.0.0.1:1?board={path}", "read"],
+        "signals": lambda path: ["--cable", "sim:", "--signals", path, "read"],
+        "signals check": lambda path: ["signals", "check", path],
+    }
+    for name, content in hostile_files():
+        path = SCRATCH / f"{name}.toml"
+        path.write_bytes(content if isinstance(content, bytes) else content.encode())
+        for use, arguments in uses.items():
+            check(f"{use} {name}", misbehaviour(lambda: run(*arguments(str(path))), (1, 2)))
+        folder = SCRATCH / f"in-{name}"
+        folder.mkdir()
+        shutil.copy(path, folder / "qorvio.toml")
+        check(f"qorvio.toml {name}", misbehaviour(lambda: run("scan", cwd=folder), (1, 2)))
+    fifo = SCRATCH / "fifo"
+    os.mkfifo(fifo)
+    for special in (fifo, SCRATCH, "/dev/zero"):
+        for use, arguments in uses.items():
+            check(f"{use} {special}", misbehaviour(lambda: run(*arguments(str(special))), (1, 2)))
+    check("a name was run", "yes" if list(SCRATCH.rglob("ran")) else "")
+
+
+def attack_by_recordings():
+    head = "$timescale 1ns $end\n$var wire {width} ! {name} $end\n$enddefinitions $end\n#0\n{value}\n#{end}\n"
+    for name, fields in {
+        "script": {"name": "<script>alert(1)</script>", "value": "b<script>1</script> !", "width": 8},
+        "digits": {"value": 'b"/><script> !', "width": 8},
+        "time": {"end": str(1 << 80)},
+        "late": {"end": str((1 << 63) + 1)},
+        "width": {"width": 999999999, "value": "b1 !"},
+        "times": {"end": "".join(f"{i}\n{i % 2}!\n#" for i in range(100000)) + "100001"},
+    }.items():
+        path = SCRATCH / f"{name}.vcd"
+        path.write_text(head.format(**{"name": "a", "width": 1, "value": "1!", "end": "10", **fields}))
+        picture = SCRATCH / f"{name}.svg"
+        check(f"render {name}", misbehaviour(lambda: run("render", str(path), str(picture)), (0, 1, 2)))
+        if picture.exists():
+            check(f"render {name}: a picture", "a script in it" if "<script" in picture.read_text() else "")
+
+
+def attack_by_folders():
+    """A folder of somebody else, with settings that start a program: for scan, and for a TAB."""
+    if os.geteuid() != 0:
+        print("skipped: a folder of somebody else needs root")
+        return
+    folder = SCRATCH / "theirs"
+    folder.mkdir()
+    (folder / "evil.cfg").write_text(f"exec touch {SCRATCH}/ran\n")
+    settings = folder / "qorvio.toml"
+    settings.write_text('cable = "openocd:?config=evil.cfg"\n')
+    os.chown(settings, 65534, 65534)
+    check("settings of somebody else", misbehaviour(lambda: run("scan", cwd=folder), (1, 2)))
+    os.chown(settings, 0, 0)
+    settings.chmod(0o666)
+    check("settings for everybody to write", misbehaviour(lambda: run("scan", cwd=folder), (1, 2)))
+    settings.chmod(0o644)
+    os.chown(folder / "evil.cfg", 65534, 65534)
+    check("settings that name a file of somebody else", misbehaviour(lambda: run("scan", cwd=folder), (1, 2)))
+    check("a configuration was run", "yes" if (SCRATCH / "ran").exists() else "")
+
+
+def attack_by_kill():
+    """kill -9 of recordings: what is a second old is in the file."""
+    for ending in ("vcd", "csv", "jsonl"):
+        path = SCRATCH / f"killed.{ending}"
+        host = subprocess.Popen([QORVIO, "--cable", "sim:", "--quiet", "record", "--for", "1h", "--rate", "50", "--out", str(path)],
+                                stdout=subprocess.DEVNULL, stderr=subprocess.DEVNULL)
+        deadline = time.monotonic() + HANGS
+        while (not path.exists() or path.stat().st_size == 0) and time.monotonic() < deadline:
+            time.sleep(0.1)
+        host.send_signal(signal.SIGKILL)
+        host.wait()
+        check(f"a killed recording {ending}", "" if path.exists() and path.stat().st_size else "it is empty")
+    """kill -9 of a host with a server of its own: the server ends too."""
+    server = SCRATCH / "bin" / "openocd"
+    server.parent.mkdir()
+    server.write_text(f"#!/bin/sh\necho $$ >{SCRATCH}/pid.new; mv {SCRATCH}/pid.new {SCRATCH}/pid\nexec cat >/dev/null\n")
+    server.chmod(0o755)
+    (SCRATCH / "mine.cfg").write_text("")
+    host = subprocess.Popen([QORVIO, "--cable", f"openocd:?config={SCRATCH}/mine.cfg&timeout=50", "scan"],
+                            env={**os.environ, "PATH": f"{server.parent}:{os.environ['PATH']}"},
+                            stdout=subprocess.DEVNULL, stderr=subprocess.DEVNULL, stdin=subprocess.DEVNULL)
+    deadline = time.monotonic() + HANGS
+    while not (SCRATCH / "pid").exists() and time.monotonic() < deadline:
+        time.sleep(0.05)
+    if not (SCRATCH / "pid").exists():
+        check("a killed host", "its server was not started")
+        return
+    pid = int((SCRATCH / "pid").read_text())
+    host.send_signal(signal.SIGKILL)
+    host.wait()
+    while os.path.exists(f"/proc/{pid}") and time.monotonic() < deadline:
+        time.sleep(0.05)
+    check("a killed host leaves its server", "yes" if os.path.exists(f"/proc/{pid}") else "")
+
+
+def attack_by_descriptors():
+    """Without standard descriptors no error text reaches the wires of a board."""
+    allowed = b"".join(bytes([c]) for c in b"01234567RrstuBbQ")
+    for closed in itertools.chain.from_iterable(itertools.combinations((0, 1, 2), n) for n in (1, 2, 3)):
+        received = bytearray()
+        with socket.create_server(("127.0.0.1", 0)) as board:
+            def listen():
+                client, _ = board.accept()
+                with client:
+                    while data := client.recv(4096):
+                        received.extend(data)
+                        client.sendall(b"0" * data.count(b"R"))
+            listener = threading.Thread(target=listen, daemon=True)
+            listener.start()
+            redirect = " ".join(f"{fd}>&-" if fd else "0<&-" for fd in closed)
+            port = board.getsockname()[1]
+            try:
+                done = subprocess.run(["sh", "-c", f'exec "$0" --cable rbb:127.0.0.1:{port}?timeout=1 scan {redirect}',
+                                       QORVIO], timeout=HANGS, stdout=subprocess.DEVNULL, stderr=subprocess.DEVNULL)
+                failure = f"crashed ({done.returncode})" if done.returncode < 0 or done.returncode > 2 else ""
+            except subprocess.TimeoutExpired:
+                failure = "hangs"
+            listener.join(HANGS)
+        others = bytes(received).translate(None, allowed)
+        check(f"descriptors {closed} closed", failure or (f"sent {others[:60]!r} to the board" if others else ""))
+
+
+def main():
+    try:
+        for attack in (attack_by_servers, attack_by_files, attack_by_recordings, attack_by_folders, attack_by_kill,
+                       attack_by_descriptors):
+            before, begin = len(results), time.monotonic()
+            attack()
+            print(f"{attack.__name__}: {len(results) - before} in {time.monotonic() - begin:.0f} s", flush=True)
+    finally:
+        shutil.rmtree(SCRATCH)
+    failed = sum(1 for failure in results if failure)
+    print(f"{len(results) - failed} passed, {failed} failed")
+    return 1 if failed else 0
+
+
+if __name__ == "__main__":
+    sys.exit(main())
