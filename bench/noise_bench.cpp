@@ -54,7 +54,7 @@ void measure(unsigned width, bool sent, std::size_t calls, double rate) {
               calls, noise.noisyBits(), static_cast<unsigned long long>(link.repeatsNoHub),
               static_cast<unsigned long long>(link.repeatsNoHead),
               static_cast<unsigned long long>(link.repeatsBadCrc),
-              static_cast<unsigned long long>(link.repeatsSlow + link.repeatsRefused), failures.writes,
+              static_cast<unsigned long long>(link.repeatsSlow) + link.repeatsRefused, failures.writes,
               failures.reads, failures.wrongValues);
   QorJtag_session_close(session);
 }

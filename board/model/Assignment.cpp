@@ -65,10 +65,11 @@ Assignment pulseOf(const Signal& signal, Pulse pulse) {
   if (signal.port != Port::syncOut)
     throw WrongUse("an asynchronous output plays no pulses, press it instead: " + signal.name);
   if (pulse.width == 0) throw WrongUse("a pulse must be 1 to 15 steps wide: 0");
-  if (pulse.at >= stepCount || pulse.width >= stepCount - pulse.at)
+  if (pulse.at >= stepCount || pulse.width >= stepCount - pulse.at) {
     throw WrongUse("a pulse must begin and end within 16 steps, the last of them low: steps " +
                    std::to_string(pulse.at) + " to " +
                    std::to_string(std::uint64_t{pulse.at} + pulse.width - 1));
+  }
   std::vector<Bytes> steps(stepCount, Bytes{0});
   for (unsigned step = pulse.at; step < pulse.at + pulse.width; ++step) steps[step] = {1};
   return {signal, steps};

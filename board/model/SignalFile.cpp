@@ -104,13 +104,13 @@ double scaleOf(const TomlPlace& place) {
 }
 
 std::string nameOf(const TomlPlace& place) {
-  const std::string text = place.text();
+  std::string text = place.text();
   if (!isSignalName(text)) place.fail("must be letters, digits, _, - and /, is \"" + text + "\"");
   return text;
 }
 
 std::string plainText(const TomlPlace& place) {
-  const std::string text = place.text();
+  std::string text = place.text();
   if (hasControls(text)) place.fail("must be a text without control characters");
   return text;
 }

@@ -66,8 +66,10 @@ Bytes fitted(const Signal& signal, Bytes magnitude, bool isBelowZero, bool isSpe
 // The bytes of a whole number from 0 on.
 Bytes bytesOf(double number) {
   Bytes bytes;
-  for (; number >= 1; number = std::floor(number / 256))
+  while (number >= 1) {
     bytes.push_back(static_cast<unsigned char>(std::fmod(number, 256)));
+    number = std::floor(number / 256);
+  }
   return bytes;
 }
 

@@ -88,6 +88,7 @@ class Reader {
 
   static void requireDistinct(const std::vector<Signal>& signals) {
     std::vector<std::string> names;
+    names.reserve(signals.size());
     for (const Signal& each : signals) names.push_back(each.name);
     std::sort(names.begin(), names.end());
     const auto twice = std::adjacent_find(names.begin(), names.end());

@@ -100,10 +100,11 @@ TEST(PlayScript, TakesRowsOrSaysWhatIsWrong) {
       {"a,A\n1,1\n", "1: names an output twice: a"},
       {"a\n\n1F\n", "3: a has 4 bits, too few for the value: 1F"},
   };
-  for (const auto& [text, wanted] : rows)
+  for (const auto& [text, wanted] : rows) {
     EXPECT_EQ(
         problemOf("f", [&, t = text](const std::string& path) { qor::parsePlayScript(t, path, table); }),
         wanted);
+  }
   const qor::PlayScript script = qor::parsePlayScript("time_s,a\n0,1\n1.5,2\n", "f", table);
   EXPECT_EQ(script.times[1], std::chrono::milliseconds(1500));
   EXPECT_EQ(script.rows[1][0], qor::Bytes{2});

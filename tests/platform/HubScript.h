@@ -36,10 +36,10 @@ struct SentFrame {
   }
   /// Where the payload ends: the longest one whose CRC follows it with nothing but ones behind.
   std::size_t lastOf(const Bits& scan) const {
-    for (std::size_t end = scan.size() - 32; end > 58; --end)
-      if (scan.find('0', end + 32) == scan.npos &&
-          scan.substr(end, 32) == crc32Of(header + scan.substr(58, end - 58)))
-        return end;
+    for (std::size_t end = scan.size() - 32; end > 58; --end) {
+      const bool onesFollow = scan.find('0', end + 32) == scan.npos;
+      if (onesFollow && scan.substr(end, 32) == crc32Of(header + scan.substr(58, end - 58))) return end;
+    }
     return 58;
   }
 };

@@ -39,10 +39,11 @@ TEST(WireUrls, NameAServerAndOptions) {
   for (const auto& [rest, problem] : bad)
     EXPECT_EQ(thrownBy([&options, rest = rest] { QorRT::parseWireUrl("rbb", rest, options); }),
               "logic: the cable URL \"rbb:" + std::string(rest) + "\" " + problem);
-  for (const std::string start : {"rbb:host:1?config=a", "openocd:host:1?config=a"})
+  for (const std::string start : {"rbb:host:1?config=a", "openocd:host:1?config=a"}) {
     EXPECT_EQ(
         thrownBy([&] { QorRT::openCable(start.c_str()); }),
         "logic: the cable URL \"" + start + "\" has the unknown option \"config\"; known: board, timeout");
+  }
 }
 
 // What an idle chain of that many bits shows a probe of ones: its own bits, then the probe.

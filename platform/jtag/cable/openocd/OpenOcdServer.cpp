@@ -136,7 +136,8 @@ OpenOcdServer::OpenOcdServer(const std::string& configFile, StopFunction stop)
 }
 
 // The end of its input ends it, though a copy of this process may have the sockets too.
-OpenOcdServer::~OpenOcdServer() {
+// What could throw is out of memory only, and then there is no way on.
+OpenOcdServer::~OpenOcdServer() {  // NOLINT(bugprone-exception-escape)
   boost::system::error_code ignored;
   stream_.link().socket.shutdown(Socket::shutdown_both, ignored);
   std::error_code none;

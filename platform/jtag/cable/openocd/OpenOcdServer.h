@@ -15,7 +15,7 @@ class OpenOcdServer {
   /// Throws runtime_error when openocd cannot be started. What is wrong with the configuration file shows when the
   /// server ends; see explain().
   OpenOcdServer(const std::string& configFile, StopFunction stop);
-  ~OpenOcdServer();
+  ~OpenOcdServer();  // NOLINT(bugprone-exception-escape)
   OpenOcdServer(const OpenOcdServer&) = delete;
   OpenOcdServer& operator=(const OpenOcdServer&) = delete;
 

@@ -33,7 +33,7 @@ std::string countText(std::size_t count, std::size_t wanted) {
 /// Operations that refer to variables of their caller: none outlives it, though that ends the connection.
 struct Running {
   explicit Running(Stream::Link& itsLink) : link(itsLink) {}
-  ~Running() {
+  ~Running() {  // NOLINT(bugprone-exception-escape): nothing of what runs here throws
     error_code ignored;
     if (count > 0) link.socket.close(ignored);
     for (; count > 0; link.io.run_one()) link.io.restart();
