@@ -111,6 +111,29 @@ module EG_PHY_CONFIG (
   always @(posedge jtck) late <= jtdo;
 endmodule
 
+// No primitive, but the kind of those whose clock runs in Capture-DR and Shift-DR of their own instruction only. It has no
+// capture line: a TCK without shift is that of Capture-DR.
+module gated_register (
+    output wire gated_tck,
+    output wire select,
+    output wire shift,
+    output wire tdi,
+    input  wire tdo
+);
+  wire [3:0] sel;
+  wire       capture, tap_shift, pin_tdo;
+  reg        runs = 1'b0;
+  qor_tap #(
+      .IDCODE(32'h0A5F1093)
+  ) tap (
+      .tck(qor_demo_top.device0.tck), .tms(qor_demo_top.device0.tms), .tdi(tdi), .tdo(pin_tdo), .user_sel(sel),
+      .capture(capture), .shift(tap_shift), .user_tdo({3'b000, tdo})
+  );
+  always @(negedge qor_demo_top.device0.tck) runs <= sel[0] & (capture | tap_shift);
+  assign gated_tck = qor_demo_top.device0.tck & runs;
+  assign {select, shift, tdi} = {sel[0], tap_shift, qor_demo_top.device0.tdi};
+endmodule
+
 /* verilator lint_on DECLFILENAME */
 /* verilator lint_on UNUSED */
 `default_nettype wire

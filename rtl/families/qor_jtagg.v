@@ -4,14 +4,17 @@
 //   JTAGG, JTAG     JCE1, JCE2
 //   EG_PHY_CONFIG   jscanen[0], jscanen[1]
 //
-// Of JTAGG it is known that JTDI comes a TCK late; the host finds that out. Left open by the descriptions: whether the
-// enable of EG_PHY_CONFIG is high in Capture-DR as well as in Shift-DR, which this wrapper takes for granted, and whether
-// its jtdi is late. There is one such primitive in a device: what else needs the other register shares it.
+// Of JTAGG it is known that JTDI comes a TCK late. Left open by the descriptions: whether the enable of EG_PHY_CONFIG is
+// high in Capture-DR as well as in Shift-DR, which this wrapper takes for granted, and whether its jtdi is late; qorvio
+// doctor says how late it is, for LATE_TDI. There is one such primitive in a device: what else needs the other register
+// shares it.
 `default_nettype none
 
+/* verilator lint_off WIDTH */  // names of different lengths are compared
 module qor_jtagg #(
     parameter PRIMITIVE = "JTAGG",
-    parameter USER = 1  // ER1 or ER2: register 1 or 2
+    parameter USER = 1,  // ER1 or ER2: register 1 or 2
+    parameter LATE_TDI = PRIMITIVE == "EG_PHY_CONFIG" ? 0 : 1
 ) (
     // Those of the pins, where the primitive wants them; leave them open or 0 elsewhere.
     input  wire pin_tck,
@@ -30,8 +33,7 @@ module qor_jtagg #(
   wire       register_tck, register_shift, register_tdi, register_tdo;
   wire [2:1] enables;
 
-  // Names of different lengths are compared, and most ports are not needed.
-  /* verilator lint_off WIDTH */
+  // Most ports are not needed.
   /* verilator lint_off PINMISSING */
   generate
     if (PRIMITIVE == "JTAGG") begin : jtagg
@@ -61,10 +63,9 @@ module qor_jtagg #(
     end
   endgenerate
   /* verilator lint_on PINMISSING */
-  /* verilator lint_on WIDTH */
 
   qor_user_register #(
-      .SELECT(0), .CAPTURE(0), .SHARED(1)
+      .SELECT(0), .CAPTURE(0), .SHARED(1), .LATE_TDI(LATE_TDI)
   ) adapter (
       .register_tck(register_tck), .register_select(1'b1), .register_capture(1'b0), .register_shift(register_shift),
       .register_enable(enables[USER]), .register_tdi(register_tdi), .register_tdo(register_tdo),
@@ -74,5 +75,6 @@ module qor_jtagg #(
   wire unused = &{1'b0, enables};
 
 endmodule
+/* verilator lint_on WIDTH */
 
 `default_nettype wire

@@ -2,7 +2,7 @@
 `default_nettype none
 
 module qor_demo_fpga #(
-    parameter REGISTER = ""  // a primitive of ../families, modelled in ../cosim; or a TAP on four pins
+    parameter REGISTER = ""  // a primitive of ../families or "gated", modelled in ../cosim; or a TAP on four pins
 ) (
     input  wire tck,
     input  wire tms,
@@ -41,6 +41,21 @@ module qor_demo_fpga #(
           .tck(user_tck), .sel(sel), .capture(capture), .shift(shift), .tdi(user_tdi), .tdo(user_tdo)
       );
       assign tdo = user.register.pin_tdo;
+    end else if (REGISTER == "gated") begin : gated
+      wire register_tck, register_select, register_shift, register_tdi, register_tdo;
+      gated_register register (
+          .gated_tck(register_tck), .select(register_select), .shift(register_shift), .tdi(register_tdi),
+          .tdo(register_tdo)
+      );
+      qor_user_register #(
+          .CAPTURE(0)
+      ) adapter (
+          .register_tck(register_tck), .register_select(register_select), .register_capture(1'b0),
+          .register_shift(register_shift), .register_enable(register_select), .register_tdi(register_tdi),
+          .register_tdo(register_tdo),
+          .tck(user_tck), .sel(sel), .capture(capture), .shift(shift), .tdi(user_tdi), .tdo(user_tdo)
+      );
+      assign tdo = register.pin_tdo;
     end else begin : four_pins
       qor_four_pins user (
           .pin_tck(tck), .pin_tms(tms), .pin_tdi(tdi), .pin_tdo(tdo),
