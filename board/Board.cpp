@@ -38,7 +38,7 @@ std::string lastSeen(const Condition& condition, const std::vector<Sample>& samp
 Board::Board(const std::string& url, const std::string& signalsFile, BoardOptions options)
     : options_(std::move(options)) {
   SignalTable signals = fileOf(signalsFile);  // before the cable: what is wrong in it needs no board
-  link_ = std::make_unique<Link>(openCable(url), url);
+  link_ = std::make_unique<Link>(openCable(url, options_.stop), url);
   open(std::move(signals));
 }
 

@@ -46,7 +46,8 @@ struct BoardOptions {
   /// Where to remember what outputs were given; empty: nowhere. userStateFolder() is the one of the command line.
   std::string stateFolder{};
 
-  /// Interrupts waits.
+  /// Interrupts waits: those for a condition, and those for the server of a cable that the board itself opens, which fail
+  /// then.
   StopFunction stop{};
 };
 

@@ -37,6 +37,11 @@ Stop::Stop() : before_(std::make_unique<Handlers>()) {
 
 Stop::~Stop() {
   for (std::size_t i = 0; i < endings.size(); ++i) sigaction(endings[i], &before_->actions[i], nullptr);
+  firstSignal = 0;
+}
+
+bool isStopAsked() {
+  return firstSignal != 0;
 }
 
 int Stop::signal() const {

@@ -29,4 +29,7 @@ class Stop {
   std::unique_ptr<Handlers> before_;
 };
 
+/// Whether there is a Stop, and it is asked for.
+bool isStopAsked();
+
 }  // namespace os

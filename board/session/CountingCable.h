@@ -24,6 +24,7 @@ class QORBOARD_API CountingCable : public QorRT::Qor_Cable {
       : cable_(std::move(cable)), traffic_(traffic) {}
 
   const std::vector<QorRT::Qor_Device>& devices() const override { return cable_->devices(); }
+  bool isStopped() const override { return cable_->isStopped(); }
 
  private:
   void run(std::vector<QorRT::Qor_Scan>& scans) override;

@@ -48,9 +48,9 @@ void findBehind(Link& link, unsigned device, unsigned userChain, std::vector<Fou
 
 }  // namespace
 
-std::unique_ptr<QorRT::Qor_Cable> openCable(const std::string& url) {
+std::unique_ptr<QorRT::Qor_Cable> openCable(const std::string& url, StopFunction stop) {
   try {
-    return QorRT::openCable(url.c_str());
+    return QorRT::openCable(url.c_str(), std::move(stop));
   } catch (const std::logic_error& error) {  // the URL itself
     throw WrongUse("cannot open the cable " + url + ": " + error.what());
   } catch (const std::exception& error) {

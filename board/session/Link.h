@@ -10,11 +10,13 @@
 #include "QorVIO.h"
 #include "QorVIO_CoreFields.h"
 #include "board/Export.h"
+#include "board/session/Stop.h"
 
 namespace qor {
 
-/// Throws "cannot open the cable URL: why": WrongUse for a malformed URL, else Failure.
-QORBOARD_API std::unique_ptr<QorRT::Qor_Cable> openCable(const std::string& url);
+/// Throws "cannot open the cable URL: why": WrongUse for a malformed URL, else Failure. `stop` ends every wait of the
+/// cable, as a failure; it must be of use as long as the cable.
+QORBOARD_API std::unique_ptr<QorRT::Qor_Cable> openCable(const std::string& url, StopFunction stop = {});
 
 /// Keeps the session's messages, and throws them as Failure.
 class QORBOARD_API Link {

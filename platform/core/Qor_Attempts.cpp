@@ -9,7 +9,7 @@ namespace {
 using std::chrono::milliseconds;
 
 constexpr std::size_t mostRepeats = 3;
-constexpr milliseconds longestWait(2000), longestPause(64);
+constexpr milliseconds longestWait(2000), stoppedWait(300), longestPause(64);
 
 }  // namespace
 
@@ -27,10 +27,10 @@ std::string Qor_Damage::text() const {
   return text;
 }
 
-bool Qor_Wait::mayRepeat(Qor_WaitingRoom& room) {
+bool Qor_Wait::mayRepeat(Qor_WaitingRoom& room, bool isStopped) {
   if (count_++ == 0) begin_ = Clock::now();
   if (room.grow()) return true;
-  if (Clock::now() - begin_ > longestWait) return false;
+  if (Clock::now() - begin_ > (isStopped ? stoppedWait : longestWait)) return false;
   std::this_thread::sleep_for(pause_);
   pause_ = std::min(pause_ * 2, longestPause);
   return true;

@@ -29,8 +29,8 @@ class Qor_Damage {
 /// Those that waited for the design clock: with more room, then with more time.
 class Qor_Wait {
  public:
-  /// Makes room or lets time pass. False when the design clock has had two seconds.
-  bool mayRepeat(Qor_WaitingRoom& room);
+  /// Makes room or lets time pass. False when the design clock has had two seconds, or 300 ms for a host that is to stop.
+  bool mayRepeat(Qor_WaitingRoom& room, bool isStopped);
 
   /// "COUNT attempts in TIME ms"
   std::string text() const;

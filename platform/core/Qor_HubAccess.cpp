@@ -121,7 +121,7 @@ Qor_Answer Qor_HubAccess::ask(Qor_Request request, Qor_WaitingRoom& room) {
       return answer;
     }
     if (isWhole || answer.verdict == Qor_Verdict::slow) {
-      if (!wait.mayRepeat(room)) fail(waitText(answer, mayBeDone) + ", " + wait.text());
+      if (!wait.mayRepeat(room, cable_.isStopped())) fail(waitText(answer, mayBeDone) + ", " + wait.text());
     } else if (!damage.mayRepeat(seen, answer.verdict == Qor_Verdict::noHub)) {
       if (damage.isOnlySilence()) throw Qor_NoHub(addressText(coreRef_) + ": " + damage.text());
       fail(damage.text());

@@ -18,7 +18,7 @@ const std::string& Context::cable() {
 Link& Context::link() {
   if (board_) return board_->link();
   if (link_) return *link_;
-  std::unique_ptr<QorRT::Qor_Cable> opened = openCable(cable());
+  std::unique_ptr<QorRT::Qor_Cable> opened = openCable(cable(), os::isStopAsked);
   if (traffic_ != nullptr) opened = std::make_unique<CountingCable>(std::move(opened), *traffic_);
   link_ = std::make_unique<Link>(std::move(opened), cable());
   return *link_;
@@ -35,7 +35,7 @@ Board& Context::board() {
   if (!settings.core.empty()) options.core = parseRef(settings.core);
   options.forceCore = settings.forceCore;
   options.stateFolder = userStateFolder();
-  options.stop = [this] { return stop_ != nullptr && stop_->asked(); };
+  options.stop = os::isStopAsked;
   const SignalTable& signals = file();
   link();
   board_ = std::make_unique<Board>(std::move(link_), signals, std::move(options));

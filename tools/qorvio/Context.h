@@ -46,13 +46,13 @@ class Context {
   void endBySignal(int signal) { exitStatus_ = signal == 0 ? 0 : 128 + signal; }
   /// @}
 
-  /// While it lives, waits of the board end when the stop is asked for.
-  class StopScope {
+  /// A command that a signal ends before its time, however that shows: the program ends as that signal asks.
+  class Stoppable : public os::Stop {
    public:
-    StopScope(Context& context, const os::Stop& stop) : context_(context) { context_.stop_ = &stop; }
-    StopScope(const StopScope&) = delete;
-    StopScope& operator=(const StopScope&) = delete;
-    ~StopScope() { context_.stop_ = nullptr; }
+    explicit Stoppable(Context& context) : context_(context) {}
+    Stoppable(const Stoppable&) = delete;
+    Stoppable& operator=(const Stoppable&) = delete;
+    ~Stoppable() { context_.endBySignal(signal()); }
 
    private:
     Context& context_;
@@ -63,7 +63,6 @@ class Context {
   std::unique_ptr<Link> link_;
   std::unique_ptr<Board> board_;
   std::optional<SignalTable> file_;
-  const os::Stop* stop_ = nullptr;
   int exitStatus_ = 0;
 };
 

@@ -61,6 +61,9 @@ class QOR_API Qor_Cable {
   /// What stands on the chain, in device-index order. Valid as long as the cable.
   virtual const std::vector<Qor_Device>& devices() const = 0;
 
+  /// Whether the host is to stop: whoever repeats scans for long gives up then.
+  virtual bool isStopped() const { return false; }
+
   /// Queues: the device selects its USERn register (n = `userChain`), all others BYPASS. Unless `always` is true, as
   /// it must be after an answer that was wrong, a cable whose chain nobody else uses leaves the scan out when they do
   /// so already. Throws logic_error, queueing nothing, for a device beyond the chain or a user chain that is not 1 to 4.

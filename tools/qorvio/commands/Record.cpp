@@ -5,7 +5,6 @@
 #include "board/model/Errors.h"
 #include "board/record/Recording.h"
 #include "os/StandardStreams.h"
-#include "os/Stop.h"
 #include "tools/qorvio/Number.h"
 #include "tools/qorvio/Report.h"
 #include "tools/qorvio/commands/Commands.h"
@@ -69,12 +68,10 @@ class Progress {
 Recorded recordWithProgress(Context& context, const std::vector<Signal>& signals, const std::string& path,
                             const Limits& limits, bool wanted) {
   Progress progress(wanted, limits);
-  const os::Stop stop;
-  const Recorded recorded = recordTo(
+  const Context::Stoppable stop(context);
+  return recordTo(
       path, context.board().poller(), signals, limits, [&stop] { return stop.asked(); },
       [&](const Recorded& soFar, nanoseconds now) { progress.show(soFar.samples, now); });
-  context.endBySignal(stop.signal());
-  return recorded;
 }
 
 void record(Context& context, const RecordOptions& options) {

@@ -6,7 +6,6 @@
 
 #include "board/model/Duration.h"
 #include "board/model/Errors.h"
-#include "os/Stop.h"
 #include "tools/qorvio/CommandLine.h"
 #include "tools/qorvio/commands/Commands.h"
 #include "tools/qorvio/terminal/Printable.h"
@@ -76,11 +75,9 @@ std::vector<Step> readScript(const std::string& file) {
 }
 
 void sleep(Context& context, const std::string& time) {
-  const os::Stop stop;
+  const Context::Stoppable stop(context);
   stop.sleepUntil(std::chrono::steady_clock::now() + parseDuration(time));
-  if (!stop.asked()) return;
-  context.endBySignal(stop.signal());
-  throw Stopped("interrupted");
+  if (stop.asked()) throw Stopped("interrupted");
 }
 
 void addForScripts(CLI::App& app, Context& context) {

@@ -3,7 +3,6 @@
 
 #include "board/model/Duration.h"
 #include "board/model/Errors.h"
-#include "os/Stop.h"
 #include "tools/qorvio/Report.h"
 #include "tools/qorvio/commands/Commands.h"
 #include "tools/qorvio/terminal/Printable.h"
@@ -31,15 +30,9 @@ void wait(Context& context, const WaitOptions& options) {
   const std::chrono::nanoseconds timeout = parseDuration(options.timeout);
   Board& board = context.board();
   const Condition condition = allOf(board, options.conditions);
-  const os::Stop stop;
-  const Context::StopScope scope(context, stop);
+  const Context::Stoppable stop(context);
   const auto begin = std::chrono::steady_clock::now();
-  try {
-    board.waitFor(condition, timeout);
-  } catch (const Stopped&) {
-    context.endBySignal(stop.signal());
-    throw;
-  }
+  board.waitFor(condition, timeout);
   const double seconds = std::chrono::duration<double>(std::chrono::steady_clock::now() - begin).count();
   if (context.settings.json) print({{}, {{"condition", condition.text()}, {"after_s", seconds}}}, true);
 }

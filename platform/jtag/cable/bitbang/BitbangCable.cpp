@@ -53,7 +53,7 @@ BitbangCable::BitbangCable(WireUrl url, StopFunction stop) : WireCable(std::move
 
 BitbangCable::~BitbangCable() {
   try {
-    if (stream_) stream_->exchange(std::string(1, quit), 0, deadlineOf(0));
+    if (stream_) stream_->exchange(std::string(1, quit), 0, leaveTime());
   } catch (const std::exception&) {  // the server has gone first
   }
 }

@@ -64,7 +64,7 @@ OpenOcdCable::~OpenOcdCable() {
 void OpenOcdCable::disconnect() noexcept {
   try {
     if (answers_ && connection_)
-      ask("catch {rename " + muteLog_ + " {}}\n" + restoreLogLevel(), mostText, deadlineOf(0));
+      ask("catch {rename " + muteLog_ + " {}}\n" + restoreLogLevel(), mostText, leaveTime());
   } catch (const std::exception&) {  // it has gone first
   }
   answers_ = false;

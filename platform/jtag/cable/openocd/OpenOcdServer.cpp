@@ -28,7 +28,7 @@ namespace process = boost::process;
 using Local = boost::asio::local::stream_protocol;
 using std::chrono::milliseconds;
 
-constexpr milliseconds pollInterval{5}, exitGrace{200}, stopTimeout{1000};
+constexpr milliseconds pollInterval{5}, exitGrace{200}, stopTimeout{500};
 constexpr std::size_t logBytes = 16384;  // what is kept of its log
 
 /// A program that inherits nothing but its standard streams.

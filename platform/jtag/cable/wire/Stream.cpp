@@ -5,7 +5,9 @@
 #include <boost/asio/read.hpp>
 #include <boost/asio/write.hpp>
 #include <cmath>
+#include <future>
 #include <stdexcept>
+#include <thread>
 #include <utility>
 
 #include "platform/jtag/cable/wire/StreamLink.h"
@@ -54,6 +56,11 @@ struct Stream::Wanted {
   std::function<std::string(std::size_t count)> seen;
 };
 
+/// What a name leads to.
+struct Stream::Places {
+  tcp::resolver::results_type all;
+};
+
 Stream::Stream(const Endpoint& endpoint, const Deadline& deadline, StopFunction stop)
     : Stream(std::make_unique<Link>(), endpoint.text(), std::move(stop)) {
   connect(endpoint, deadline);
@@ -67,9 +74,7 @@ Stream::~Stream() = default;
 
 void Stream::connect(const Endpoint& endpoint, const Deadline& deadline) {
   error_code error;
-  const auto found = tcp::resolver(link_->io).resolve(endpoint.host, endpoint.port, error);
-  if (error) fail("cannot be found: " + error.message());
-  for (const auto& each : found) {
+  for (const auto& each : find(endpoint, deadline).all) {
     tcp::socket made(link_->io, each.endpoint().protocol());
     keepPrivate(link_->socket, made, each.endpoint().protocol());
     Running running(*link_);
@@ -83,6 +88,27 @@ void Stream::connect(const Endpoint& endpoint, const Deadline& deadline) {
     link_->socket.close();
   }
   fail("cannot be reached: " + error.message());
+}
+
+// A look-up in the network ends when it likes: it has a thread of its own, which is left alone when it takes too long.
+Stream::Places Stream::find(const Endpoint& endpoint, const Deadline& deadline) {
+  error_code error;
+  Places places{
+      tcp::resolver(link_->io).resolve(endpoint.host, endpoint.port, tcp::resolver::numeric_host, error)};
+  if (!error) return places;
+  std::packaged_task<tcp::resolver::results_type()> task([endpoint] {
+    boost::asio::io_context io;
+    return tcp::resolver(io).resolve(endpoint.host, endpoint.port);
+  });
+  auto found = task.get_future();
+  std::thread(std::move(task)).detach();
+  while (found.wait_for(stopInterval) != std::future_status::ready)
+    requireTime([] { return "could not be found"; }, deadline);
+  try {
+    return {found.get()};
+  } catch (const boost::system::system_error& unknown) {
+    fail("cannot be found: " + unknown.code().message());
+  }
 }
 
 std::string Stream::exchange(std::string_view out, std::size_t count, const Deadline& deadline) {
@@ -110,6 +136,7 @@ std::string Stream::ask(std::string_view out, char end, std::size_t most, const 
 std::string Stream::transfer(std::string_view out, const Wanted& wanted, const Deadline& deadline) {
   std::string in;
   in.reserve(std::min(wanted.most, blockBytes));
+  std::size_t got = 0;  // the text is longer meanwhile
   error_code error;
   Running running(*link_);
   const auto ended = [&](error_code result, std::size_t) {
@@ -120,8 +147,12 @@ std::string Stream::transfer(std::string_view out, const Wanted& wanted, const D
   boost::asio::async_write(link_->socket, boost::asio::buffer(out), ended);
   boost::asio::async_read(
       link_->socket, boost::asio::dynamic_buffer(in, wanted.most),
-      [&](error_code result, std::size_t) { return result || wanted.isWhole(in) ? 0 : blockBytes; }, ended);
-  const auto seen = [&] { return wanted.seen(in.size()); };
+      [&](error_code result, std::size_t count) {
+        got = count;
+        return result || wanted.isWhole(in) ? 0 : blockBytes;
+      },
+      ended);
+  const auto seen = [&] { return wanted.seen(got); };
   runUntil([&] { return running.count == 0 || error; }, seen, deadline);
   if (error == boost::asio::error::eof) fail(seen() + ", then closed the connection");
   if (error) fail(seen() + ", then broke the connection: " + error.message());
@@ -134,9 +165,13 @@ void Stream::runUntil(const std::function<bool()>& done, const std::function<std
     link_->io.restart();
     link_->io.run_one_until(std::min(deadline.end, Deadline::Clock::now() + stopInterval));
     if (done()) return;
-    if (stop_ && stop_()) fail(seen() + " before the host stopped the wait");
-    if (Deadline::Clock::now() >= deadline.end) fail(seen() + " within " + secondsText(deadline.allowed));
+    requireTime(seen, deadline);
   }
+}
+
+void Stream::requireTime(const std::function<std::string()>& seen, const Deadline& deadline) {
+  if (stop_ && deadline.mayStop() && stop_()) fail(seen() + " before the host stopped the wait");
+  if (Deadline::Clock::now() >= deadline.end) fail(seen() + " within " + secondsText(deadline.allowed));
 }
 
 void Stream::fail(const std::string& seen) const {

@@ -47,11 +47,14 @@ class Stream {
 
  private:
   struct Wanted;
+  struct Places;
 
   void connect(const Endpoint& endpoint, const Deadline& deadline);
+  Places find(const Endpoint& endpoint, const Deadline& deadline);
   std::string transfer(std::string_view out, const Wanted& wanted, const Deadline& deadline);
   void runUntil(const std::function<bool()>& done, const std::function<std::string()>& seen,
                 const Deadline& deadline);
+  void requireTime(const std::function<std::string()>& seen, const Deadline& deadline);
   [[noreturn]] void fail(const std::string& seen) const;
 
   std::unique_ptr<Link> link_;

@@ -50,6 +50,10 @@ Deadline WireCable::deadlineOf(std::size_t tcks) const {
   return Deadline(url_.timeout + Seconds(static_cast<double>(tcks) / slowestTck));
 }
 
+Deadline WireCable::leaveTime() const {
+  return Deadline(std::min(url_.timeout, Seconds(0.5)));
+}
+
 bool WireCable::isSelected(const Qor_Scan& ir) {
   const std::pair<unsigned, unsigned> wanted(ir.device, ir.userChain);
   return std::exchange(selected_, wanted) == wanted && !ir.always;

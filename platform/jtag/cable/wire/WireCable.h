@@ -18,6 +18,7 @@ namespace QorRT {
 class WireCable : public Qor_Cable {
  public:
   const std::vector<Qor_Device>& devices() const override { return heads_; }
+  bool isStopped() const override { return stop_ && stop_(); }
 
  protected:
   /// Throws what boardDevices() throws for the board file of the URL.
@@ -28,6 +29,9 @@ class WireCable : public Qor_Cable {
 
   /// For an exchange of so many TCKs, on the slowest adapter that is waited for.
   Deadline deadlineOf(std::size_t tcks) const;
+
+  /// For the last words to a server, whose answer changes nothing.
+  Deadline leaveTime() const;
 
   /// Whether the instruction of an IR scan is selected already. From then on it is taken to be. For cables whose chain
   /// nobody else uses.
