@@ -2,7 +2,9 @@
 standard descriptors. usage: attack.py BIN, the folder of the built programs. Nothing may crash, hang, grow without
 limit, run a program or send control characters to the terminal.
 """
+import contextlib
 import itertools
+import json
 import os
 import pathlib
 import resource
@@ -73,6 +75,64 @@ def attack_by_servers():
                 check(f"{kind} {mode} {command[0]}", misbehaviour(lambda: run("--cable", url, *command), (1, 2)))
             server.kill()
             server.wait()
+
+
+def turning(board, trickles):
+    """A server that passes a board on until it is told to turn: then it is silent, or sends a byte now and then."""
+    turned = threading.Event()
+    server = socket.create_server(("127.0.0.1", 0))
+
+    def serve():
+        client, _ = server.accept()
+        link = socket.create_connection(board)
+        threading.Thread(target=answer, args=(client, link), daemon=True).start()
+        while (data := client.recv(65536)) and not turned.is_set():
+            link.sendall(data)
+
+    def answer(client, link):
+        while (data := link.recv(65536)) and not turned.is_set():
+            client.sendall(data)
+        with contextlib.suppress(OSError):
+            while trickles:
+                client.sendall(b"0")
+                time.sleep(0.2)
+    threading.Thread(target=serve, daemon=True).start()
+    return server.getsockname()[1], turned
+
+
+def catches(number, pid):
+    status = pathlib.Path(f"/proc/{pid}/status").read_text()
+    return int(status.split("SigCgt:")[1].split()[0], 16) >> (number - 1) & 1
+
+
+def attack_by_servers_that_turn():
+    """A server that falls silent while a command goes on: Ctrl-C ends the wait, though its own time is an hour."""
+    simulated = subprocess.Popen([QORVIO, "--json", "simulate"], stdout=subprocess.PIPE,
+                                 stderr=subprocess.DEVNULL)
+    board = ("127.0.0.1", json.loads(simulated.stdout.readline())["port"])
+    for command, number, trickles in itertools.product(
+            ("record --for 1h --out turned.csv", "wait async_in_data==77 --timeout 1h", "watch", "events",
+             "press async_out_data[0] --for 1s"), (signal.SIGINT, signal.SIGTERM), (False, True)):
+        port, turned = turning(board, trickles)
+        host = subprocess.Popen([QORVIO, "--cable", f"rbb:127.0.0.1:{port}?timeout=3600", *command.split()],
+                                cwd=SCRATCH, env={**os.environ, "XDG_STATE_HOME": str(SCRATCH / "state")},
+                                stdout=subprocess.DEVNULL, stderr=subprocess.PIPE, stdin=subprocess.DEVNULL)
+        deadline = time.monotonic() + HANGS
+        while not catches(number, host.pid) and time.monotonic() < deadline:
+            time.sleep(0.02)
+        time.sleep(0.3)
+        turned.set()
+        time.sleep(0.7)  # it waits by now
+        host.send_signal(number)
+        try:
+            text = host.communicate(timeout=HANGS)[1].decode(errors="replace")
+            failure = "" if host.returncode in (0, 1, 128 + number) else f"status {host.returncode}: {text[:200]}"
+        except subprocess.TimeoutExpired:
+            failure = f"still running after {HANGS} s"
+            host.kill()
+        check(f"{command}, {number.name}, {'a byte now and then' if trickles else 'silence'}", failure)
+    simulated.terminate()
+    simulated.wait()
 
 
 def hostile_files():
@@ -217,7 +277,7 @@ def attack_by_descriptors():
 
 def main():
     try:
-        for attack in (attack_by_servers, attack_by_files, attack_by_recordings, attack_by_folders, attack_by_kill,
+        for attack in (attack_by_servers, attack_by_servers_that_turn, attack_by_files, attack_by_recordings, attack_by_folders, attack_by_kill,
                        attack_by_descriptors):
             before, begin = len(results), time.monotonic()
             attack()
