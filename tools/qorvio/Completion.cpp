@@ -166,7 +166,7 @@ class Place {
     const std::string name = word.substr(0, word.find('='));
     Words words;
     for (const auto& [text, value] : signals().find(name, Direction::output).names)
-      words.push_back(name + "=" + text);
+      words.emplace_back(name).append("=").append(text);
     return words;
   }
 
@@ -186,7 +186,7 @@ std::vector<std::string> completions(const CLI::App& app, Settings settings, con
   words.pop_back();
   Place place(app, std::move(settings));
   for (const std::string& each : words) place.pass(each);
-  const Words candidates = place.candidates(word);
+  Words candidates = place.candidates(word);
   if (candidates == Words{fileNames}) return candidates;
   const std::size_t kept = word.find_last_of(wordBreaks) + 1;  // 0 without one
   Words offered;

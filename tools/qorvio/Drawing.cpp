@@ -41,13 +41,14 @@ std::string decimal(double number) {
 // Neither markup nor anything that XML does not allow.
 std::string escaped(const std::string& text) {
   std::string safe;
-  for (const char letter : printable(text))
+  for (const char letter : printable(text)) {
     safe += letter == '&'    ? "&amp;"
             : letter == '<'  ? "&lt;"
             : letter == '>'  ? "&gt;"
             : letter == '"'  ? "&quot;"
             : letter == '\'' ? "&apos;"
                              : std::string(1, letter);
+  }
   return safe;
 }
 
