@@ -23,6 +23,20 @@ std::vector<std::string> split(std::string_view text, char separator) {
   return parts;
 }
 
+std::string grown(std::string_view text) {
+  std::string all;
+  for (const std::string& line : split(text, '\n')) {
+    const std::size_t blank = line.find(' ');
+    if (line.empty() || line[0] != '~' || blank == line.npos) {
+      all += line + '\n';
+      continue;
+    }
+    for (unsigned long i = std::strtoul(&line[1], nullptr, 10); i > 0 && all.size() < (256 << 10); --i)
+      all.append(line, blank + 1);
+  }
+  return all;
+}
+
 extern "C" int LLVMFuzzerTestOneInput(const unsigned char* data, std::size_t size) {
   fuzz({reinterpret_cast<const char*>(data), size});
   return 0;

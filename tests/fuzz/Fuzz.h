@@ -12,6 +12,9 @@ void fuzz(std::string_view input);
 /// Prints `what` and aborts, unless the condition is true.
 void require(bool condition, const std::string& what);
 
+/// The text, in which a line "~N TEXT" is N times TEXT, without an end of line: for large inputs, of 256 kB at most.
+std::string grown(std::string_view text);
+
 std::vector<std::string> split(std::string_view text, char separator);
 
 /// What the call throws, or an empty text.
