@@ -165,6 +165,12 @@ void OpenOcdServer::explain(const std::string& seen) {
   throw std::runtime_error(what + (said.empty() ? "" : "; it says: ") + said);
 }
 
+void OpenOcdServer::requireTrust() {
+  const std::string said = errors();
+  if (process_->text.find("Bypassing JTAG setup events due to errors") != std::string::npos)
+    throw std::runtime_error("openocd does not trust the chain; it says: " + said);
+}
+
 std::string OpenOcdServer::errors() {
   stream_.link().io.restart();
   stream_.link().io.poll();

@@ -25,6 +25,10 @@ class OpenOcdServer {
   /// The errors in its log or, without any, its last words.
   std::string errors();
 
+  /// Throws runtime_error, with those errors, when the server has found that the chain is not as its configuration says,
+  /// and uses it even so.
+  void requireTrust();
+
   /// After a failure of its stream that says `seen`: throws runtime_error with that, or that the server has ended, and
   /// errors().
   [[noreturn]] void explain(const std::string& seen);

@@ -191,19 +191,6 @@ std::string stepCommand(const std::vector<OpenOcdTap>& taps, const std::vector<W
   return "runtest " + std::to_string(scan.cycles);
 }
 
-// Errors and warnings only; muted again, as they are all the time.
-std::string examineCommand() {
-  return "debug_level 1\nset r [capture {catch {jtag arp_init}}]\ndebug_level -3\nset r";
-}
-
-void requireTrust(const std::string& said) {
-  if (said.find("Bypassing JTAG setup events due to errors") == said.npos) return;
-  std::string words;
-  std::istringstream lines(said);
-  for (std::string line; std::getline(lines, line);) words.append(words.empty() ? "" : "; ").append(line);
-  throw std::runtime_error("openocd does not trust the chain; it says: " + words);
-}
-
 // The server keeps the level itself, for all its clients.
 std::string muteLog() {
   return "if {![info exists ::qor_log_level]} {set ::qor_log_level [lindex [debug_level] 1]}\ndebug_level -3";

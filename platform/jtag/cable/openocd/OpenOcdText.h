@@ -36,12 +36,6 @@ void requireTaps(const std::vector<OpenOcdTap>& taps, const std::vector<DeviceEn
 std::string stepCommand(const std::vector<OpenOcdTap>& taps, const std::vector<WireDevice>& devices,
                         const Qor_Scan& scan);
 
-/// Has the server look at its chain anew, as when it started. Its result is what the server complains of.
-std::string examineCommand();
-
-/// Throws runtime_error, with the words of such a result, when the server does not trust its chain.
-void requireTrust(const std::string& said);
-
 /// Silence the server's log, which would get every answer, and give it back the level that it had. Clients may do both
 /// in any order: the last one restores the level.
 /// @{
