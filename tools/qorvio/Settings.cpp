@@ -28,7 +28,7 @@ void fillFromEnvironment(std::string& value, const char* variable) {
 // Empty when there is none.
 fs::path nearestFile() {
   std::error_code failed;
-  const fs::path name = "qorvio.toml";
+  fs::path name = "qorvio.toml";
   if (fs::exists(name, failed)) return name;
   for (fs::path folder = fs::current_path(failed); folder.has_relative_path();) {
     folder = folder.parent_path();
