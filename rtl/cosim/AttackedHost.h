@@ -24,16 +24,24 @@ class AttackedHost {
   using Bits = qorsim::Bits;
   static constexpr unsigned statusBits = 128;
 
-  AttackedHost(RandomScans& random, PinsChain& chain, std::size_t payloadBits, std::size_t recordBits)
-      : random_(random), chain_(chain), payloadBits_(payloadBits), recordBits_(recordBits) {
-    select();
-  }
+  /// `firstTag`: its upper 12 bits are this host's.
+  AttackedHost(RandomScans& random, PinsChain& chain, std::size_t payloadBits, std::size_t recordBits,
+               unsigned firstTag)
+      : random_(random),
+        chain_(chain),
+        payloadBits_(payloadBits),
+        recordBits_(recordBits),
+        writeTag_(firstTag),
+        readTag_(firstTag) {}
 
   /// One scan in so many is damaged; 0 for none.
   void setDamage(unsigned oneIn) { damage_ = oneIn; }
 
-  /// Called between the attempts of a call.
+  /// Called between the attempts of a call, and between the IR and the DR scan of each.
+  /// @{
   std::function<void()> between = [] {};
+  std::function<void()> interrupting = [] {};
+  /// @}
 
   bool synchronise() {
     const Bits nothing(payloadBits_, 0);
@@ -137,6 +145,9 @@ class AttackedHost {
   // Both lines may be damaged, but the host knows how many bits it wants.
   Bits played(Bits bits) {
     const std::size_t count = bits.size();
+    select();
+    interrupting();
+    if (damage_ != 0 && random_.oneIn(16)) otherSoftware();
     if (damages()) {
       const bool cut = random_.oneIn(6);
       damage(bits);
@@ -191,7 +202,6 @@ class AttackedHost {
     chain_.scanIr(ir, 0);
     Bits scan = random_.bits(1 + random_.below(200));
     chain_.scanDr(scan, pausePoint(random_, scan));
-    select();
   }
 
   RandomScans& random_;
@@ -199,7 +209,7 @@ class AttackedHost {
   std::size_t payloadBits_, recordBits_;
   unsigned damage_ = 0;
   unsigned room_ = 8;
-  unsigned writeTag_ = 0x1230, readTag_ = 0x1230;
+  unsigned writeTag_, readTag_;
   bool readFailed_ = false;
 };
 

@@ -1,7 +1,9 @@
 // Attacks a core whose design clock runs beside TCK, or stops, while its inputs move, its wires damage what passes and
-// other software scans. Always: no wrong value is taken for a right one, no output has a value that nobody wrote, no
-// activity is lost or invented, each pulse train is played once for a call that succeeds and at most once for one that
-// fails.
+// other software scans; with RIVAL another host, too, whose calls come between the attempts and the scans of the first
+// one's. Always: no wrong value is taken for a right one, no output has a value that nobody wrote, no activity is lost
+// (two hosts on good wires get all of it between them) or invented, each pulse train is played once for a call that
+// succeeds and at most once for one that fails.
+#include <algorithm>
 #include <cstdio>
 #include <cstdlib>
 
@@ -21,6 +23,7 @@ struct Write {
   Bits payload;
   bool succeeded;
   std::size_t begin, end;
+  unsigned started, ended;  // in the order of all that started and ended
 
   bool digit(std::size_t at) const { return payload[payloadBits - 1 - at] != 0; }
   bool marksAsync(unsigned i) const { return digit(width + steps * width + i); }
@@ -42,71 +45,131 @@ struct Write {
   }
 };
 
+// One host, and what has happened since it read.
+struct Reader {
+  AttackedHost host;
+  bool failed = false;
+  unsigned moved[2] = {}, movedBefore[2] = {};  // asynchronous, synchronous
+  Activity during[2] = {}, window[2] = {};      // window: since its last read that succeeded began
+};
+
 class Attack {
  public:
   Attack(unsigned seed, double rate) : random_(seed), rate_(rate) {
     core_.setRate(rate);
-    host_.between = [this] { chain_.idle(random_.below(100)); };
+    for (AttackedHost* each : {&host_, &rival_.host})
+      each->between = [this] { chain_.idle(random_.below(100)); };
     chain_.idle(200);
+    rival_.host.synchronise();
     host_.synchronise();
     const std::optional<Answer> status = host_.status();
     if (status) status_ = status->data;
+    if (RIVAL == 0) return;
+    host_.interrupting = [this] { rivalActs(); };
+    host_.between = [this] {
+      chain_.idle(random_.below(100));
+      rivalActs();
+    };
   }
 
   const char* round() {
-    host_.setDamage(random_.oneIn(2) ? 1 + random_.below(8) : 0);
-    if (const char* wrong = readRound()) return wrong;
-    return writeRound();
+    readRound();
+    if (wrong_ == nullptr) writeRound();
+    return wrong_;
   }
 
-  AttackedHost& host() { return host_; }
+  const AttackedHost& host() const { return host_; }
+  const AttackedHost& rival() const { return rival_.host; }
 
  private:
-  // Moves inputs during some reads, then reads until nothing can be under way.
-  const char* readRound() {
-    for (unsigned port = 0; port < 2; ++port) told_[port] = happened_[port] = {};
-    core_.setMoving(4u << 2 * random_.below(4));
-    for (unsigned i = 1 + random_.below(4); i > 0; --i) {
-      if (const char* wrong = read()) return wrong;
-      chain_.idle(random_.below(50));
-    }
-    core_.setMoving(0);
-    settle();
-    host_.setDamage(0);
-    if (const char* wrong = read()) return wrong;
-    if (failed_) return "a read fails on good wires";
-    for (unsigned port = 0; port < 2; ++port)
-      if (!happened_[port].within(told_[port])) return "activity is lost";
-    return nullptr;
+  void setDamage(unsigned oneIn) {
+    host_.setDamage(oneIn);
+    rival_.host.setDamage(oneIn);
+    damages_ = damages_ || oneIn != 0;
   }
 
-  const char* read() {
+  void drawDamage() {
+    damages_ = false;
+    setDamage(random_.oneIn(2) ? 1 + random_.below(8) : 0);
+  }
+
+  void wrong(const char* what) {
+    if (wrong_ == nullptr) wrong_ = what;
+  }
+
+  // A call of the other host, while the first one is in the middle of its own.
+  void rivalActs() {
+    if (rivalCalls_ == 0 || !random_.oneIn(6)) return;
+    const unsigned left = std::exchange(rivalCalls_, 0) - 1;
+    if (reads_) read(rival_);
+    if (!reads_) write(rival_.host);
+    rivalCalls_ = left;
+    ++rivalActed_;
+  }
+
+  // Moves inputs during some reads, then reads until nothing can be under way.
+  void readRound() {
+    drawDamage();
+    for (unsigned port = 0; port < 2; ++port) told_[port] = happened_[port] = {};
+    core_.setMoving(4u << 2 * random_.below(4));
+    rivalActed_ = 0;
+    reads_ = true;
+    for (unsigned i = 1 + random_.below(4); i > 0; --i) {
+      rivalCalls_ = 2;
+      readOrStop();
+      chain_.idle(random_.below(50));
+    }
+    rivalCalls_ = 0;
+    core_.setMoving(0);
+    settle();
+    const bool mayLose = damages_ && rivalActed_ > 0;  // what the one failed to get home, the other replaced
+    setDamage(0);
+    if (rivalActed_ > 0) readAtLast(rival_);
+    readAtLast(first_);
+    for (unsigned port = 0; port < 2 && !mayLose; ++port)
+      if (!happened_[port].within(told_[port])) wrong("activity is lost");
+  }
+
+  void readAtLast(Reader& reader) {
+    read(reader);
+    if (reader.failed) wrong("a read fails on good wires");
+  }
+
+  void readOrStop() {
     const bool stops = random_.oneIn(8) && core_.moving();
     if (stops) core_.setRateIn(random_.below(300), 0);
-    const std::optional<Answer> answer = host_.read();
-    if (stops && !stoppedStatusAnswers()) return "no status from a stopped clock";
+    read(first_);
+    if (stops && !stoppedStatusAnswers()) wrong("no status from a stopped clock");
     core_.setRate(rate_);
-    failed_ = !answer;
+  }
+
+  void read(Reader& reader) {
+    const std::optional<Answer> answer = reader.host.read();
+    reader.failed = !answer;
+    noteInputs();
     std::size_t end = recordBits;
-    const char* wrong = nullptr;
+    for (unsigned port = 0; port < 2; ++port) {
+      if (answer) judge(reader, *answer, port, end);
+      if (answer) reader.window[port] = {};
+      reader.window[port].add(std::exchange(reader.during[port], {}));
+      reader.movedBefore[port] = std::exchange(reader.moved[port], 0);
+    }
+  }
+
+  void noteInputs() {
     Port* const ports[] = {&core_.asyncIn, &core_.syncIn};
     for (unsigned port = 0; port < 2; ++port) {
       const unsigned moved = ports[port]->takeMoved();
-      const Activity during = ports[port]->takeHappened();
-      if (answer) {
-        const char* fault = judge(*answer, port, end, moved | movedBefore_[port], during);
-        if (fault != nullptr) wrong = fault;
+      const Activity happened = ports[port]->takeHappened();
+      happened_[port].add(happened);
+      for (Reader* each : {&first_, &rival_}) {
+        each->moved[port] |= moved;
+        each->during[port].add(happened);
       }
-      if (answer) window_[port] = {};
-      window_[port].add(during);
-      happened_[port].add(during);
-      movedBefore_[port] = moved;
     }
-    return wrong;
   }
 
-  const char* judge(const Answer& answer, unsigned port, std::size_t& end, unsigned moved,
-                    const Activity& during) {
+  void judge(const Reader& reader, const Answer& answer, unsigned port, std::size_t& end) {
     const unsigned pins = port == 0 ? core_.model().async_in : core_.model().sync_in;
     unsigned values = 0;
     Activity told;
@@ -115,65 +178,93 @@ class Attack {
       told.up |= unsigned{answer.data[end - 2]} << i;
       told.down |= unsigned{answer.data[end - 3]} << i;
     }
-    Activity allowed = window_[port];
-    allowed.add(during);
+    Activity allowed = reader.window[port];
+    allowed.add(reader.during[port]);
     if ((answer.flags & Answer::overlap) != 0) allowed.add(lastTold_[port]);
     lastTold_[port] = told;
     told_[port].add(told);
-    if (((values ^ pins) & ~moved) != 0) return "a value is wrong";
-    return told.within(allowed) ? nullptr : "activity is invented";
+    if (((values ^ pins) & ~(reader.moved[port] | reader.movedBefore[port])) != 0) wrong("a value is wrong");
+    if (!told.within(allowed)) wrong("activity is invented");
   }
 
   bool stoppedStatusAnswers() {
     core_.setRate(0);
-    host_.setDamage(0);
+    rivalCalls_ = 0;
+    setDamage(0);
     const std::optional<Answer> status = host_.status();
     return status && status->data == status_;
   }
 
   // Some writes, of which none waits for the one before it, and what they must have done.
-  const char* writeRound() {
-    host_.setDamage(random_.oneIn(2) ? 1 + random_.below(8) : 0);
+  void writeRound() {
+    drawDamage();
     settle();
     core_.takeSyncOuts();
     asyncBefore_ = core_.takeAsyncOuts().back();
     syncBefore_ = core_.model().sync_out;
     writes_.clear();
-    const unsigned long start = core_.clocks();
+    start_ = core_.clocks();
+    reads_ = false;
+    rivalCalls_ = 2;
     for (unsigned i = 1 + random_.below(3); i > 0; --i) {
-      Write write{random_.bits(payloadBits), false, core_.clocks() - start, 0};
-      if (random_.oneIn(4)) std::fill_n(write.payload.begin(), width, static_cast<unsigned char>(0));
       if (random_.oneIn(6)) core_.setRateIn(random_.below(800), random_.oneIn(2) ? 0 : rate_);
-      write.succeeded = host_.write(write.payload);
-      write.end = core_.clocks() - start;
-      writes_.push_back(write);
+      write(host_);
     }
+    rivalCalls_ = 0;
     core_.setRate(rate_);
     settle();
     asyncOuts_ = core_.takeAsyncOuts();
     syncOuts_ = core_.takeSyncOuts();
-    for (unsigned obeyed = 0; obeyed < 1u << writes_.size(); ++obeyed)
-      if (explains(obeyed)) return resynchronised();
-    return "outputs are wrong";
+    unsigned obeyed = 0;
+    while (obeyed < 1u << writes_.size() && !explains(obeyed)) ++obeyed;
+    if (obeyed == 1u << writes_.size()) wrong("outputs are wrong");
+    resynchronise();
   }
 
-  // After eight failed writes in a row a host takes another tag; this one makes sure of its own.
-  const char* resynchronised() {
-    host_.setDamage(0);
-    return host_.synchronise() ? nullptr : "no write goes through on good wires";
+  void write(AttackedHost& host) {
+    Write write{random_.bits(payloadBits), false, core_.clocks() - start_, 0, ++events_, 0};
+    if (random_.oneIn(4)) std::fill_n(write.payload.begin(), width, static_cast<unsigned char>(0));
+    write.succeeded = host.write(write.payload);
+    write.end = core_.clocks() - start_;
+    write.ended = ++events_;
+    writes_.push_back(write);
+  }
+
+  // After eight failed writes in a row a host takes another tag; these make sure of their own.
+  void resynchronise() {
+    setDamage(0);
+    for (AttackedHost* each : {&rival_.host, &host_})
+      if (!each->synchronise()) wrong("no write goes through on good wires");
   }
 
   bool explains(unsigned obeyed) const {
+    std::vector<const Write*> order;
+    for (std::size_t i = 0; i < writes_.size(); ++i) {
+      if ((obeyed >> i & 1) != 0)
+        order.push_back(&writes_[i]);
+      else if (writes_[i].succeeded)
+        return false;
+    }
+    do {
+      if (isPossible(order) && explains(order)) return true;
+    } while (std::next_permutation(order.begin(), order.end()));
+    return false;
+  }
+
+  static bool isPossible(const std::vector<const Write*>& order) {
+    for (auto each = order.begin(); each != order.end(); ++each)
+      for (auto before = order.begin(); before != each; ++before)
+        if ((*each)->ended < (*before)->started) return false;
+    return true;
+  }
+
+  bool explains(const std::vector<const Write*>& order) const {
     std::vector<unsigned> asyncOuts{asyncBefore_};
     std::vector<const Write*> trains;
-    for (std::size_t i = 0; i < writes_.size(); ++i) {
-      if ((obeyed >> i & 1) == 0) {
-        if (writes_[i].succeeded) return false;
-        continue;
-      }
-      const unsigned after = writes_[i].asyncAfter(asyncOuts.back());
+    for (const Write* each : order) {
+      const unsigned after = each->asyncAfter(asyncOuts.back());
       if (after != asyncOuts.back()) asyncOuts.push_back(after);
-      if (writes_[i].marksAnySync()) trains.push_back(&writes_[i]);
+      if (each->marksAnySync()) trains.push_back(each);
     }
     return asyncOuts == asyncOuts_ && plays(trains, 0, syncBefore_, 0);
   }
@@ -212,14 +303,18 @@ class Attack {
   double rate_;
   FreeCore<MODEL> core_{random_, EDGE_CAPTURE != 0};
   PinsChain chain_{core_};
-  AttackedHost host_{random_, chain_, payloadBits, recordBits};
+  Reader first_{{random_, chain_, payloadBits, recordBits, 0x1230}};
+  Reader rival_{{random_, chain_, payloadBits, recordBits, 0x4560}};
+  AttackedHost& host_ = first_.host;
   Bits status_;
+  const char* wrong_ = nullptr;
 
-  bool failed_ = false;
+  bool reads_ = false, damages_ = false;
+  unsigned rivalCalls_ = 0, rivalActed_ = 0;      // that may come yet, and that have come
   Activity told_[2], happened_[2], lastTold_[2];  // asynchronous, synchronous
-  Activity window_[2];                            // since the last read that succeeded began
-  unsigned movedBefore_[2] = {};
 
+  unsigned events_ = 0;
+  unsigned long start_ = 0;
   std::vector<Write> writes_;
   unsigned asyncBefore_ = 0, syncBefore_ = 0;
   std::vector<unsigned> asyncOuts_, syncOuts_;
@@ -240,6 +335,7 @@ int main(int argc, char** argv) {
         return 1;
       }
     for (const auto& [what, count] : attack.host().counts) counts[what] += count;
+    for (const auto& [what, count] : attack.rival().counts) counts[what] += count;
   }
   std::printf("%lu rounds at each of 7 clock rates:", rounds);
   for (const auto& [what, count] : counts) std::printf(" %lu %s,", count, what.c_str());
