@@ -1,6 +1,7 @@
 """Attacks on the command line: hostile servers, hostile files, folders of somebody else, killed processes, missing
-standard descriptors. usage: attack.py BIN, the folder of the built programs. Nothing may crash, hang, grow without
-limit, run a program or send control characters to the terminal.
+standard descriptors. usage: attack.py BIN [--valgrind], BIN the folder of the built programs. Nothing may crash, hang,
+grow without limit, run a program or send control characters to the terminal; nor err in its memory, says valgrind or a
+sanitizer.
 """
 import contextlib
 import itertools
@@ -21,9 +22,10 @@ from hostile_server import MODES
 
 HERE = pathlib.Path(__file__).resolve().parent
 BIN = pathlib.Path(sys.argv[1]).resolve()
-QORVIO = str(BIN / "qorvio")
-HANGS = 60             # seconds: whoever takes so long waits without end
-LARGEST = 600 * 1024   # KiB of memory; sanitizers take some 200 of them
+VALGRIND = ["valgrind", "-q", "--error-exitcode=99", "--leak-check=full"] if "--valgrind" in sys.argv else []
+QORVIO = [*VALGRIND, str(BIN / "qorvio")]
+HANGS = 180 if VALGRIND else 60  # seconds: whoever takes so long waits without end
+LARGEST = 600 * 1024             # KiB of memory; sanitizers take some 200 of them
 SCRATCH = pathlib.Path(tempfile.mkdtemp())
 results = []
 
@@ -38,7 +40,7 @@ def check(name, failure):
 def run(*arguments, cwd=SCRATCH, **options):
     environment = {**os.environ, "HOME": str(SCRATCH), "XDG_STATE_HOME": str(SCRATCH / "state")}
     environment.update(options.pop("env", {}))
-    return subprocess.run([QORVIO, *arguments], cwd=cwd, env=environment, capture_output=True, timeout=HANGS,
+    return subprocess.run([*QORVIO, *arguments], cwd=cwd, env=environment, capture_output=True, timeout=HANGS,
                           stdin=subprocess.DEVNULL, **options)
 
 
@@ -57,7 +59,7 @@ def misbehaviour(attempt, statuses):
         return f"control characters reach the terminal: {text[:200]!r}"
     if done.returncode != 0 and not text.startswith("qorvio: "):
         return f"no message: {text[:200]!r}"
-    if resource.getrusage(resource.RUSAGE_CHILDREN).ru_maxrss > LARGEST:
+    if not VALGRIND and resource.getrusage(resource.RUSAGE_CHILDREN).ru_maxrss > LARGEST:
         return f"took {resource.getrusage(resource.RUSAGE_CHILDREN).ru_maxrss} KiB"
     return ""
 
@@ -107,14 +109,14 @@ def catches(number, pid):
 
 def attack_by_servers_that_turn():
     """A server that falls silent while a command goes on: Ctrl-C ends the wait, though its own time is an hour."""
-    simulated = subprocess.Popen([QORVIO, "--json", "simulate"], stdout=subprocess.PIPE,
+    simulated = subprocess.Popen([*QORVIO, "--json", "simulate"], stdout=subprocess.PIPE,
                                  stderr=subprocess.DEVNULL)
     board = ("127.0.0.1", json.loads(simulated.stdout.readline())["port"])
     for command, number, trickles in itertools.product(
             ("record --for 1h --out turned.csv", "wait async_in_data==77 --timeout 1h", "watch", "events",
              "press async_out_data[0] --for 1s"), (signal.SIGINT, signal.SIGTERM), (False, True)):
         port, turned = turning(board, trickles)
-        host = subprocess.Popen([QORVIO, "--cable", f"rbb:127.0.0.1:{port}?timeout=3600", *command.split()],
+        host = subprocess.Popen([*QORVIO, "--cable", f"rbb:127.0.0.1:{port}?timeout=3600", *command.split()],
                                 cwd=SCRATCH, env={**os.environ, "XDG_STATE_HOME": str(SCRATCH / "state")},
                                 stdout=subprocess.DEVNULL, stderr=subprocess.PIPE, stdin=subprocess.DEVNULL)
         deadline = time.monotonic() + HANGS
@@ -126,7 +128,9 @@ def attack_by_servers_that_turn():
         host.send_signal(number)
         try:
             text = host.communicate(timeout=HANGS)[1].decode(errors="replace")
-            failure = "" if host.returncode in (0, 1, 128 + number) else f"status {host.returncode}: {text[:200]}"
+            # Of a program in valgrind it cannot be seen whether it catches signals already.
+            ends = (0, 1, 128 + number, -number if VALGRIND else 0)
+            failure = "" if host.returncode in ends else f"status {host.returncode}: {text[:200]}"
         except subprocess.TimeoutExpired:
             failure = f"still running after {HANGS} s"
             host.kill()
@@ -217,7 +221,7 @@ def attack_by_kill():
     """kill -9 of recordings: what is a second old is in the file."""
     for ending in ("vcd", "csv", "jsonl"):
         path = SCRATCH / f"killed.{ending}"
-        host = subprocess.Popen([QORVIO, "--cable", "sim:", "--quiet", "record", "--for", "1h", "--rate", "50", "--out", str(path)],
+        host = subprocess.Popen([*QORVIO, "--cable", "sim:", "--quiet", "record", "--for", "1h", "--rate", "50", "--out", str(path)],
                                 stdout=subprocess.DEVNULL, stderr=subprocess.DEVNULL)
         deadline = time.monotonic() + HANGS
         while (not path.exists() or path.stat().st_size == 0) and time.monotonic() < deadline:
@@ -231,7 +235,7 @@ def attack_by_kill():
     server.write_text(f"#!/bin/sh\necho $$ >{SCRATCH}/pid.new; mv {SCRATCH}/pid.new {SCRATCH}/pid\nexec cat >/dev/null\n")
     server.chmod(0o755)
     (SCRATCH / "mine.cfg").write_text("")
-    host = subprocess.Popen([QORVIO, "--cable", f"openocd:?config={SCRATCH}/mine.cfg&timeout=50", "scan"],
+    host = subprocess.Popen([*QORVIO, "--cable", f"openocd:?config={SCRATCH}/mine.cfg&timeout=50", "scan"],
                             env={**os.environ, "PATH": f"{server.parent}:{os.environ['PATH']}"},
                             stdout=subprocess.DEVNULL, stderr=subprocess.DEVNULL, stdin=subprocess.DEVNULL)
     deadline = time.monotonic() + HANGS
@@ -265,8 +269,8 @@ def attack_by_descriptors():
             redirect = " ".join(f"{fd}>&-" if fd else "0<&-" for fd in closed)
             port = board.getsockname()[1]
             try:
-                done = subprocess.run(["sh", "-c", f'exec "$0" --cable rbb:127.0.0.1:{port}?timeout=1 scan {redirect}',
-                                       QORVIO], timeout=HANGS, stdout=subprocess.DEVNULL, stderr=subprocess.DEVNULL)
+                done = subprocess.run(["sh", "-c", f'exec "$@" {redirect}', "sh", *QORVIO, "--cable",
+                                       f"rbb:127.0.0.1:{port}?timeout=1", "scan"], timeout=HANGS, stdout=subprocess.DEVNULL, stderr=subprocess.DEVNULL)
                 failure = f"crashed ({done.returncode})" if done.returncode < 0 or done.returncode > 2 else ""
             except subprocess.TimeoutExpired:
                 failure = "hangs"
