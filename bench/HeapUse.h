@@ -1,4 +1,4 @@
-// How much memory the program holds.
+// How much memory the program uses.
 #pragma once
 
 #include <cstddef>

@@ -49,7 +49,7 @@ void Qor_CoreList::removeCore(unsigned, Qor_Core**) {
 void Qor_CoreComm::getCoreStatus(unsigned, QOR_CORE_REF, QOR_CORE_INFO* info, Qor_ByteBuffer& word,
                                  unsigned) {
   *info = {0, 9, 10, 0, 0};
-  // The four widths stand 16 bits apart, from bit 60 on: in the middle of a byte.
+  // The four widths are 16 bits apart, from bit 60 on: in the middle of a byte.
   for (unsigned byte : {7U, 9U, 11U, 13U}) {
     word[byte] = static_cast<unsigned char>(word[byte] | bench::portWidth << 4);
     word[byte + 1] = static_cast<unsigned char>(bench::portWidth >> 4);

@@ -1,4 +1,4 @@
-// Stand-ins for sessions, core list and transport that cost nothing: what is left to measure is the library's
+// Replacements for sessions, core list and transport that cost nothing: what is left to measure is the library's
 // own work, conversions included.
 #pragma once
 

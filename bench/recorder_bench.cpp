@@ -15,7 +15,7 @@ namespace {
 
 namespace fs = std::filesystem;
 
-/// Design clocks a poll: 24, after which every bit is as before; or 3, after which every bit has changed.
+/// Design clocks per poll: 24, after which every bit is as before; or 3, after which every bit has changed.
 enum Bits : unsigned { staying, changing };
 constexpr unsigned tcksPerClock[] = {1, 8};
 constexpr const char* bitsNames[] = {"stay", "change"};

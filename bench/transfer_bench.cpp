@@ -33,7 +33,7 @@ class MeasuredCore {
     exchangesBefore_ = bench::exchanges;
   }
 
-  /// Tells the exchanges a call, the memory a port bit, and the time that `bits` take on the wire.
+  /// Reports the exchanges per call, the memory per port bit, and the time that `bits` take on the wire.
   void report(benchmark::State& state, double bits) const {
     const auto calls = static_cast<double>(state.iterations());
     state.counters["wire_us"] = bits / tckHertz * 1e6;

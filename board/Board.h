@@ -2,8 +2,8 @@
 /// A board, its cores and their signals by name: all that most hosts need.
 ///
 ///     qor::Board board("sim:", "lab.toml");
-///     board.write({{"leds", 0xA}, {"go", qor::pulse(3)}});  // one exchange a core
-///     const qor::Frame frame = board.read();                // one snapshot a core
+///     board.write({{"leds", 0xA}, {"go", qor::pulse(3)}});  // one exchange per core
+///     const qor::Frame frame = board.read();                // one snapshot per core
 ///     if (frame["ready"].rose()) ...
 ///     board.waitFor("state", "RUN", 2s);                    // throws what it saw last
 ///
@@ -71,7 +71,7 @@ class QORBOARD_API Board {
   /// The names of the file, and the whole ports of the cores.
   const SignalTable& signals() const { return *signals_; }
 
-  /// Gives outputs their values, in one exchange a core. Throws WrongUse, with nothing sent, and Failure.
+  /// Gives outputs their values, in one exchange per core. Throws WrongUse, with nothing sent, and Failure.
   /// @{
   void write(const std::vector<Drive>& drives) { give(assignmentsOf(drives, *signals_)); }
   void write(const std::string& output, const Value& value) { write({{output, value}}); }
@@ -88,7 +88,7 @@ class QORBOARD_API Board {
   /// Keeps now what outputs were given. Throws Failure.
   void rememberOutputs();
 
-  /// Reads all inputs, in one exchange a core. Its activity is that since the read before.
+  /// Reads all inputs, in one exchange per core. Its activity is that since the read before.
   Frame read();
 
   /// One of them.

@@ -1,7 +1,7 @@
 # Debian packages of the three components, for CPack. scripts/package configures such a build, and makes them.
 set(QORVIO_MAINTAINER "The QorVIO authors <authors@qorvio.invalid>" CACHE STRING "Who answers for the packages")
 set(release 1)
-set(about "A debug core inside an FPGA lends a host program virtual pins: inputs whose
+set(about "A debug core inside an FPGA has inputs and outputs for a host program: inputs whose
 values and activity it can watch, outputs that it can drive, over JTAG.")
 
 set(CPACK_GENERATOR DEB)
@@ -24,14 +24,14 @@ set(CPACK_DEBIAN_PACKAGE_SHLIBDEPS_PRIVATE_DIRS ${CMAKE_LIBRARY_OUTPUT_DIRECTORY
 set(CPACK_DEBIAN_LIBQORVIO_PACKAGE_CONTROL_EXTRA ${PROJECT_BINARY_DIR}/triggers ${PROJECT_BINARY_DIR}/shlibs)
 set(CPACK_COMPONENT_LIBQORVIO_DESCRIPTION "${about}
 
-This package holds the shared libraries, a simulated board among them.")
+This package contains the shared libraries, a simulated board among them.")
 
 set(CPACK_DEBIAN_LIBQORVIO-DEV_PACKAGE_NAME libqorvio-dev)
 set(CPACK_DEBIAN_LIBQORVIO-DEV_PACKAGE_SECTION libdevel)
 set(CPACK_DEBIAN_LIBQORVIO-DEV_PACKAGE_DEPENDS "libqorvio (= ${PROJECT_VERSION}-${release})")
 set(CPACK_COMPONENT_LIBQORVIO-DEV_DESCRIPTION "${about}
 
-This package holds the headers, and what CMake and pkg-config need.")
+This package contains the headers, and what CMake and pkg-config need.")
 
 set(CPACK_DEBIAN_QORVIO_PACKAGE_NAME qorvio)
 set(CPACK_DEBIAN_QORVIO_PACKAGE_SECTION electronics)
@@ -41,7 +41,7 @@ set(CPACK_DEBIAN_LIBQORVIO_PACKAGE_SUGGESTS "openocd")
 set(CPACK_DEBIAN_QORVIO_PACKAGE_DEPENDS "libqorvio (= ${PROJECT_VERSION}-${release})")
 set(CPACK_COMPONENT_QORVIO_DESCRIPTION "${about}
 
-This package holds the command line.")
+This package contains the command line.")
 
 file(WRITE ${PROJECT_BINARY_DIR}/triggers "activate-noawait ldconfig\n")
 set(shlibs "")

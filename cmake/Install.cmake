@@ -1,4 +1,4 @@
-# What `cmake --install` puts where. The tree can be moved: nothing in it holds an absolute path. Two components:
+# What `cmake --install` puts where. The tree can be moved: nothing in it contains an absolute path. Two components:
 # libqorvio to run a host program, libqorvio-dev to build one.
 include(GNUInstallDirs)
 include(CMakePackageConfigHelpers)

@@ -17,7 +17,7 @@ function(qor_shared_library target)
   endif()
 endfunction()
 
-# Include directories for users within this build; installed, every header stands in one folder.
+# Include directories for users within this build; installed, every header is in one folder.
 function(qor_include_directories target)
   list(TRANSFORM ARGN PREPEND ${PROJECT_SOURCE_DIR}/ OUTPUT_VARIABLE folders)
   target_include_directories(${target} PUBLIC "$<BUILD_INTERFACE:${folders}>")

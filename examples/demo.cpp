@@ -1,7 +1,7 @@
-// The main job, told as a story: what stands on the board, names for bits, values out and in, a pulse train,
+// A guided demo of the main job: what is on the board, names for bits, values out and in, a pulse train,
 // whole ports, samples, and a mistake. Ends with a nonzero status if any value is not what it should be.
 //
-//     demo [URL]        the demo board behind that cable; the simulated one when it is left out
+//     demo [URL]        the demo board at that cable; the simulated one when it is left out
 #include <cstdio>
 #include <exception>
 #include <string>
@@ -54,7 +54,7 @@ TextMap read(unsigned session) {
 }
 
 void showChain(unsigned session) {
-  std::printf("1. What stands on the chain\n");
+  std::printf("1. What is on the chain\n");
   std::vector<QorRT::Qor_Device> devices;
   QorJtag_session_getDevices(session, devices);
   for (unsigned device = 0; device < devices.size(); ++device) {
@@ -86,7 +86,7 @@ void showInformation(unsigned session) {
 
 void nameSignals(unsigned session) {
   std::printf(
-      "\n3. Names for its bits; the design behind it loops every output back to the input of the same "
+      "\n3. Names for its bits; its design loops every output back to the input of the same "
       "number\n");
   mustSucceed(QorVIO_initCore(session, loopbackCore));
   define(session, "leds", asyncOutput, {0, 1, 2, 3});
@@ -133,7 +133,7 @@ void readSamples(unsigned session) {
   std::printf("\n7. Four samples of a 16-bit counter in the second device, by array\n");
   mustSucceed(QorVIO_initCore(session, counterCore));
   auto* core = dynamic_cast<QorRT::QorVIO_Core*>(QorRT::Qor_CoreList::getCore(session, counterCore));
-  unsigned char bytes[4 * 2] = {};  // two bytes a sample, the lower one first
+  unsigned char bytes[4 * 2] = {};  // two bytes per sample, the lower one first
   unsigned char* values[] = {bytes};
   unsigned sizes[] = {sizeof bytes};
   {
@@ -159,7 +159,7 @@ void makeAMistake(unsigned session) {
   QorJtag_session_setMessageHandler(session, nullptr);
 }
 
-// A board behind a server is as the last host left it.
+// A board at a server is as the last host left it.
 void startFromZero(unsigned session) {
   mustSucceed(write(session, {{"async_out_data", "00"}, {"sync_out_data", "00"}}));
   read(session);

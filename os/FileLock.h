@@ -6,11 +6,11 @@
 
 namespace os {
 
-/// Held from its construction to its end, and released when the process ends, however it ends.
+/// Kept from its construction to its end, and released when the process ends, however it ends.
 class FileLock {
  public:
   /// Makes the file when there is none, and leaves it there; its folder must exist. A symbolic link is not followed.
-  /// Throws std::system_error: std::errc::timed_out when another process has held the lock all the time.
+  /// Throws std::system_error: std::errc::timed_out when another process has kept the lock all the time.
   FileLock(const std::string& path, std::chrono::milliseconds timeout);
   FileLock(const FileLock&) = delete;
   FileLock& operator=(const FileLock&) = delete;

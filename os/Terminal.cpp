@@ -32,7 +32,7 @@ Key nextByte(milliseconds wait) {
   return count < 0 && errno == EINTR ? noKey : endOfKeys;
 }
 
-// What the terminal sends behind ESC for the keys that send more than a character.
+// What the terminal sends after ESC for the keys that send more than a character.
 Key keyOf(const std::string& sequence) {
   constexpr std::pair<const char*, Key> keys[] = {{"[A", keyUp},   {"OA", keyUp},      {"[B", keyDown},
                                                   {"OB", keyDown}, {"[5~", keyPageUp}, {"[6~", keyPageDown},

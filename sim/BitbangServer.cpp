@@ -73,13 +73,13 @@ BitbangServer::~BitbangServer() {
 }
 
 void BitbangServer::serve(const std::function<bool()>& stop,
-                          const std::function<void(const std::string&)>& tell) {
+                          const std::function<void(const std::string&)>& report) {
   short found = 0;
   while (awaitEvents(listener_, POLLIN, found, stop)) {
     const int socket = acceptClient(listener_);
     if (socket < 0) continue;
     const std::string reason = serveClient(socket, stop);
-    if (!reason.empty() && tell) tell(reason);
+    if (!reason.empty() && report) report(reason);
   }
 }
 

@@ -37,9 +37,9 @@ class QOR_API BitbangServer {
 
   /// Serves until `stop`, which is asked several times a second and after each signal, says so. Clients that come
   /// meanwhile wait for the one before to leave; when that is silent for the idle limit while another one waits,
-  /// its connection is closed. `tell`, unless it is empty, hears why a connection was closed from this end. Throws
-  /// what `pins`, `stop` and `tell` throw, and runtime_error when the network fails.
-  void serve(const std::function<bool()>& stop, const std::function<void(const std::string&)>& tell = {});
+  /// its connection is closed. `report`, unless it is empty, is given why a connection was closed from this end. Throws
+  /// what `pins`, `stop` and `report` throw, and runtime_error when the network fails.
+  void serve(const std::function<bool()>& stop, const std::function<void(const std::string&)>& report = {});
 
  private:
   std::string serveClient(int socket, const std::function<bool()>& stop);

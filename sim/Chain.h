@@ -9,7 +9,7 @@ namespace qorsim {
 
 /// The design clock ticks once for every `tcksPerClock` TCKs in Run-Test/Idle, and in Shift-DR from the end of a
 /// frame to the bit of the answer that ends the wait, so that the same steps always give the same bits, and wide
-/// cores cost no more clocks than narrow ones. With 0 it stands still.
+/// cores cost no more clocks than narrow ones. With 0 it stops.
 class Chain {
  public:
   explicit Chain(unsigned tcksPerClock) : tcksPerClock_(tcksPerClock) {}

@@ -43,7 +43,7 @@ class Core {
   /// Whether the answer to this code waits for the design clock.
   virtual bool waits(unsigned /*code*/) const { return false; }
 
-  /// Whether the answer to this code may tell activity that an earlier one told.
+  /// Whether the answer to this code may report activity that an earlier one reported.
   virtual bool repeats(unsigned /*code*/) const { return false; }
 
   /// The data of an answer, least significant bit first.

@@ -73,10 +73,10 @@ QOR_API Fault flipCaptured(std::size_t bit, unsigned pattern = 1);
 QOR_API Fault flipSent(std::size_t bit, unsigned pattern = 1);
 /// @}
 
-/// The captured bit is lost: those behind it move up.
+/// The captured bit is lost: those after it move up.
 QOR_API Fault loseCaptured(std::size_t bit);
 
-/// The captured bit comes twice: those behind it move down, and the last one is lost.
+/// The captured bit comes twice: those after it move down, and the last one is lost.
 QOR_API Fault doubleCaptured(std::size_t bit);
 
 /// The chip misses the TCK of the bit: its scan is one bit shorter.

@@ -13,7 +13,7 @@ class Hub {
  public:
   static constexpr unsigned coreCount = 16;
 
-  /// Puts a core behind the hub, at an index that is free.
+  /// Adds a core to the hub, at an index that is free.
   void add(unsigned index, std::unique_ptr<Core> core);
 
   /// A TCK in Capture-DR.

@@ -37,8 +37,8 @@ class InputPort {
   Bits pins_;
   Bits glitches_;
   Bits sampled_;
-  Bits live_;       // flags, one element an input
-  Bits delivered_;  // flags and the value, one element an input
+  Bits live_;       // flags, one element per input
+  Bits delivered_;  // flags and the value, one element per input
 };
 
 }  // namespace qorsim

@@ -15,14 +15,14 @@ class PulseTrains {
 
   explicit PulseTrains(unsigned width) : trains_(width), values_(width) {}
 
-  /// Keeps new trains, `steps` digits an output, for the outputs whose mask digit is 1; the others hold their
+  /// Keeps new trains, `steps` digits an output, for the outputs whose mask digit is 1; the others keep their
   /// values. Not while busy().
   void stage(Bits::const_reverse_iterator trains, Bits::const_reverse_iterator mask);
 
   /// Whether trains wait for the design clock, or their last step is still to come.
   bool busy() const { return nextStep_ < steps; }
 
-  /// One design clock: the next step of the trains, whose last one is held.
+  /// One design clock: the next step of the trains, whose last one stays.
   void clock();
 
   PortBits<const unsigned char> values() const { return {values_.data(), values_.size()}; }

@@ -1,4 +1,4 @@
-// What stands between TDI and TDO of one device that has no user register selected.
+// What is between TDI and TDO of one device that has no user register selected.
 #pragma once
 
 #include <utility>
@@ -7,7 +7,7 @@
 
 namespace qorsim {
 
-/// Of the length of what was captured: what goes in comes out behind it. Without any bits it delivers zeros.
+/// Of the length of what was captured: what goes in comes out after it. Without any bits it delivers zeros.
 class ShiftRegister {
  public:
   /// Bits in the order in which they come out.

@@ -29,7 +29,7 @@
 
 namespace qorsim {
 
-/// One core: widths in bits, numbers as its status word tells them. Nothing is checked before the core is put
+/// One core: widths in bits, numbers as its status word gives them. Nothing is checked before the core is put
 /// on a board.
 class QOR_API CoreSpec {
  public:
@@ -45,7 +45,7 @@ class QOR_API CoreSpec {
   /// @}
 
   /// The core version, 10.0 when it is not set. Versions before 10.0 have an older status word; before 6.2
-  /// that tells no port wider than 255 bits.
+  /// that knows no port wider than 255 bits.
   CoreSpec& version(unsigned major, unsigned minor);
   /// 0, and hexadecimal 51, when they are not set.
   /// @{
@@ -56,7 +56,7 @@ class QOR_API CoreSpec {
   /// Of versions from 10.0 on only; 1.0.0 when it is not set.
   CoreSpec& cgVersion(unsigned major, unsigned minor, unsigned minorAlpha);
 
-  /// What stands behind the ports; nothing, as idle(), when it is not set.
+  /// What the ports are connected to; nothing, as idle(), when it is not set.
   CoreSpec& design(std::shared_ptr<Design> design);
 
   /// What has been said so far.
@@ -88,7 +88,7 @@ class QOR_API ChainBuilder {
   /// in the IR, whose length is set before, and is not all ones.
   ChainBuilder& userOpcodes(const std::vector<unsigned>& opcodes);
 
-  /// A core behind user chain 1 to 4 of the device, at an index of 0 to 15.
+  /// A core at user chain 1 to 4 of the device, at an index of 0 to 15.
   ChainBuilder& core(unsigned userChain, unsigned index, const CoreSpec& core);
 
   /// The user registers of the device pass TDI to their hubs, and what their hubs deliver to TDO, so many TCKs late:
@@ -99,7 +99,7 @@ class QOR_API ChainBuilder {
   /// @}
 
   /// The design clock of all cores ticks once in so many of the TCKs that count, see SimCable: 1 when it is not set;
-  /// with 0 it stands still.
+  /// with 0 it stops.
   ChainBuilder& tcksPerClock(unsigned tcks);
 
   /// The cable to the board, powered up.
@@ -133,7 +133,7 @@ class QOR_API ChainBuilder {
 /// A board without devices.
 QOR_API ChainBuilder chain();
 
-/// The board behind "sim:".
+/// The board of "sim:".
 ///
 /// | Device | IDCODE   | Name | IR | User chain | Core | What it is                                        |
 /// |--------|----------|------|----|------------|------|---------------------------------------------------|

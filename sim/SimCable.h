@@ -20,7 +20,7 @@ class Chain;
 /// queue always gives the same bits.
 class QOR_API SimCable : public QorRT::Qor_Cable {
  public:
-  /// `devices` says what stands on the chain. The builder in Sim.h makes both.
+  /// `devices` says what is on the chain. The builder in Sim.h makes both.
   SimCable(std::vector<QorRT::Qor_Device> devices, std::unique_ptr<Chain> chain);
   ~SimCable() override;
 

@@ -9,7 +9,7 @@
 
 namespace qorsim {
 
-/// The cg version, which status words tell from core version 10.0 on.
+/// The cg version, which status words contain from core version 10.0 on.
 struct CgVersion {
   unsigned major;       ///< 4 bits
   unsigned minor;       ///< 8 bits

@@ -1,5 +1,5 @@
 /// @file
-/// The design behind a simulated VIO core: what drives its inputs and uses its outputs.
+/// The design around a simulated VIO core: what drives its inputs and uses its outputs.
 #pragma once
 
 #include <cstddef>
@@ -64,7 +64,7 @@ struct Ports {
   /// @}
 };
 
-/// What stands behind a core. What it throws comes out of the flush() that ran the clock.
+/// What a core is connected to. What it throws comes out of the flush() that ran the clock.
 class QOR_API Design {
  public:
   virtual ~Design();

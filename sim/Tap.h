@@ -34,7 +34,7 @@ class Tap {
   /// The instruction that selects a user register, or that of BYPASS when it has no such register.
   std::uint32_t userOpcode(unsigned userChain) const;
 
-  /// The hub behind a user chain, which appears when it is first asked for. A user register without a hub
+  /// The hub of a user chain, which appears when it is first asked for. A user register without a hub
   /// delivers zeros.
   Hub& hub(unsigned userChain);
 

@@ -1,4 +1,4 @@
-// The VIO core and the design behind it.
+// The VIO core and the design around it.
 #pragma once
 
 #include <memory>

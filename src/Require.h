@@ -5,7 +5,7 @@
 
 namespace QorRT {
 
-/// Throws logic_error with the text unless the condition holds.
+/// Throws logic_error with the text unless the condition is true.
 inline void require(bool condition, const char* text) {
   if (!condition) throw std::logic_error(text);
 }

@@ -28,7 +28,7 @@ inline Pulse pulse(unsigned width = 1, unsigned at = 0) {
   return {width, at};
 }
 
-/// Up to 16 values of a synchronous output, one a clock of the design; the last one stays.
+/// Up to 16 values of a synchronous output, one per clock of the design; the last one stays.
 struct Train {
   std::vector<Value> values;
 };

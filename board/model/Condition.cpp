@@ -23,7 +23,7 @@ constexpr const char* relationTexts[] = {"==", "!=", "<", ">", "<=", ">="};
 constexpr const char* edgeTexts[] = {"rises", "falls", "moves"};
 
 template <class Number>
-bool holds(Relation relation, Number a, Number b) {
+bool relates(Relation relation, Number a, Number b) {
   switch (relation) {
     case Relation::equal:
       return a == b;
@@ -67,7 +67,7 @@ class Comparison : public Node {
 
   bool isTrue(const std::vector<Sample>& samples) const override {
     const Bytes& image = samples[signal_.core].values(signal_.port);
-    return holds(relation_, signal_.width() <= 64 ? orderOfNumber(image) : orderOfWide(image), 0);
+    return relates(relation_, signal_.width() <= 64 ? orderOfNumber(image) : orderOfWide(image), 0);
   }
 
  private:

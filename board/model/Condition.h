@@ -41,7 +41,7 @@ class QORBOARD_API Condition {
   friend QORBOARD_API Condition operator!(const Condition& a);
   /// @}
 
-  /// Whether it is true of the samples, one a core of the table. Allocates nothing, but for values of more than 64 bits.
+  /// Whether it is true of the samples, one per core of the table. Allocates nothing, but for values of more than 64 bits.
   bool isTrue(const std::vector<Sample>& samples) const;
 
   /// The inputs that it looks at, each once, in order.

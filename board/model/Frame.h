@@ -71,10 +71,10 @@ class QORBOARD_API Reading {
   Activity activity_;
 };
 
-/// One snapshot a core, and its activity since the frame before. Independent of the board that it came from.
+/// One snapshot per core, and its activity since the frame before. Independent of the board that it came from.
 class QORBOARD_API Frame {
  public:
-  /// `samples` has one element a core of the table.
+  /// `samples` has one element per core of the table.
   Frame(std::shared_ptr<const SignalTable> signals, std::vector<Sample> samples)
       : signals_(std::move(signals)), samples_(std::move(samples)) {}
 

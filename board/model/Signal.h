@@ -40,7 +40,7 @@ QORBOARD_API const char* radixName(Radix radix);
 /// Throws WrongUse.
 QORBOARD_API Radix radixNamed(std::string_view text);
 
-/// A synchronous output plays so many steps, one a clock of the design.
+/// A synchronous output plays so many steps, one per clock of the design.
 constexpr unsigned stepCount = 16;
 
 struct Signal {

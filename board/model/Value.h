@@ -6,7 +6,7 @@
 ///  1. A value is a little-endian bit array of its signal's width; bits above the width are 0.
 ///  2. Of a signal with a scale a plain number is in its unit ("3.5", 3.5, "3.5 dB"); it becomes the nearest step. Without
 ///     a scale it is the number that the bits make.
-///  3. Behind 0x, 0b and 0d the digits are the bits themselves, whatever the scale.
+///  3. After 0x, 0b and 0d the digits are the bits themselves, whatever the scale.
 #pragma once
 
 #include <optional>

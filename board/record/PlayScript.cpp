@@ -22,7 +22,7 @@ std::string trimmed(const std::string& text) {
   return first == text.npos ? "" : text.substr(first, last - first + 1);
 }
 
-// Fields of a line; one may stand in double quotes, with two of them for one.
+// Fields of a line; one may be in double quotes, with two of them for one.
 Fields fieldsOf(std::string_view line) {
   Fields fields(1);
   bool quoted = false;

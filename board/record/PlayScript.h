@@ -16,7 +16,7 @@ struct PlayScript {
   std::vector<Signal> signals;           ///< one a column of values
   std::vector<std::vector<Bytes>> rows;  ///< one value a signal
   std::vector<std::chrono::nanoseconds>
-      times;  ///< one a row, from the start on, never falling; or none at all
+      times;  ///< one per row, from the start on, never falling; or none at all
 
   bool hasTimes() const { return !times.empty(); }
 };

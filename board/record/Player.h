@@ -19,8 +19,8 @@ struct Played {
   std::size_t late = 0;  ///< rows that were due before the row above them was done
 };
 
-/// Gives the outputs row after row: at the script's own times, else one a period, else as fast as the cable goes; then
-/// synchronous outputs alone play 16 rows an exchange, a row a clock of the design. `stop` ends it between two rows.
+/// Gives the outputs row after row: at the script's own times, else one per period, else as fast as the cable goes; then
+/// synchronous outputs alone play 16 rows per exchange, a row per clock of the design. `stop` ends it between two rows.
 /// Throws WrongUse for a script with times and a period that is not 0, and Failure.
 QORBOARD_API Played play(Board& board, const PlayScript& script, std::chrono::nanoseconds period = {},
                          const StopFunction& stop = {});

@@ -13,7 +13,7 @@ constexpr Image valueImages[] = {&Sample::asyncIn, &Sample::syncIn};
 constexpr Image flagImages[] = {&Sample::asyncUp,  &Sample::asyncDown,  &Sample::syncUp,
                                 &Sample::syncDown, &Sample::syncSyncUp, &Sample::syncSyncDown};
 
-// Eight bytes of an image, fewer at its end; bit i of the word is bit i of the image behind `byte`.
+// Eight bytes of an image, fewer at its end; bit i of the word is bit i of the image from `byte` on.
 std::uint64_t wordAt(const Bytes& image, std::size_t byte) {
   std::uint64_t word = 0;
   if (image.size() - byte >= sizeof word) {

@@ -66,7 +66,7 @@ class QORBOARD_API Subscription {
 
   const std::vector<Signal>& inputs() const { return inputs_; }
 
-  /// The newest values, and what moved since the look before; one element a core, empty for cores that it does not look
+  /// The newest values, and what moved since the look before; one element per core, empty for cores that it does not look
   /// at. Allocates nothing. Valid until the next look.
   const std::vector<Sample>& look();
 
@@ -102,7 +102,7 @@ class QORBOARD_API Subscription {
   std::vector<std::size_t> cores_;
   std::vector<Sample> pending_, taken_;
   std::vector<unsigned char> isFresh_;  // of a core: nothing was read since the look
-  std::vector<BitIndex> indexes_;       // two a core: async, sync
+  std::vector<BitIndex> indexes_;       // two per core: async, sync
   unsigned looks_ = 0;                  // no more than two are counted
   std::vector<std::size_t> marked_;
   std::vector<unsigned char> isMarked_;

@@ -47,11 +47,11 @@ QORBOARD_API Recorded recordTo(const std::string& path, Poller& poller, const st
 struct SampledInput {
   std::size_t bytesEach;             ///< of a value
   Bytes values;                      ///< as many values as there are samples
-  std::vector<unsigned char> moves;  ///< one a sample: 1 rose, 2 fell, 4 sync rose, 8 sync fell, added
+  std::vector<unsigned char> moves;  ///< one per sample: 1 rose, 2 fell, 4 sync rose, 8 sync fell, added
 };
 
 struct Samples {
-  std::vector<std::int64_t> nanoseconds;  ///< since the recording began, one a sample
+  std::vector<std::int64_t> nanoseconds;  ///< since the recording began, one per sample
   std::vector<std::uint64_t> missed;      ///< polls that were missed before the sample
   std::vector<SampledInput> inputs;
 };

@@ -1,4 +1,4 @@
-// CSV and JSON lines: one line a poll, with every value. A value's digits are made only when it changes.
+// CSV and JSON lines: one line per poll, with every value. A value's digits are made only when it changes.
 #include <algorithm>
 
 #include <nlohmann/json.hpp>
@@ -36,7 +36,7 @@ bool isShownInDigits(const Signal& signal) {
 // A line's cells, kept as one text from poll to poll: a cell that changes and keeps its length is changed in place.
 class Row {
  public:
-  /// `key` stands before the cell.
+  /// `key` goes before the cell.
   void add(std::string key) { cells_.push_back({std::move(key), {}, 0}); }
 
   void set(std::size_t i, const std::string& text) {

@@ -16,11 +16,11 @@ namespace qor {
 struct Poll {
   std::uint64_t nanoseconds;         ///< since the recording began
   std::uint64_t missed;              ///< polls that should have been between this one and the one before
-  const std::vector<Bytes>& values;  ///< one a signal
+  const std::vector<Bytes>& values;  ///< one per signal
   const std::vector<std::size_t>& changed;  ///< the signals that differ from the poll before; at first all
   const std::vector<unsigned char>& moved;  ///< 1 for a signal with activity since the poll before
   const std::vector<std::size_t>& movedOtherwise;  ///< the signals whose `moved` differs from the poll before
-  const std::vector<Sample>& samples;              ///< one a core
+  const std::vector<Sample>& samples;              ///< one per core
 };
 
 class QORBOARD_API SampleWriter {

@@ -1,4 +1,4 @@
-// Value change dumps: one variable a signal; one "moved" bit a signal, for activity between polls; a count of missed
+// Value change dumps: one variable per signal; one "moved" bit per signal, for activity between polls; a count of missed
 // polls, unknown (x) from the poll before them to the poll after.
 #include <algorithm>
 

@@ -13,7 +13,7 @@ std::string lowered(std::string_view text) {
   return small;
 }
 
-// The value of an option, "config=FILE" behind ? or &.
+// The value of an option, "config=FILE" after ? or &.
 std::string option(std::string_view options, std::string_view key) {
   while (!options.empty()) {
     const std::string_view each = options.substr(0, options.find('&'));

@@ -38,7 +38,7 @@ class LineReader {
     return field_ = rest_;
   }
 
-  /// Refuses the field that was read last, unless the condition holds.
+  /// Refuses the field that was read last, unless the condition is true.
   void require(bool condition) const {
     if (!condition) refuse();
   }

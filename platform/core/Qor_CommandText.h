@@ -25,7 +25,7 @@ struct Qor_PortCommand {
   std::size_t resultBytes() const;
 };
 
-/// The pairs of a text in their order. Throws logic_error with the line, the field and what stands there,
+/// The pairs of a text in their order. Throws logic_error with the line, the field and what is there,
 /// such as "command text line 2, code: 07".
 std::vector<Qor_PortCommand> parseCommandText(std::string_view text);
 

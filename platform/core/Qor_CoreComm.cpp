@@ -45,7 +45,7 @@ void requireResult(const std::vector<Qor_PortCommand>& commands, const unsigned 
     throw std::logic_error("the result of a command text that reads is null");
 }
 
-/// Tells the callback the session, how many pairs of lines are done, and of how many.
+/// Reports to the callback the session, how many pairs of lines are done, and of how many.
 void report(QOR_PROGRESS_CALLBACK progress, unsigned session, std::size_t done, std::size_t count) {
   if (progress == nullptr) return;
   const auto status = done == count ? QOR_PROGRESS_DONE : QOR_PROGRESS_RUNNING;
@@ -54,7 +54,7 @@ void report(QOR_PROGRESS_CALLBACK progress, unsigned session, std::size_t done, 
 }
 
 /// The reads of one text. The activity that each takes out of the inputs is owed from before its scan until its bits
-/// are with the caller, so that whatever goes wrong between makes the next read tell it again.
+/// are with the caller, so that whatever goes wrong between makes the next read report it again.
 class Reads {
  public:
   /// True when an earlier text owes the activity of a read, and this one has not read the core yet.
@@ -103,7 +103,7 @@ void Qor_CoreComm::getCoreStatus(unsigned session, QOR_CORE_REF coreRef, QOR_COR
   readStatus(session, coreRef, coreInfo, statusWord.uPtr(), bits);
 }
 
-// Progress is told before each pair of lines and after the last one. An abort at any of these points throws
+// Progress is reported before each pair of lines and after the last one. An abort at any of these points throws
 // with the result as it was; what was written until then stays written.
 void Qor_CoreComm::commandSequence(unsigned session, const std::string& text, unsigned char* result,
                                    unsigned resultBitCount, QOR_PROGRESS_CALLBACK progress) {

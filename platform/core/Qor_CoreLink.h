@@ -32,7 +32,7 @@ class Qor_CallTags {
   unsigned failures_ = 0;
 };
 
-/// How far the design clock is behind TCK, learned from one transfer for the next of its kind.
+/// How much slower than TCK the design clock is, learned from one transfer for the next of its kind.
 class Qor_WaitingRoom {
  public:
   explicit Qor_WaitingRoom(std::size_t least) : least_(least), room_(least) {}

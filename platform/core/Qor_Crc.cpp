@@ -37,7 +37,7 @@ constexpr Tables tables = makeTables();
 void Qor_Crc32::add(const unsigned char* bytes, std::size_t bitCount) noexcept {
   std::uint32_t crc = register_;
   std::size_t left = bitCount;
-  // Eight bytes a step: their table look-ups do not wait for each other, as those of single bytes do.
+  // Eight bytes per step: their table look-ups do not wait for each other, as those of single bytes do.
   for (; left >= 64; left -= 64, bytes += 8) {
     crc = tables[7][bytes[0] ^ (crc & 0xFF)] ^ tables[6][bytes[1] ^ (crc >> 8 & 0xFF)] ^
           tables[5][bytes[2] ^ (crc >> 16 & 0xFF)] ^ tables[4][bytes[3] ^ crc >> 24] ^ tables[3][bytes[4]] ^

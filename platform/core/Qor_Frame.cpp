@@ -95,8 +95,8 @@ Qor_Answer Qor_Frame::judgeAt(const Qor_Capture& capture, std::size_t headAt, Qo
   answer.bits = copyBits(capture.bits, dataAt, dataBits + resultCrcBits);
   addNumber(crc, answer.head, headBits);
   crc.add(answer.bits.data(), dataBits);
-  const bool holds = bitsAt(capture.bits, dataAt + dataBits, crcBits) == crc.value();
-  answer.verdict = holds ? Qor_Verdict::good : Qor_Verdict::badCrc;
+  const bool isRight = bitsAt(capture.bits, dataAt + dataBits, crcBits) == crc.value();
+  answer.verdict = isRight ? Qor_Verdict::good : Qor_Verdict::badCrc;
   return answer;
 }
 

@@ -88,7 +88,7 @@ class Qor_Frame {
   Qor_Crc32 afterHeader_, afterPayload_;
 };
 
-/// Where a hub's first bit, which is 1, stands in its scan: 0 to 2; 3 when it does not.
+/// Where a hub's first bit, which is 1, is in its scan: 0 to 2; 3 when it does not.
 std::size_t findHello(const Qor_Bytes& bits);
 
 /// What is wrong, in words.

@@ -85,7 +85,7 @@ void Qor_HubAccess::write(const Qor_Bytes& payload, std::size_t bitCount, bool p
   }
 }
 
-// A write that marks no output. Only a hub that has obeyed one of our tags can tell whether a repeat was obeyed before.
+// A write that marks no output. Only a hub that has obeyed one of our tags knows whether a repeat was obeyed before.
 void Qor_HubAccess::introduce(std::size_t payloadBits) {
   const Qor_Bytes nothing(byteCount(payloadBits));
   const Qor_Answer answer =

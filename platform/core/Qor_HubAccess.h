@@ -24,7 +24,7 @@ struct Qor_ReadResult {
   unsigned flags;
 };
 
-/// One core behind a debug hub. A transfer that comes back damaged is repeated, at most three times; one that waits
+/// One core of a debug hub. A transfer that comes back damaged is repeated, at most three times; one that waits
 /// for the design clock with more room or time, for two seconds. The hub knows a repeat by its tag: a write is done
 /// once, and a record is delivered again. They throw Qor_NoHub, or runtime_error with the address and what was seen at
 /// each attempt; what they queued is dropped in any case.
@@ -37,7 +37,7 @@ class Qor_HubAccess {
   /// TDI and TDO are.
   bool readStatus(Qor_StatusWord& word);
 
-  /// `payload` holds `bitCount` bits; those beyond them are 0. `playsTrains`: it marks synchronous outputs.
+  /// `payload` contains `bitCount` bits; those beyond them are 0. `playsTrains`: it marks synchronous outputs.
   void write(const Qor_Bytes& payload, std::size_t bitCount, bool playsTrains);
 
   /// `recordBits` is the number of bits that the core's inputs take. `keepActivity`: an earlier read took it out of

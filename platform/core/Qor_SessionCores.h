@@ -40,7 +40,7 @@ class Qor_SessionCores {
  private:
   static void forget(unsigned session) noexcept;
 
-  std::mutex mutex_;  // never held while a core is destroyed
+  std::mutex mutex_;  // never locked while a core is destroyed
   std::map<QOR_CORE_REF, std::unique_ptr<Qor_Core>, Qor_AddressOrder> cores_;
   std::map<QOR_CORE_REF, Qor_CoreLink, Qor_AddressOrder> links_;
   const unsigned tagAbove_ = drawTagAbove();

@@ -29,7 +29,7 @@ using QOR_PROGRESS_CALLBACK = QOR_PROGRESS_RETURN (*)(unsigned, unsigned, unsign
 
 namespace QorRT {
 
-/// Thrown when nothing that begins as a debug hub's answer came back at any attempt: no hub stands at that device and
+/// Thrown when nothing that begins as a debug hub's answer came back at any attempt: no hub is at that device and
 /// user chain, its device is off, or TDO is dead. Anything else that goes wrong is another exception.
 class QOR_API Qor_NoHub : public std::runtime_error {
  public:

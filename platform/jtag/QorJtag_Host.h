@@ -19,11 +19,11 @@
 #include "Qor_Cable.h"
 
 /// Receives each message of a session on the thread that sends it; `text` is valid during the call. A target
-/// lock may be held meanwhile, so a handler makes no call that takes one. What it throws goes no further.
+/// lock may be taken meanwhile, so a handler makes no call that takes one. What it throws goes no further.
 using QorJtag_MessageHandler = std::function<void(unsigned type, const char* text)>;
 
 /// Opens a session on the cable that the URL names: "sim:", "sim:BOARD.toml", "rbb:HOST:PORT",
-/// "openocd:HOST:PORT" or "openocd:?config=FILE"; behind the last three may stand "?board=FILE" and
+/// "openocd:HOST:PORT" or "openocd:?config=FILE"; the last three may end with "?board=FILE" and
 /// "timeout=SECONDS", with "&" between. Returns its handle. Throws, and opens nothing, when the URL is malformed
 /// or of an unknown kind, or its cable cannot be opened. Of a server, every exchange has a deadline: the time of
 /// the URL (5 s) and what its bits take at 20 kHz. A connection that breaks fails one call, and the next call opens
@@ -52,11 +52,11 @@ extern "C" QOR_API unsigned QorJtag_session_openCable(std::unique_ptr<QorRT::Qor
 /// when the session is unknown.
 extern "C" QOR_API void QorJtag_session_close(unsigned session);
 
-/// Replaces the session's message handler; an empty one restores the default, one line a message on stderr.
+/// Replaces the session's message handler; an empty one restores the default, one line per message on stderr.
 /// Throws when the session is unknown.
 extern "C" QOR_API void QorJtag_session_setMessageHandler(unsigned session, QorJtag_MessageHandler handler);
 
-/// What stands on the session's chain, in device-index order: a copy into `devices`. Throws when the session
+/// What is on the session's chain, in device-index order: a copy into `devices`. Throws when the session
 /// is unknown, with `devices` as it was.
 extern "C" QOR_API void QorJtag_session_getDevices(unsigned session, std::vector<QorRT::Qor_Device>& devices);
 
@@ -68,7 +68,7 @@ struct QorJtag_Statistics {
   std::uint64_t nanoseconds = 0;     ///< spent in the cable
   std::uint64_t repeatsNoHub = 0;    ///< nothing on TDO began as a debug hub's answer does
   std::uint64_t repeatsNoHead = 0;   ///< the hub did not take the frame, or its answer did not begin as one
-  std::uint64_t repeatsBadCrc = 0;   ///< the CRC of the answer did not hold
+  std::uint64_t repeatsBadCrc = 0;   ///< the CRC of the answer was wrong
   std::uint64_t repeatsSlow = 0;     ///< the design clock was not ready in time
   std::uint64_t repeatsRefused = 0;  ///< an earlier write was not ready
 };

@@ -28,10 +28,10 @@ class Qor_Session {
 
   Qor_LinkRecord& record() { return record_; }
 
-  /// What stood on the chain when the session was opened.
+  /// What was on the chain when the session was opened.
   const std::vector<Qor_Device>& devices() const { return devices_; }
 
-  /// Replaces the handler; an empty one stands for the default.
+  /// Replaces the handler; an empty one means the default.
   void setHandler(QorJtag_MessageHandler handler);
 
   /// Null for the default. A handler that is being called outlives its replacement.
@@ -52,7 +52,7 @@ class Qor_Session {
   const std::vector<Qor_Device> devices_;
   Qor_LinkRecord record_;
 
-  std::mutex mutex_;  // guards what follows, never held while foreign code runs
+  std::mutex mutex_;  // guards what follows, never locked while foreign code runs
   std::shared_ptr<const QorJtag_MessageHandler> handler_;
   std::vector<CloseHook> hooks_;
   bool hooksTaken_ = false;

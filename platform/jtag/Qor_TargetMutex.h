@@ -1,4 +1,4 @@
-// The mutex behind a session's target lock.
+// The mutex of a session's target lock.
 #pragma once
 
 #include <chrono>

@@ -1,4 +1,4 @@
-// Ends a call whose reason has already been told to the session.
+// Ends a call whose reason has already been reported to the session.
 #pragma once
 
 #include <stdexcept>

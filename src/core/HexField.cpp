@@ -18,7 +18,7 @@ bool isDigit(char c) {
   return (c >= '0' && c <= '9') || (c >= 'A' && c <= 'F') || (c >= 'a' && c <= 'f');
 }
 
-/// What stands to the left of a text that begins with this digit.
+/// What is to the left of a text that begins with this digit.
 char signFill(char first) {
   return first <= '7' ? '0' : 'F';
 }

@@ -24,7 +24,7 @@ CharBlock sixteenAsyncRecords(const char* digits) {
   return rows;
 }
 
-/// One record in each row, and behind it two digits of the next one, which must be there.
+/// One record in each row, and after it two digits of the next one, which must be there.
 CharBlock eightSyncRecords(const char* digits) {
   CharBlock rows;
   for (std::size_t row = 0; row < rows.size(); ++row) rows[row] = loadRow(digits + syncRecordDigits * row);

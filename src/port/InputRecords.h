@@ -11,7 +11,7 @@ inline constexpr std::size_t asyncRecordDigits = 4;
 /// Value, activity up, activity down, sync activity up, sync activity down, one unused.
 inline constexpr std::size_t syncRecordDigits = 6;
 
-/// Digit k of record i becomes character i of column k. `digits` holds `count` records, each column has room for as many
+/// Digit k of record i becomes character i of column k. `digits` contains `count` records, each column has room for as many
 /// characters.
 void splitAsyncRecords(const char* digits, std::size_t count, const std::array<char*, 3>& columns);
 void splitSyncRecords(const char* digits, std::size_t count, const std::array<char*, 5>& columns);

@@ -14,7 +14,7 @@ using StepPlanes = std::array<std::string, QorVIO_Command::stepCount>;
 /// Makes room for the planes of a port, so that staging it allocates nothing.
 void reservePlanes(StepPlanes& planes, unsigned width);
 
-/// Gives every bit of a port its pulse train, from 16 port images of `width` bits that stand one after
+/// Gives every bit of a port its pulse train, from 16 port images of `width` bits that follow one after
 /// another in `stepBits`. Works through the port piece by piece, so that the pieces stay in the nearest
 /// cache; `planes` is room for one, which a caller may keep for the next time.
 void stagePulseTrains(const unsigned char* stepBits, unsigned width, StepPlanes& planes,

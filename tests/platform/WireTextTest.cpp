@@ -123,7 +123,7 @@ TEST(BoardFacts, AreLaidOverWhatWasFoundAndMayNotContradictIt) {
       {"[[device]]\nname = \"fpga\"\nuser_opcodes = [0x22, 0x23]\nidcode = 0x11\n[[device]]\nir_length = 2\n",
        "fpga/6/34,none device1/2/2,none "},
       {"[[device]]\n[[device]]\n",
-       "runtime: the IR length of device 1, IDCODE 00000023, cannot be told from its capture; a board file "
+       "runtime: the IR length of device 1, IDCODE 00000023, cannot be seen in its capture; a board file "
        "can "
        "say it"},
       {rest, "runtime: the chain has 2 devices, the board file says 1"},

@@ -7,7 +7,7 @@
 
 namespace qor::tool {
 
-/// With --json, tells on stdout what was written.
+/// With --json, reports on stdout what was written.
 void printWritten(const Context& context, const std::vector<Assignment>& assignments);
 
 }  // namespace qor::tool

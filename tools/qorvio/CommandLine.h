@@ -10,7 +10,7 @@ namespace qor::tool {
 /// Adds them to an empty application. The context must outlive it.
 void addCommands(CLI::App& app, Context& context);
 
-/// The commands that a script may hold, without the options that all have in common.
+/// The commands that a script may contain, without the options that all have in common.
 void addScriptCommands(CLI::App& app, Context& context);
 
 }  // namespace qor::tool

@@ -1,4 +1,4 @@
-// What the commands share: settings, and the board, core and names behind them, opened when first asked for.
+// What the commands share: settings, and the board, core and names that they lead to, opened when first asked for.
 #pragma once
 
 #include <memory>

@@ -13,7 +13,7 @@ namespace qor::tool {
 /// Name, width, value and activity flags, in the order of the man page. `radix` as in shown().
 nlohmann::ordered_json jsonOf(const Signal& input, const Sample& sample, const Radix* radix = nullptr);
 
-/// Adds the activity flags under their names, each with `ending` behind it.
+/// Adds the activity flags under their names, each followed by `ending`.
 void addActivity(nlohmann::ordered_json& entry, const Signal& input, const Sample& sample,
                  const std::string& ending);
 

@@ -1,4 +1,4 @@
-// What every command is told: which board, core and signals, and how to print.
+// What every command is given: which board, core and signals, and how to print.
 #pragma once
 
 #include <CLI/CLI.hpp>

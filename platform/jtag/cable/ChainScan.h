@@ -29,7 +29,7 @@ struct ChainScan {
 QOR_API ChainScan chainIrScan(const std::vector<Qor_Device>& devices, unsigned device, std::uint64_t opcode);
 
 /// The DR scan whose last `bitCount` bits in the device's register are `out`, with all other devices in
-/// BYPASS. It is one bit longer for each of them; ones stand before and behind the device's bits.
+/// BYPASS. It is one bit longer for each of them; ones are before and after the device's bits.
 QOR_API ChainScan chainDrScan(std::size_t deviceCount, unsigned device, const std::vector<unsigned char>& out,
                               std::size_t bitCount);
 

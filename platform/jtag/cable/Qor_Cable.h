@@ -37,7 +37,7 @@ struct Qor_Scan {
   unsigned userChain = 0;            ///< ir: the device selects USERn, all others BYPASS
   bool always = true;                ///< ir: must not be left out
   unsigned cycles = 0;               ///< idle: TCKs in Run-Test/Idle
-  std::vector<unsigned char> out{};  ///< dr: the last bits before Update-DR; ones fill whatever stands before
+  std::vector<unsigned char> out{};  ///< dr: the last bits before Update-DR; ones fill whatever comes before
   std::size_t bitCount = 0;          ///< dr
   bool capture = false;              ///< dr
   std::vector<unsigned char> in{};   ///< dr with capture: the device's first bitCount bits since Capture-DR
@@ -47,7 +47,7 @@ struct Qor_Scan {
 /// host that Ctrl-C is to end.
 using StopFunction = std::function<bool()>;
 
-/// The queue in front of a scan chain. A kind of cable says what stands on the chain and how to run a queue.
+/// The queue in front of a scan chain. A kind of cable says what is on the chain and how to run a queue.
 class QOR_API Qor_Cable {
  public:
   /// User chains are numbered from 1 to this.
@@ -58,7 +58,7 @@ class QOR_API Qor_Cable {
   Qor_Cable& operator=(const Qor_Cable&) = delete;
   virtual ~Qor_Cable();
 
-  /// What stands on the chain, in device-index order. Valid as long as the cable.
+  /// What is on the chain, in device-index order. Valid as long as the cable.
   virtual const std::vector<Qor_Device>& devices() const = 0;
 
   /// Whether the host is to stop: whoever repeats scans for long gives up then.
@@ -69,7 +69,7 @@ class QOR_API Qor_Cable {
   /// so already. Throws logic_error, queueing nothing, for a device beyond the chain or a user chain that is not 1 to 4.
   void scanIr(unsigned device, unsigned userChain, bool always = true);
 
-  /// Queues a DR scan of `bitCount` bits of that device: `out` holds them (as many bytes as they need, else
+  /// Queues a DR scan of `bitCount` bits of that device: `out` contains them (as many bytes as they need, else
   /// logic_error). Returns the number under which captured() gives the bits that come back, if `capture` asks
   /// for them.
   std::size_t scanDr(unsigned device, std::vector<unsigned char> out, std::size_t bitCount, bool capture);

@@ -1,4 +1,4 @@
-// The factories behind the table of cable URLs: each opens the cable that the rest of a URL describes.
+// The factories of the table of cable URLs: each opens the cable that the rest of a URL describes.
 #pragma once
 
 #include <memory>

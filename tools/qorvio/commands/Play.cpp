@@ -46,11 +46,11 @@ void addPlay(CLI::App& app, Context& context) {
       ->required();
   command->add_option("--rate", options->rate, "rows per second; without it as fast as the cable allows");
   command->footer(
-      "A first column time_s tells when each row is to be sent, in seconds from the start, as record writes "
+      "A first column time_s says when each row is to be sent, in seconds from the start, as record writes "
       "it (a\n"
-      "column missed behind it is passed over). Rows that the cable was too slow for are sent late, and "
+      "column missed after it is passed over). Rows that the cable was too slow for are sent late, and "
       "counted.\n"
-      "Without times and rate, synchronous outputs alone play 16 rows an exchange, a row a clock of the "
+      "Without times and rate, synchronous outputs alone play 16 rows per exchange, a row per clock of the "
       "design.\n"
       "Ctrl-C ends it between two rows.\n\n"
       "Example:\n  qorvio play steps.csv --rate 10");

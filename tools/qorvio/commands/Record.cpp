@@ -80,8 +80,8 @@ void record(Context& context, const RecordOptions& options) {
   if (signals.empty()) throw WrongUse("no inputs to record");
   const Settings& settings = context.settings;
   const Recorded recorded = recordWithProgress(context, signals, options.out, limits, !settings.quiet);
-  const std::string told = settings.quiet ? "" : printable(summary(recorded, options.out)) + "\n";
-  print({told, {{"samples", recorded.samples}, {"missed", recorded.missed}}}, settings.json);
+  const std::string text = settings.quiet ? "" : printable(summary(recorded, options.out)) + "\n";
+  print({text, {{"samples", recorded.samples}, {"missed", recorded.missed}}}, settings.json);
 }
 
 }  // namespace

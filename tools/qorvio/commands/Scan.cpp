@@ -70,8 +70,7 @@ std::string tablesOf(const std::vector<QorRT::Qor_Device>& devices, const std::v
 }  // namespace
 
 void addScan(CLI::App& app, Context& context) {
-  CLI::App* command =
-      app.add_subcommand("scan", "the chain: devices, and every core behind every user chain");
+  CLI::App* command = app.add_subcommand("scan", "the chain: devices, and every core of every user chain");
   command->footer("Example:\n  qorvio --cable sim: scan");
   command->callback([&context] {
     const std::vector<QorRT::Qor_Device> devices = context.link().devices();

@@ -70,7 +70,7 @@ void addSignals(CLI::App& app, Context& context) {
       "Example:\n  qorvio signals init > bench.toml\n  qorvio --signals bench.toml signals check");
   command->require_subcommand(0, 1);
   auto namesOnly = std::make_shared<bool>(false);
-  command->add_flag("--names", *namesOnly, "the names alone, one a line");
+  command->add_flag("--names", *namesOnly, "the names alone, one per line");
   command->add_subcommand("check", "checks the signals file against the core")
       ->footer("Example:\n  qorvio --signals bench.toml signals check")
       ->callback([&context] { check(context); });

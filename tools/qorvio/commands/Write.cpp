@@ -27,7 +27,7 @@ void addWrite(CLI::App& app, Context& context) {
   auto isVerified = std::make_shared<bool>(false);
   command->add_flag("--verify", *isVerified, "fails unless the inputs of the same names then read the same");
   command->footer(
-      "NAME.pulsetrain=V0,V1,... plays up to 16 values, one a clock of the design; the last one stays.\n\n"
+      "NAME.pulsetrain=V0,V1,... plays up to 16 values, one per clock of the design; the last one stays.\n\n"
       "Example:\n  qorvio write async_out_data=5A sync_out_data[2].pulsetrain=0,1,0");
   command->callback([&context, texts, isVerified] {
     std::vector<Drive> drives;

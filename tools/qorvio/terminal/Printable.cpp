@@ -74,7 +74,7 @@ std::string cut(const std::string& text, std::size_t columns, const std::string&
   return text.substr(0, front) + mark + std::string(back);
 }
 
-// Whether a digit behind 0x or 0b is none of 0.
+// Whether a digit after 0x or 0b is none of 0.
 bool hasOnes(std::string_view value) {
   return value.find_first_of("123456789ABCDEF", 2) != value.npos;
 }

@@ -51,7 +51,7 @@ std::string Screen::update(std::size_t rows, const Parts& body, std::vector<std:
   shown_.resize(std::max(lines.size(), shown_.size()));
   lines.resize(shown_.size());
   for (std::size_t i = 0; i < lines.size(); ++i)
-    // Erased first: behind a line that fills the width, the cursor still stands on its last character.
+    // Erased first: after a line that fills the width, the cursor is still on its last character.
     if (lines[i] != shown_[i]) text += "\033[" + std::to_string(i + 1) + ";1H\033[K" + lines[i];
   shown_ = std::move(lines);
   return text;

@@ -1,4 +1,4 @@
-// What stands on a screen, and what to write for something else to stand there.
+// What is on a screen, and what to write for something else to be there.
 #pragma once
 
 #include <cstddef>
@@ -15,14 +15,14 @@ class Screen {
  public:
   static constexpr std::size_t none = static_cast<std::size_t>(-1);
 
-  /// What to write to a terminal with so many rows: the lines that differ from those that stand there, each addressed by
+  /// What to write to a terminal with so many rows: the lines that differ from those that are there, each addressed by
   /// its row, and everything when the number of rows has changed. When the body has more lines than there is room for,
   /// a last line says how many are not shown. The pinned line of the body is always seen: when it is outside the window, above
   /// the foot.
   std::string update(std::size_t rows, const Parts& body, std::vector<std::string> foot,
                      std::size_t pinned = none);
 
-  /// From the next update on the window stands so many lines or windows further down, as far as the body goes.
+  /// From the next update on the window is so many lines or windows further down, as far as the body goes.
   /// @{
   void scroll(std::ptrdiff_t lines);
   void scrollPages(std::ptrdiff_t pages) { scroll(pages * static_cast<std::ptrdiff_t>(window_)); }
@@ -31,10 +31,10 @@ class Screen {
   /// From the next update on the line of the body is in the window.
   void reveal(std::size_t line) { revealed_ = line; }
 
-  /// What stands on the terminal is not known any more: the next update writes everything.
+  /// What is on the terminal is not known any more: the next update writes everything.
   void forget() { rows_ = 0; }
 
-  /// The lines that stand there.
+  /// The lines that are there.
   const std::vector<std::string>& shown() const { return shown_; }
 
  private:

@@ -33,7 +33,7 @@ class OutputTable {
   void chooseNext() { choose(chosen_ + 1); }
   void chooseBefore() { choose(chosen_ - 1); }
 
-  /// In which of the lines the chosen one stands.
+  /// In which of the lines the chosen one is.
   std::size_t chosenLine() const { return chosen_ + 1; }
 
   /// Writes to the chosen one. Throws Failure, or WrongUse where it plays no pulses.

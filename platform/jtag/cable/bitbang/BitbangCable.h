@@ -1,4 +1,4 @@
-// A chain behind a remote_bitbang server: one character sets TCK, TMS and TDI, another asks for TDO.
+// A chain at a remote_bitbang server: one character sets TCK, TMS and TDI, another asks for TDO.
 #pragma once
 
 #include <memory>

@@ -18,7 +18,7 @@ class TckSequence {
   /// Test-Logic-Reset from wherever the chain is, then Run-Test/Idle.
   void reset();
 
-  /// A scan through Capture, Shift and Update. `captured` asks for TDO, one bit a bit.
+  /// A scan through Capture, Shift and Update. `captured` asks for TDO, one bit per bit.
   /// @{
   void scanIr(const ChainScan& scan, bool captured = false);
   void scanDr(const ChainScan& scan, bool captured);

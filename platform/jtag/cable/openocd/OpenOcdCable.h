@@ -1,4 +1,4 @@
-// A chain behind an OpenOCD server, which drives the adapter; spoken to by its Tcl port.
+// A chain at an OpenOCD server, which drives the adapter; spoken to by its Tcl port.
 #pragma once
 
 #include <memory>

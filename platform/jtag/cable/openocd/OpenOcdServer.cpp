@@ -147,7 +147,7 @@ OpenOcdServer::~OpenOcdServer() {  // NOLINT(bugprone-exception-escape)
   stream_.link().io.poll();  // the reading of the log refers to us
 }
 
-// A host that ignores SIGCHLD has nobody to wait for: that tells the same.
+// A host that ignores SIGCHLD has nobody to wait for: that says the same.
 bool OpenOcdServer::endsWithin(milliseconds time) {
   const auto end = Deadline::Clock::now() + time;
   std::error_code none;

@@ -45,7 +45,7 @@ bool isRow(const std::vector<std::string>& words) {
   return words.size() == rowWords && (words[2] == "Y" || words[2] == "N");
 }
 
-// "0x0a5f1093", or "0x*a5f1093" when the version does not matter; 0 stands for any.
+// "0x0a5f1093", or "0x*a5f1093" when the version does not matter; 0 means any.
 ExpectedIdcode expectedOf(const std::string& text) {
   const bool anyVersion = text.rfind("0x*", 0) == 0;
   const unsigned idcode = number(anyVersion ? "0x0" + text.substr(3) : text, 16);
@@ -79,7 +79,7 @@ bool isExpected(const OpenOcdTap& tap) {
   });
 }
 
-// The server names what it finds behind the TAPs of its configuration "auto0.tap" and so on.
+// The server names what it finds after the TAPs of its configuration "auto0.tap" and so on.
 bool isUnnamed(const OpenOcdTap& tap) {
   return tap.expected.front().mask == 0 && std::regex_match(tap.name, std::regex(R"(auto\d+\.tap)"));
 }

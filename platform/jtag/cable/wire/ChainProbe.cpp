@@ -11,7 +11,7 @@ using Bytes = std::vector<unsigned char>;
 
 constexpr std::size_t idcodeBits = 32;
 
-// Enough for the longest chain and the first bits that come out behind it.
+// Enough for the longest chain and the first bits that come out after it.
 constexpr std::size_t idcodeProbeBits = (mostDevices + 1) * idcodeBits;
 constexpr std::size_t irProbeBits = mostIrBits + 8;
 

@@ -1,4 +1,4 @@
-// Finding out what stands on a chain: the scans to send, and what their captures tell.
+// Finding out what is on a chain: the scans to send, and what their captures say.
 #pragma once
 
 #include <vector>
@@ -18,11 +18,11 @@ constexpr unsigned mostIrBits = mostDevices * 32;
 /// The DR scan after Test-Logic-Reset, when each device offers its IDCODE or, without one, BYPASS.
 ChainScan idcodeProbe();
 
-/// The devices that its capture shows, without their IR lengths; what stands behind the last is the ones that
+/// The devices that its capture shows, without their IR lengths; what comes after the last is the ones that
 /// were shifted in. Throws runtime_error when TDO is stuck.
 std::vector<Qor_Device> idcodesIn(const std::vector<unsigned char>& captured);
 
-/// The IR scan that leaves BYPASS everywhere: a 0, which tells how long the IRs are together, then ones.
+/// The IR scan that leaves BYPASS everywhere: a 0, which shows how long the IRs are together, then ones.
 ChainScan irProbe();
 
 /// Sets the IR lengths from its capture, where each device shows a 1 and then a 0 first. When that can be read

@@ -39,7 +39,7 @@ class Stream {
   /// Sends `out` and meanwhile receives until `count` bytes have come; more than that is a failure.
   std::string exchange(std::string_view out, std::size_t count, const Deadline& deadline);
 
-  /// Sends `out`, then receives up to the first `end`, which is not returned. Anything behind it is a failure, and so
+  /// Sends `out`, then receives up to the first `end`, which is not returned. Anything after it is a failure, and so
   /// is an answer of more than `most` bytes.
   std::string ask(std::string_view out, char end, std::size_t most, const Deadline& deadline);
 

@@ -19,7 +19,7 @@ unsigned irLengthOf(std::size_t index, const Qor_Device& found, const DeviceEntr
   if (found.irLength == 0 && !entry.irLength) {
     throw std::runtime_error("the IR length of device " + std::to_string(index) + ", IDCODE " +
                              idcodeText(found.idcode) +
-                             ", cannot be told from its capture; a board file can say it");
+                             ", cannot be seen in its capture; a board file can say it");
   }
   if (found.irLength != 0 && entry.irLength && *entry.irLength != found.irLength)
     contradict(index, "has an IR of " + std::to_string(found.irLength) + " bits",

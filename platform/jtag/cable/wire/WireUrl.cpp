@@ -31,7 +31,7 @@ std::pair<std::string, std::string> split(const std::string& text, char at) {
   return {text.substr(0, place), text.substr(place + 1)};
 }
 
-// An IPv6 address stands in brackets.
+// An IPv6 address is in brackets.
 Endpoint endpointOf(const std::string& text) {
   const std::size_t colon = text.rfind(':');
   if (colon == text.npos || colon == 0 || !isPort(std::string_view(text).substr(colon + 1))) return {};

@@ -1,4 +1,4 @@
-// The part of a cable URL behind its kind, such as "localhost:9000?board=my.toml&timeout=2".
+// The part of a cable URL after its kind, such as "localhost:9000?board=my.toml&timeout=2".
 #pragma once
 
 #include <string>
@@ -15,7 +15,7 @@ struct WireUrl {
   Seconds timeout{5.0};  ///< "timeout": beside the time that the bits take, the longest wait for an answer
 };
 
-/// In the values of options "%26" and the like stand for the bytes with these hexadecimal numbers. Throws logic_error
+/// In the values of options "%26" and the like are the bytes with these hexadecimal numbers. Throws logic_error
 /// for a malformed URL and for an option that is not among `options`. `kind` is named in messages.
 WireUrl parseWireUrl(const std::string& kind, const std::string& rest,
                      const std::vector<std::string>& options);
