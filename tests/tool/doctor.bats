@@ -14,7 +14,7 @@ setup() {
   [ "$status" -eq 0 ]
   [ "${#lines[@]}" -eq 7 ]
   run "$QORVIO" doctor --write
-  [ "${lines[3]}" = "ok       user registers       hubs behind 0.1, 1.1" ]
+  [ "${lines[3]}" = "ok       user registers       hubs at 0.1, 1.1" ]
   [ "${lines[7]}" = "ok       write and read back  8 bits written and read back" ]
   run "$QORVIO" --core 1.1.0 doctor --write
   [ "${lines[5]}" = "ok       status word          core 1.1.0, oldest layout, outputs 4 async 4 sync, inputs 16 async 16 sync" ]
@@ -25,7 +25,7 @@ setup() {
   printf '[[device]]\nidcode = 0x11\n' >empty.toml
   run "$QORVIO" --cable sim:empty.toml --quiet doctor
   [ "$status" -eq 1 ]
-  [ "${lines[0]}" = "FAILED   user registers       no debug hub behind any user register: all zeros" ]
+  [ "${lines[0]}" = "FAILED   user registers       no debug hub at any user register: all zeros" ]
   [ "${lines[2]}" = "qorvio: the check failed: user registers" ]
   [ "$("$QORVIO" --cable sim:empty.toml --json doctor 2>&1 | grep -c '"result": "skipped"')" -eq 3 ]
   run "$QORVIO" --cable "sim:$(printf '\377')" --json doctor # JSON for any bytes

@@ -1,5 +1,7 @@
 #include "Qor_Cable.h"
 
+#include <array>
+#include <cstdio>
 #include <stdexcept>
 #include <utility>
 
@@ -21,6 +23,12 @@ void requireCaptures(const std::vector<Qor_Scan>& scans) {
 }
 
 }  // namespace
+
+std::string idcodeText(unsigned idcode) {
+  std::array<char, 9> digits{};
+  std::snprintf(digits.data(), digits.size(), "%08X", idcode);
+  return digits.data();
+}
 
 Qor_Cable::~Qor_Cable() = default;
 

@@ -27,6 +27,9 @@ struct Qor_Device {
   unsigned irLength = 0;  ///< bits
 };
 
+/// The number as people write it: "0A5F1093".
+QOR_API std::string idcodeText(unsigned idcode);
+
 /// One queued step. Every scan ends in Run-Test/Idle.
 struct Qor_Scan {
   /// An IR scan, a DR scan, or TCKs in Run-Test/Idle.

@@ -20,23 +20,17 @@ namespace {
 struct Check {
   const char* name;
   const char* next;                  // what to try when it fails
-  std::function<std::string()> run;  // tells what was seen, or throws what is wrong
+  std::function<std::string()> run;  // returns what was seen, or throws what is wrong
 };
-
-std::string hexadecimal(unsigned number) {
-  char text[16];
-  std::snprintf(text, sizeof text, "%08X", number);
-  return text;
-}
 
 std::string idcodes(const std::vector<QorRT::Qor_Device>& devices) {
   std::string text;
   for (const QorRT::Qor_Device& each : devices) {
-    // Bit 0 of an IDCODE is always 1: it tells it from a BYPASS register.
+    // Bit 0 of an IDCODE is always 1: it differs from a BYPASS register.
     if (each.idcode != 0 && (each.idcode & 1) == 0)
-      throw Failure("bit 0 is not 1: " + hexadecimal(each.idcode));
+      throw Failure("bit 0 is not 1: " + QorRT::idcodeText(each.idcode));
     if (each.idcode == 0xFFFFFFFF) throw Failure("TDO is stuck at 1: FFFFFFFF");
-    text += (text.empty() ? "" : ", ") + (each.idcode != 0 ? hexadecimal(each.idcode) : "none");
+    text += (text.empty() ? "" : ", ") + (each.idcode != 0 ? QorRT::idcodeText(each.idcode) : "none");
   }
   return text;
 }
@@ -57,12 +51,12 @@ std::string hubs(QorRT::Qor_Cable& cable) {
       const std::string place = std::to_string(device) + "." + std::to_string(chain);
       const bool isHub = hello == 1 || hello == 2 || hello == 4;
       if (isHub) found += (found.empty() ? "" : ", ") + place;
-      if (!isHub && hello != 0) seen += ", " + place + " delivers " + hexadecimal(hello).substr(4);
+      if (!isHub && hello != 0) seen += ", " + place + " delivers " + QorRT::idcodeText(hello).substr(4);
     }
   }
   if (found.empty())
-    throw Failure("no debug hub behind any user register" + (seen.empty() ? ": all zeros" : seen));
-  return "hubs behind " + found + seen;
+    throw Failure("no debug hub at any user register" + (seen.empty() ? ": all zeros" : seen));
+  return "hubs at " + found + seen;
 }
 
 std::string layout(Link& link, const Core& core) {
@@ -177,8 +171,8 @@ void doctor(Context& context, const DoctorOptions& options) {
     json.push_back(
         {{"step", check.name}, {"result", result}, {"seen", seen}, {"next", isFailure ? check.next : ""}});
     if (context.settings.json || (context.settings.quiet && !isFailure)) continue;
-    const Color ink = isFailure ? Color::red : result == "ok" ? Color::green : Color::dim;
-    std::printf("%s  %-20s %s\n", colored(ink, result + std::string(7 - result.size(), ' ')).c_str(),
+    const Color color = isFailure ? Color::red : result == "ok" ? Color::green : Color::dim;
+    std::printf("%s  %-20s %s\n", colored(color, result + std::string(7 - result.size(), ' ')).c_str(),
                 check.name, printable(seen).c_str());
     if (isFailure) std::printf("         %-20s %s\n", "", check.next);
   }

@@ -1,5 +1,3 @@
-#include <cstdio>
-
 #include <nlohmann/json.hpp>
 
 #include "board/model/CoreAddress.h"
@@ -13,10 +11,7 @@ namespace {
 using json = nlohmann::ordered_json;
 
 std::string idcodeOf(const QorRT::Qor_Device& device) {
-  if (device.idcode == 0) return "none";
-  char text[16];
-  std::snprintf(text, sizeof text, "%08X", device.idcode);
-  return text;
+  return device.idcode == 0 ? "none" : QorRT::idcodeText(device.idcode);
 }
 
 json jsonOf(const FoundCore& core) {

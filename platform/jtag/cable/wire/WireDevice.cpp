@@ -1,7 +1,5 @@
 #include "platform/jtag/cable/wire/WireDevice.h"
 
-#include <array>
-#include <cstdio>
 #include <stdexcept>
 
 #include "platform/jtag/cable/boardfile/BoardFile.h"
@@ -81,12 +79,6 @@ std::vector<WireDevice> describedDevices(const std::vector<Qor_Device>& found,
   for (std::size_t i = 0; i < found.size(); ++i)
     devices.push_back(described(i, found[i], entries.empty() ? DeviceEntry() : entries[i]));
   return devices;
-}
-
-std::string idcodeText(unsigned idcode) {
-  std::array<char, 9> digits{};
-  std::snprintf(digits.data(), digits.size(), "%08X", idcode);
-  return digits.data();
 }
 
 }  // namespace QorRT

@@ -27,7 +27,4 @@ std::vector<DeviceEntry> boardDevicesOf(const std::string& text, const std::stri
 std::vector<WireDevice> describedDevices(const std::vector<Qor_Device>& found,
                                          const std::vector<DeviceEntry>& entries);
 
-/// "0A5F1093".
-std::string idcodeText(unsigned idcode);
-
 }  // namespace QorRT
