@@ -1,23 +1,8 @@
 # The everyday commands, as typed. Needs QORVIO, the tool, and QORVIO_SOURCES, the sources.
 
-export BATS_TEST_TIMEOUT=60
-
-setup() {
-  cd "$BATS_TEST_TMPDIR" || exit 1
-  unset QORVIO_CORE QORVIO_SIGNALS
-  export QORVIO_CABLE=sim:
-  export XDG_STATE_HOME=$PWD
-}
+load processes
 
 qorvio() { "$QORVIO" "$@"; }
-
-fails() {  # fails STATUS TEXT COMMAND...
-  local wanted=$1 text=$2
-  shift 2
-  run "$QORVIO" "$@"
-  echo "$*: exit $status, says: $output"
-  [ "$status" -eq "$wanted" ] && [ "$output" = "qorvio: $text" ]
-}
 
 signals_file() {
   cat >bench.toml <<'TOML'
@@ -48,26 +33,20 @@ TOML
 }
 
 @test "scan and info tell what stands on the board" {
-  run qorvio scan
-  [ "$status" -eq 0 ]
-  [ "$output" = "DEVICE  IDCODE    NAME  IR
+  gives 0 "DEVICE  IDCODE    NAME  IR
 0       0A5F1093  fpga  6
 1       1234567B  cpld  8
 
 CORE   TYPE    VERSION  ASYNC OUT  SYNC OUT  ASYNC IN  SYNC IN
 0.1.0  VIO     10.0     8          8         8         8
 0.1.1  type 7  10.0     -          -         -         -
-1.1.0  VIO     6.1      4          4         16        16" ]
-  run qorvio --json --core 1.1.0 info
-  [[ $output == *'"core_major_version": 6,'*'"async_input_count": 16,'* ]]
+1.1.0  VIO     6.1      4          4         16        16" scan
+  gives 0 '*"core_major_version": 6,*"async_input_count": 16,*' --json --core 1.1.0 info
 }
 
 @test "read shows values in their radix with what moved" {
-  run qorvio --core 1.1.0 read async_in_data --radix dec
-  [ "${lines[0]}" = "NAME           VALUE  ACTIVITY  SYNC" ]
-  [ "${lines[1]}" = "async_in_data  21     ↕" ]
-  run qorvio --core 1.1.0 read 'sync_in_data[0:3]' --radix bin
-  [ "${lines[1]}" = "sync_in_data[0:3]  0b1010  ↕         ↕" ]
+  gives 0 $'NAME           VALUE  ACTIVITY  SYNC\nasync_in_data  21     ↕' --core 1.1.0 read async_in_data --radix dec
+  gives 0 $'NAME*\nsync_in_data\\[0:3]  0b1010  ↕         ↕' --core 1.1.0 read 'sync_in_data[0:3]' --radix bin
 }
 
 @test "write takes every spelling of a value, and tells it in one exchange" {
@@ -80,18 +59,11 @@ CORE   TYPE    VERSION  ASYNC OUT  SYNC OUT  ASYNC IN  SYNC IN
 
 @test "a signals file names, checks and is begun by the tool" {
   signals_file
-  run qorvio --signals bench.toml signals check
-  [ "$output" = "4 signals, all fit core 0.1.0" ]
-  run qorvio --signals bench.toml read
-  [ "${lines[1]}" = "mode    off       ·" ]
-  [ "${lines[2]}" = "turned  0b000000  ·" ]
-  [ "${lines[3]}" = "volts   0 V       ·         ·" ]
+  gives 0 "4 signals, all fit core 0.1.0" --signals bench.toml signals check
+  gives 0 $'NAME*\nmode    off       ·\nturned  0b000000  ·\nvolts   0 V       ·         ·' --signals bench.toml read
   qorvio --core 1.1.0 signals init >first.toml
-  run qorvio --signals first.toml signals check
-  [ "$output" = "4 signals, all fit core 1.1.0" ]
-  run qorvio --signals first.toml --core 0.1.0 signals check
-  [ "$status" -eq 2 ]
-  [ "${lines[0]}" = "async_in: bit 15 is beyond async_in, which has 8 bits" ]
+  gives 0 "4 signals, all fit core 1.1.0" --signals first.toml signals check
+  gives 2 "async_in: bit 15 is beyond async_in, which has 8 bits*" --signals first.toml --core 0.1.0 signals check
 }
 
 @test "wrong use says what is wrong, and ends with 2" {
@@ -131,14 +103,13 @@ CORE   TYPE    VERSION  ASYNC OUT  SYNC OUT  ASYNC IN  SYNC IN
 }
 
 @test "whole ports, gestures, and settings from environment and file" {
-  run qorvio --core 1.1.0 port get async_in
-  [ "${lines[1]}" = "async_in  16     0015   001F  000F" ] || { echo "$output"; false; }
+  gives 0 $'*\nasync_in  16     0015   001F  000F' --core 1.1.0 port get async_in
   qorvio port set async_out 5A --mask F0
   qorvio pulse 'sync_out_data[5]' --width 3
   qorvio press 'async_out_data[0]' --for 1ms
-  [ "$(qorvio toggle 'async_out_data[0]')" = "async_out_data[0] = 1" ]
+  gives 0 'async_out_data\[0] = 1' toggle 'async_out_data[0]'
   echo 'core = "1.1.0"' >qorvio.toml
-  [[ $(qorvio info) == *"1.1.0"* ]]
+  gives 0 '*1.1.0*' info
   [[ $(QORVIO_CORE=0.1.0 qorvio info) == *"0.1.0"* ]]
   [[ $(QORVIO_CORE=0.1.0 qorvio --core 1.1.0 info) == *"1.1.0"* ]]
 }

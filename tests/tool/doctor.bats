@@ -2,58 +2,34 @@
 
 load processes
 
-setup() {
-  cd "$BATS_TEST_TMPDIR" || exit 1
-  unset QORVIO_CORE QORVIO_SIGNALS
-  export QORVIO_CABLE=sim:
-  export XDG_STATE_HOME=$PWD
-}
-
 @test "doctor finds everything well on the demo board" {
-  run "$QORVIO" doctor
-  [ "$status" -eq 0 ]
-  [ "${#lines[@]}" -eq 7 ]
-  run "$QORVIO" doctor --write
-  [ "${lines[3]}" = "ok       user registers       hubs at 0.1, 1.1" ]
-  [ "${lines[7]}" = "ok       write and read back  8 bits written and read back" ]
-  run "$QORVIO" --core 1.1.0 doctor --write
-  [ "${lines[5]}" = "ok       status word          core 1.1.0, oldest layout, outputs 4 async 4 sync, inputs 16 async 16 sync" ]
-  [ "${lines[7]}" = "ok       write and read back  the design does not loop its outputs back" ]
+  gives 0 "$(printf 'ok  *\n%.0s' {1..7})" doctor
+  gives 0 $'*\nok       user registers       hubs at 0.1, 1.1\n*\nok       write and read back  8 bits written and read back' \
+    doctor --write
+  gives 0 $'*\nok       status word          core 1.1.0, oldest layout, outputs 4 async 4 sync, inputs 16 async 16 sync\n*
+ok       write and read back  the design does not loop its outputs back' --core 1.1.0 doctor --write
 }
 
 @test "doctor names the step that fails, what it saw, and what to try" {
   printf '[[device]]\nidcode = 0x11\n' >empty.toml
-  run "$QORVIO" --cable sim:empty.toml --quiet doctor
-  [ "$status" -eq 1 ]
-  [ "${lines[0]}" = "FAILED   user registers       no debug hub at any user register: all zeros" ]
-  [ "${lines[2]}" = "qorvio: the check failed: user registers" ]
+  gives 1 $'FAILED   user registers       no debug hub at any user register: all zeros\n*\nqorvio: the check failed: user registers' \
+    --cable sim:empty.toml --quiet doctor
   [ "$("$QORVIO" --cable sim:empty.toml --json doctor 2>&1 | grep -c '"result": "skipped"')" -eq 3 ]
   run "$QORVIO" --cable "sim:$(printf '\377')" --json doctor # JSON for any bytes
   jq . <<<"${output%qorvio:*}" >/dev/null
   printf '[[device]]\nidcode = 0x10\n' >even.toml
-  run "$QORVIO" --cable sim:even.toml --quiet doctor
-  [ "${lines[0]}" = "FAILED   idcodes              bit 0 is not 1: 00000010" ]
+  gives 1 'FAILED   idcodes              bit 0 is not 1: 00000010*' --cable sim:even.toml --quiet doctor
   printf 'tcks_per_clock = 0\n[[device]]\n[[device.core]]\nuser_chain = 1\nindex = 0\ntype = "vio"\nsync_in = 4\n' >stopped.toml
-  run "$QORVIO" --cable sim:stopped.toml --quiet doctor
-  [[ ${lines[0]} == "FAILED   read                 device 0, user chain 1, core 0: design clock stopped, "* ]]
+  gives 1 'FAILED   read                 device 0, user chain 1, core 0: design clock stopped, *' \
+    --cable sim:stopped.toml --quiet doctor
 }
 
 @test "play checks a whole table first, then drives it in bursts where it can" {
   { echo 'sync_out_data,sync_out_data[0]'; for i in {1..20}; do echo "$i,1"; done; } >steps.csv
-  [ "$("$QORVIO" play steps.csv)" = "20 rows in 2 exchanges" ]
-  [[ "$("$QORVIO" play steps.csv --rate 1000)" = "20 rows in 20 exchanges, "*" late" ]]
+  gives 0 "20 rows in 2 exchanges" play steps.csv
+  gives 0 "20 rows in 20 exchanges, * late" play steps.csv --rate 1000
   printf 'async_out_data\n1\n2\n' >levels.csv
   [ "$("$QORVIO" --json play levels.csv | tr -d ' \n')" = '{"rows":2,"exchanges":2,"late":0}' ]
-  printf 'sync_out_data\n1\n2FF\n' >wide.csv
-  run "$QORVIO" play wide.csv
-  [ "$status" -eq 2 ]
-  [ "$output" = "qorvio: wide.csv:3: sync_out_data has 8 bits, too few for the value: 2FF" ]
-  printf 'leds\n1\n' >unknown.csv
-  run "$QORVIO" play unknown.csv
-  [ "$output" = "qorvio: unknown.csv:1: no output of that name: leds" ]
-  echo sync_out_data >none.csv
-  run "$QORVIO" play none.csv
-  [ "$output" = "qorvio: none.csv:1: has no row of values below its names" ]
 }
 
 @test "play sends rows at their times, in a recording's own columns too" {
@@ -77,18 +53,17 @@ TOML
   [ "$("$QORVIO" --json play twice.csv | tr -d ' \n')" = '{"rows":3,"exchanges":3,"late":1}' ]
   while IFS='|' read -r text said; do
     printf "$text" >bad.csv
-    run "$QORVIO" play bad.csv
-    echo "$text: exit $status, says: $output"
-    [ "$status" -eq 2 ]
-    [ "$output" = "qorvio: bad.csv:$said" ]
+    fails 2 "bad.csv:$said" play bad.csv
   done <<'CASES'
+sync_out_data\n1\n2FF\n|3: sync_out_data has 8 bits, too few for the value: 2FF
+leds\n1\n|1: no output of that name: leds
+sync_out_data\n|1: has no row of values below its names
 time_s,sync_out_data\n0.2,1\n0.1,2\n|3: a time before that of the row above it: 0.1
 time_s,sync_out_data\nsoon,1\n|2: not a time in seconds: soon
 time_s,missed\n0,0\n|1: names no output
 time_s,missed,sync_out_data\n0\n|2: 0 values for 1 outputs
 CASES
-  run "$QORVIO" play twice.csv --rate 10
-  [ "$output" = "qorvio: the rows have times of their own and take no --rate: twice.csv" ]
+  fails 2 "the rows have times of their own and take no --rate: twice.csv" play twice.csv --rate 10
 }
 
 @test "Ctrl-C ends play between two rows" {
@@ -102,9 +77,9 @@ CASES
 }
 
 @test "doctor drives no output whose value it cannot give back, unless it is forced to" {
-  "$QORVIO_LOSSY" --cable lossy:99 --core 0.1.0 toggle 'async_out_data[0]' --assume 0
-  run "$QORVIO_LOSSY" --cable lossy:99 --core 0.1.0 --quiet doctor --write
-  [ "$status" -eq 1 ]
-  [ "${lines[0]}" = "FAILED   write and read back  what the outputs were last given is not known; --force drives them and leaves zeros" ]
-  "$QORVIO_LOSSY" --cable lossy:99 --core 0.1.0 --quiet doctor --write --force
+  export QORVIO=$QORVIO_LOSSY QORVIO_CABLE=lossy:99 QORVIO_CORE=0.1.0
+  "$QORVIO" toggle 'async_out_data[0]' --assume 0
+  gives 1 'FAILED   write and read back  what the outputs were last given is not known; --force drives them and leaves zeros*' \
+    --quiet doctor --write
+  "$QORVIO" --quiet doctor --write --force
 }

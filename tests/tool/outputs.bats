@@ -2,11 +2,7 @@
 
 load processes
 
-setup() {
-  cd "$BATS_TEST_TMPDIR" || exit 1
-  unset QORVIO_SIGNALS
-  export XDG_STATE_HOME=$PWD QORVIO_CORE=0.1.0 QORVIO_CABLE=lossy:7
-}
+setup() { begin && export QORVIO=$QORVIO_LOSSY QORVIO_CORE=0.1.0 QORVIO_CABLE=lossy:7; }
 
 remembers() {  # remembers ASYNC KNOWN SYNC KNOWN: what the file holds, which is the only one in its folder
   local file
@@ -16,11 +12,11 @@ remembers() {  # remembers ASYNC KNOWN SYNC KNOWN: what the file holds, which is
 }
 
 @test "an interrupted press releases its output, and leaves alone what others gave meanwhile" {
-  "$QORVIO_LOSSY" write async_out_data=FF
-  "$QORVIO_LOSSY" --json press 'async_out_data[0]' --for 1h >told 3>&- &
+  "$QORVIO" write async_out_data=FF
+  "$QORVIO" --json press 'async_out_data[0]' --for 1h >told 3>&- &
   pid=$!
   catches_interrupt
-  "$QORVIO_LOSSY" toggle 'async_out_data[3]'
+  "$QORVIO" toggle 'async_out_data[3]'
   remembers F7 FF 00 00
   kill -INT $pid
   wait $pid
@@ -30,7 +26,7 @@ remembers() {  # remembers ASYNC KNOWN SYNC KNOWN: what the file holds, which is
 
 @test "a command that is killed remembers what it gave before, and at a cable with a long name" {
   QORVIO_CABLE=lossy:$(printf '%0300d' 7)
-  "$QORVIO_LOSSY" press 'async_out_data[1]' --for 1h 3>&- &
+  "$QORVIO" press 'async_out_data[1]' --for 1h 3>&- &
   pid=$!
   catches_interrupt
   until [ -n "$(find qorvio -name '*.json')" ]; do
@@ -45,16 +41,12 @@ remembers() {  # remembers ASYNC KNOWN SYNC KNOWN: what the file holds, which is
 @test "a command that fails remembers what it gave before" {
   echo 'async_out_data,sync_out_data[0]' >steps.csv
   for row in {1..9}; do echo "$row,1"; done >>steps.csv
-  run "$QORVIO_LOSSY" play steps.csv
-  [ "$status" -eq 1 ]
-  [ "$output" = "qorvio: device 0, user chain 1, core 0: the link is down" ]
+  fails 1 "device 0, user chain 1, core 0: the link is down" play steps.csv
   remembers 04 FF 01 01
 }
 
 @test "toggle needs to know what the output was given, by whom ever" {
-  run "$QORVIO_LOSSY" toggle 'sync_out_data[2]'
-  [ "$status" -eq 2 ]
-  [ "$output" = "qorvio: it is not known what this output was last given, say it by --assume 0 or 1: sync_out_data[2]" ]
-  [ "$("$QORVIO_LOSSY" toggle 'sync_out_data[2]' --assume 1)" = "sync_out_data[2] = 0" ]
-  [ "$("$QORVIO_LOSSY" toggle 'sync_out_data[2]')" = "sync_out_data[2] = 1" ]
+  fails 2 "it is not known what this output was last given, say it by --assume 0 or 1: sync_out_data[2]" toggle 'sync_out_data[2]'
+  gives 0 'sync_out_data\[2] = 0' toggle 'sync_out_data[2]' --assume 1
+  gives 0 'sync_out_data\[2] = 1' toggle 'sync_out_data[2]'
 }

@@ -2,13 +2,6 @@
 
 load processes
 
-setup() {
-  cd "$BATS_TEST_TMPDIR" || exit 1
-  unset QORVIO_CORE QORVIO_SIGNALS
-  export QORVIO_CABLE=sim:
-  export XDG_STATE_HOME=$PWD
-}
-
 # The counter behind core 1.1.0 has run 21 clocks at the first sample, and 10 more at each that follows.
 counted() {
   local sample
@@ -16,8 +9,7 @@ counted() {
 }
 
 @test "a VCD recording holds every value, as an independent reader tells" {
-  run "$QORVIO" --core 1.1.0 record async_in_data 'sync_in_data[0]' --samples 300 --out counter.vcd
-  [ "$output" = "300 samples in counter.vcd" ]
+  gives 0 "300 samples in counter.vcd" --core 1.1.0 record async_in_data 'sync_in_data[0]' --samples 300 --out counter.vcd
   vcd2fst counter.vcd counter.fst
   fst2vcd counter.fst >back.vcd
   id=$(awk '/^\$var/ && $5 == "async_in_data" { print $4 }' back.vcd)
@@ -61,10 +53,6 @@ counted() {
 
 @test "what cannot be recorded says why" {
   ln -s /dev/full full.vcd
-  run "$QORVIO" record --samples 3 --out full.vcd
-  [ "$status" -eq 1 ]
-  [ "$output" = "qorvio: cannot write the file full.vcd: No space left on device" ]
-  run "$QORVIO" record --samples 3 --out samples.bin
-  [ "$status" -eq 2 ]
-  [ "$output" = "qorvio: samples go to .vcd, .csv or .jsonl: samples.bin" ]
+  fails 1 "cannot write the file full.vcd: No space left on device" record --samples 3 --out full.vcd
+  fails 2 "samples go to .vcd, .csv or .jsonl: samples.bin" record --samples 3 --out samples.bin
 }

@@ -2,19 +2,10 @@
 
 load processes
 
-setup() {
-  cd "$BATS_TEST_TMPDIR" || exit 1
-  unset QORVIO_CORE QORVIO_SIGNALS
-  export QORVIO_CABLE=sim: XDG_STATE_HOME=$PWD
-}
-
 @test "wait ends when its conditions are true, or says what it saw last" {
   "$QORVIO" --core 1.1.0 wait 'async_in_data > 0x100' 'sync_in_data moves' --timeout 5s
-  run "$QORVIO" wait 'async_in_data == 5' --timeout 20ms
-  [ "$status" -eq 1 ]
-  [[ $output == "qorvio: not within 20 ms: async_in_data == 5; "*async_in_data* ]]
-  run "$QORVIO" wait 'async_in_dat == 5'
-  [ "$status" -eq 2 ]
+  gives 1 'qorvio: not within 20 ms: async_in_data == 5; *async_in_data*' wait 'async_in_data == 5' --timeout 20ms
+  gives 2 '*' wait 'async_in_dat == 5'
   "$QORVIO" wait 'async_in_data == 5' --timeout 1h 3>&- &
   pid=$!
   catches_interrupt
@@ -45,21 +36,12 @@ outputs level
 sleep 1ms
 echo all "is  well"
 SCRIPT
-  run "$QORVIO" --signals level.toml run good.qv
-  [ "$status" -eq 0 ]
-  [ "${lines[*]}" = "level[0] = 1 NAME   LAST GIVEN level  0x5B all is  well" ]
+  gives 0 $'level\\[0] = 1\nNAME   LAST GIVEN\nlevel  0x5B\nall is  well' --signals level.toml run good.qv
   printf 'write async_out_data=1\n\nexpect async_in_data==2\necho never\n' >bad.qv
-  run "$QORVIO" run bad.qv --tap
-  [ "$status" -eq 1 ]
-  [ "${lines[0]}" = "1..3" ]
-  [ "${lines[1]}" = "ok 1 - write async_out_data=1" ]
-  [ "${lines[2]}" = "not ok 2 - expect async_in_data==2" ]
-  [[ ${lines[3]} == "Bail out! bad.qv:3: not true: async_in_data==2; "* ]]
+  gives 1 $'1..3\nok 1 - write async_out_data=1\nnot ok 2 - expect async_in_data==2\nBail out! bad.qv:3: not true: async_in_data==2; *' \
+    run bad.qv --tap
   while IFS='|' read -r line said; do
-    run "$QORVIO" run - <<<"$line"
-    echo "$line: exit $status, says: $output"
-    [ "$status" -eq 2 ]
-    [ "$output" = "qorvio: $said" ]
+    fails 2 "$said" run - <<<"$line"
   done <<'CASES'
 frob|stdin:1: no such command in a script: frob
 write async_out_data=1FF|stdin:1: async_out_data has 8 bits, too few for the value: 1FF

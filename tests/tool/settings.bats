@@ -1,11 +1,9 @@
 # Whom the tool believes: settings files and names that others may have written. Needs QORVIO, the tool, and
 # QORVIO_SOURCES, the sources.
 
-setup() {
-  cd "$BATS_TEST_TMPDIR" || exit 1
-  unset QORVIO_CABLE QORVIO_CORE QORVIO_SIGNALS
-  export XDG_STATE_HOME=$PWD PATH="${QORVIO%/*}:$PATH"
-}
+load processes
+
+setup() { begin && unset QORVIO_CABLE && PATH="${QORVIO%/*}:$PATH"; }
 
 @test "a settings file counts when nobody else could have written it, or what it names" {
   mkdir -p lab/deep
@@ -15,10 +13,7 @@ setup() {
     printf "$setting\n" >qorvio.toml
     chmod 644 qorvio.toml start.cfg
     eval "$prepare"
-    run "$QORVIO" info
-    echo "$setting, $prepare: exit $status, says: $output"
-    [ "$status" -eq 2 ]
-    [[ $output == "qorvio: "$said ]]
+    gives 2 "qorvio: $said" info
     [ ! -e started ]
   done <<'CASES'
 cable = "sim:"|chmod 666 qorvio.toml|qorvio.toml is not used, because it could start programs of others: */lab/qorvio.toml can be written by other users

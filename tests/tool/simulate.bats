@@ -2,12 +2,6 @@
 
 load processes
 
-setup() {
-  cd "$BATS_TEST_TMPDIR" || exit 1
-  unset QORVIO_CORE QORVIO_SIGNALS
-  export QORVIO_CABLE=sim:
-}
-
 serve() {  # serve ARGUMENTS: starts the board, and waits until it tells where
   "$QORVIO" simulate "$@" >told 2>wrong 3>&- &
   pid=$!
@@ -35,8 +29,7 @@ scan() {  # scan PORT COMMAND...: what OpenOCD prints
   # A hub says hello with one bit, and nothing more to a scan without a frame.
   [[ $output == *"hello 00000001"* ]]
   "$QORVIO" --cable "rbb:127.0.0.1:$port" write async_out_data=5A
-  run "$QORVIO" --cable "rbb:127.0.0.1:$port" read async_in_data
-  [[ ${lines[1]} == "async_in_data  0x5A "* ]]
+  gives 0 $'*\nasync_in_data  0x5A *' --cable "rbb:127.0.0.1:$port" read async_in_data
   kill -INT $pid
   wait $pid
   pid=
@@ -48,12 +41,8 @@ scan() {  # scan PORT COMMAND...: what OpenOCD prints
   [[ $(cat told) =~ ^serving\ .*/lab.toml\ on\ 127.0.0.1:([0-9]+)\;\ cable\ rbb:127.0.0.1:([0-9]+)\;\ Ctrl-C\ ends\ it$ ]]
   port=${BASH_REMATCH[1]}
   [ "$port" = "${BASH_REMATCH[2]}" ]
-  run "$QORVIO" simulate --port "$port"
-  [ "$status" -eq 1 ]
-  [ "$output" = "qorvio: cannot listen on port $port: Address already in use" ]
-  run "$QORVIO" simulate missing.toml
-  [ "$status" -eq 2 ]
-  [ "$output" = "qorvio: missing.toml: cannot be opened: No such file or directory" ]
+  fails 1 "cannot listen on port $port: Address already in use" simulate --port "$port"
+  fails 2 "missing.toml: cannot be opened: No such file or directory" simulate missing.toml
   kill -TERM $pid
   wait $pid
   pid=
