@@ -1,19 +1,16 @@
-// A program's operator new that can be told to fail. For programs of one thread.
+// An allocator for the whole program that fails on demand.
 #pragma once
 
 #include <cstddef>
 
 namespace allocation_fault {
 
-enum class Extent { one, allFromThereOn };
+/// After `first` more allocations the next one fails, or all from there on.
+void arm(std::size_t first, bool all);
 
-/// From now on allocation number `first`, counted from 0, fails, and those after it as `extent` says.
-void arm(std::size_t first, Extent extent);
-
-/// Nothing fails any more. True when something has failed since arm().
+/// No more fail; true when one has.
 bool disarm() noexcept;
 
-/// The blocks that are allocated and not freed.
 std::size_t liveBlocks() noexcept;
 
 }  // namespace allocation_fault
