@@ -176,7 +176,9 @@ TEST_F(VioTest, AnImageIsAssignedWholly) {
 
 TEST_F(Group, CopiesShareTheImageAndTheName) {
   QorRT::QorVIO_SignalGroup copy(sync);
-  auto assigned = group(Qor_SignalBase::SIGNAL_TYPE_VIO_SYNC_INPUT, {0});
+  QorRT::QorVIO_Command other;
+  std::vector<unsigned> positions{0};
+  QorRT::QorVIO_SignalGroup assigned(&other, Qor_SignalBase::SIGNAL_TYPE_VIO_SYNC_INPUT, positions, "h", "h");
   assigned = sync;
   const auto& self = assigned;
   assigned = self;

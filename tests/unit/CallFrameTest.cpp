@@ -8,77 +8,67 @@
 
 namespace {
 
-struct Case {
-  std::function<unsigned()> call;
-  const char* function;
-  std::string failedCheck;
-};
-
 unsigned sizes[] = {99, 99};
+const unsigned bit[] = {0};
+const char* names[] = {"a", nullptr};
+const unsigned char bytes[64] = {};
+TextMap* noMap = nullptr;
+unsigned char* const none = nullptr;
 
-std::vector<Case> failingChecks() {
-  static const unsigned bit[] = {0};
-  static const char* names[] = {"a", nullptr};
-  static const unsigned char bytes[64] = {};
-  static TextMap* noMap = nullptr;
-  const char* const none = nullptr;
-  auto bus = [](const char* name, const unsigned* bits) {
-    return [=] { return QorVIO_defineBus(session, ref, name, 9, bits, 0); };
-  };
-  auto getSizes = [](const char** of, unsigned* to, unsigned count) {
-    return [=] { return QorVIO_getSignalSizes(session, ref, of, to, count, 0); };
-  };
-  auto set = [](const unsigned char* av, const unsigned char* am, unsigned a, const unsigned char* ss,
-                const unsigned char* sm, unsigned s) {
-    return [=] { return QorVIO_setPortBits(session, ref, av, am, a, ss, sm, s); };
-  };
-  auto get = [](unsigned a, unsigned s) {
-    return [=] {
-      unsigned char* no = nullptr;
-      return QorVIO_getPortBits(session, ref, no, no, no, a, no, no, no, no, no, s);
-    };
-  };
-  auto fits = [](const std::string& count, const std::string& type) {
-    return "(" + count + " == core->getCorePhysicalSignalCount(Qor_SignalBase::SIGNAL_TYPE_VIO_" + type +
-           ")) || (" + count + " == 0)";
-  };
-  return {
-      {[none] { return QorVIO_defineSignal(session, ref, none, 9, 9); }, "defineSignal", "name!=0"},
-      {bus(none, nullptr), "defineBus", "name!=0"},
-      {bus("b", nullptr), "defineBus", "bitIndexArray!=0"},
-      {bus("b", bit), "defineBus", "arrayLen!=0"},
-      {[none] { return QorVIO_undefineName(session, ref, none, 0); }, "undefineName", "name!=0"},
-      {getSizes(nullptr, nullptr, 0), "getSignalSizes", "nameArray!=0"},
-      {getSizes(names, nullptr, 0), "getSignalSizes", "sizeArray!=0"},
-      {getSizes(names, sizes, 0), "getSignalSizes", "arrayLen!=0"},
-      {getSizes(names, sizes, 2), "getSignalSizes", "nameArray[i]!=0"},
-      {[] { return QorVIO_writeValues(session, ref, nullptr); }, "writeValues", "outputHashMap!=0"},
-      {[] { return QorVIO_writeValues(session, ref, &noMap); }, "writeValues", "*outputHashMap!=0"},
-      {[] { return QorVIO_readValues(session, ref, nullptr); }, "readValues", "inputHashMap!=0"},
-      {[] { return QorVIO_readValues(session, ref, &noMap); }, "readValues", "*inputHashMap!=0"},
-      {set(nullptr, nullptr, 7, nullptr, nullptr, 7), "setPortBits",
-       fits("asyncOutDataBitCount", "ASYNC_OUTPUT")},
-      {set(nullptr, nullptr, 8, nullptr, nullptr, 7), "setPortBits",
-       fits("syncOutDataBitCount", "SYNC_OUTPUT")},
-      {set(nullptr, bytes, 8, bytes, bytes, 10), "setPortBits", "asyncOutValueBits!=0"},
-      {set(bytes, nullptr, 8, bytes, bytes, 10), "setPortBits", "asyncOutMaskBits!=0"},
-      {set(bytes, bytes, 8, nullptr, bytes, 10), "setPortBits", "syncOutStepBits!=0"},
-      {set(bytes, bytes, 8, bytes, nullptr, 10), "setPortBits", "syncOutMaskBits!=0"},
-      {get(5, 5), "getPortBits", fits("asyncInDataBitCount", "ASYNC_INPUT")},
-      {get(4, 5), "getPortBits", fits("syncInDataBitCount", "SYNC_INPUT")},
-  };
+auto bus(const char* name, const unsigned* bits) {
+  return [=] { return QorVIO_defineBus(session, ref, name, 9, bits, 0); };
+}
+auto getSizes(const char** of, unsigned* to, unsigned count) {
+  return [=] { return QorVIO_getSignalSizes(session, ref, of, to, count, 0); };
+}
+auto set(const unsigned char* av, const unsigned char* am, unsigned a, const unsigned char* ss,
+         const unsigned char* sm, unsigned s) {
+  return [=] { return QorVIO_setPortBits(session, ref, av, am, a, ss, sm, s); };
+}
+auto get(unsigned a, unsigned s) {
+  return
+      [=] { return QorVIO_getPortBits(session, ref, none, none, none, a, none, none, none, none, none, s); };
+}
+std::string fits(const std::string& count, const std::string& type) {
+  return "(" + count + " == core->getCorePhysicalSignalCount(Qor_SignalBase::SIGNAL_TYPE_VIO_" + type +
+         ")) || (" + count + " == 0)";
 }
 
+const struct {
+  std::function<unsigned()> call;
+  std::string function, failedCheck;
+} failingChecks[] = {
+    {[] { return QorVIO_defineSignal(session, ref, nullptr, 9, 9); }, "defineSignal", "name!=0"},
+    {bus(nullptr, nullptr), "defineBus", "name!=0"},
+    {bus("b", nullptr), "defineBus", "bitIndexArray!=0"},
+    {bus("b", bit), "defineBus", "arrayLen!=0"},
+    {[] { return QorVIO_undefineName(session, ref, nullptr, 0); }, "undefineName", "name!=0"},
+    {getSizes(nullptr, nullptr, 0), "getSignalSizes", "nameArray!=0"},
+    {getSizes(names, nullptr, 0), "getSignalSizes", "sizeArray!=0"},
+    {getSizes(names, sizes, 0), "getSignalSizes", "arrayLen!=0"},
+    {getSizes(names, sizes, 2), "getSignalSizes", "nameArray[i]!=0"},
+    {[] { return QorVIO_writeValues(session, ref, nullptr); }, "writeValues", "outputHashMap!=0"},
+    {[] { return QorVIO_writeValues(session, ref, &noMap); }, "writeValues", "*outputHashMap!=0"},
+    {[] { return QorVIO_readValues(session, ref, nullptr); }, "readValues", "inputHashMap!=0"},
+    {[] { return QorVIO_readValues(session, ref, &noMap); }, "readValues", "*inputHashMap!=0"},
+    {set(none, none, 7, none, none, 7), "setPortBits", fits("asyncOutDataBitCount", "ASYNC_OUTPUT")},
+    {set(none, none, 8, none, none, 7), "setPortBits", fits("syncOutDataBitCount", "SYNC_OUTPUT")},
+    {set(none, bytes, 8, bytes, bytes, 10), "setPortBits", "asyncOutValueBits!=0"},
+    {set(bytes, none, 8, bytes, bytes, 10), "setPortBits", "asyncOutMaskBits!=0"},
+    {set(bytes, bytes, 8, none, bytes, 10), "setPortBits", "syncOutStepBits!=0"},
+    {set(bytes, bytes, 8, bytes, none, 10), "setPortBits", "syncOutMaskBits!=0"},
+    {get(5, 5), "getPortBits", fits("asyncInDataBitCount", "ASYNC_INPUT")},
+    {get(4, 5), "getPortBits", fits("syncInDataBitCount", "SYNC_INPUT")},
+};
+
 TEST_F(VioTest, ArgumentChecksComeAfterTheLookupUnderTheLockAndSendNothing) {
-  for (const Case& c : failingChecks()) {
-    EXPECT_EQ(c.call(), failed);
-    EXPECT_THAT(platform.take(), locked(lookupFailed));
-  }
-  initCore(4, 3, 8, 10);
-  for (const Case& c : failingChecks()) {
-    EXPECT_EQ(c.call(), failed);
-    EXPECT_THAT(platform.take(),
-                locked("QorVIO_" + std::string(c.function) + "() arg. failed:" + c.failedCheck));
+  for (const bool isThere : {false, true}) {
+    if (isThere) initCore(4, 3, 8, 10);
+    for (const auto& [call, function, check] : failingChecks) {
+      EXPECT_EQ(call(), failed);
+      EXPECT_THAT(platform.take(),
+                  locked(isThere ? "QorVIO_" + function + "() arg. failed:" + check : lookupFailed));
+    }
   }
   EXPECT_THAT(sizes, testing::Each(99U));
 }

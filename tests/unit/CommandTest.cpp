@@ -28,7 +28,7 @@ TEST_F(VioTest, AReadIsOneTextAndGivesEveryInputUnderTheNameThatWasDefined) {
       "0010"
       "1110"
       "000000"
-      "110110";
+      "100110";
   const TextMap expected{{"note", "mine"},
                          {"Bus", "07"},
                          {"Bus.value", "07"},
@@ -36,7 +36,7 @@ TEST_F(VioTest, AReadIsOneTextAndGivesEveryInputUnderTheNameThatWasDefined) {
                          {"Bus.activity_down", "11"},
                          {"sync_in_data", "2"},
                          {"sync_in_data.value", "2"},
-                         {"sync_in_data.activity_up", "2"},
+                         {"sync_in_data.activity_up", "0"},
                          {"sync_in_data.activity_down", "0"},
                          {"sync_in_data.sync_activity_up", "2"},
                          {"sync_in_data.sync_activity_down", "2"}};
