@@ -24,10 +24,7 @@ class TestCore : public QorRT::Qor_SignalCore {
     const bool stillListed = Qor_CoreList::getCore(session_, getCoreRef()) != nullptr;
     destroyed_->push_back(std::to_string(getCoreRef().core_index) + (stillListed ? " listed" : ""));
   }
-  TestCore& operator=(const TestCore& other) {
-    if (this != &other) Qor_SignalCore::operator=(other);
-    return *this;
-  }
+  TestCore& operator=(const TestCore& other) = default;
 
   bool initFromStatusWord(unsigned) override { return true; }
   void addSignal(QorRT::Qor_SignalBase*) override {}
@@ -66,10 +63,8 @@ TEST_F(CoreList, FindsCoresByAddressAndDestroysWhatIsRemoved) {
   EXPECT_EQ(first, nullptr);
   EXPECT_EQ(get(0), nullptr);
   EXPECT_EQ(destroyed, std::vector<std::string>({"0"}));
-  Qor_CoreList::removeCore(session.handle, &gone);
-  Qor_CoreList::removeCore(session.handle, &first);
-  Qor_CoreList::removeCore(session.handle, nullptr);
-  EXPECT_NE(gone, nullptr);
+  for (auto** core : {&gone, &first, static_cast<QorRT::Qor_Core**>(nullptr)})
+    Qor_CoreList::removeCore(session.handle, core);
   EXPECT_EQ(destroyed.size(), 1U);
 }
 

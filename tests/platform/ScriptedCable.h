@@ -35,15 +35,6 @@ struct Script {
       log;              // "ir DEVICE CHAIN", "dr DEVICE BITS NUMBER", "idle TCKS"; "run" after each queue
   std::string failure;  // thrown by the next run, when not empty
   bool destroyed = false;
-
-  /// The log of one kind of step.
-  std::vector<std::string> logged(const std::string& kind) const {
-    std::vector<std::string> lines;
-    for (const std::string& line : log) {
-      if (line.rfind(kind, 0) == 0) lines.push_back(line);
-    }
-    return lines;
-  }
 };
 
 class ScriptedCable : public QorRT::Qor_Cable {

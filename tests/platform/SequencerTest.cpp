@@ -14,10 +14,11 @@ using QorRT::Qor_CoreComm;
 using Lines = std::vector<std::string>;
 
 const Bits records = bitsOf(0xCD0A, 16);
-const Reply good{}, refused{0xA4}, noSuchCore{0xA2}, silent{0}, slow{0xA0, {}, 1000};
+const Reply good{}, noSuchCore{0xA2}, silent{0}, slow{0xA0, {}, 1000}, whole{0xA0, records},
+    word{0xA0, Bits(128, '1')};
 
-Reply reply(unsigned head, Bits data = {}, std::size_t wait = 0) {
-  return {head, std::move(data), wait};
+Reply waiting(std::size_t wait) {
+  return {0xA0, records, wait};
 }
 Reply atHeader(unsigned head) {  // the payload is not taken
   return {head, {}, 0, false};
@@ -38,9 +39,9 @@ TEST(WorkedExample, HoldsBitForBit) {
   script->answers = {bitsOfHex("00E23A6595000010002000200010000100000A0951D0000000000000001", 236),
                      bitsOfHex("0010BBCD327A00000000000000000000000000001", 161),
                      bitsOfHex("00AC9466D8CD0AD0000000000000001", 124)};
-  QorRT::Qor_StatusWord word{};
-  EXPECT_TRUE(hub.readStatus(word));
-  EXPECT_EQ(hexOf(bitsOfBytes({word.begin(), word.end()}, 128)), "000010002000200010000100000A0951");
+  QorRT::Qor_StatusWord status{};
+  EXPECT_TRUE(hub.readStatus(status));
+  EXPECT_EQ(hexOf(bitsOfBytes({status.begin(), status.end()}, 128)), "000010002000200010000100000A0951");
   hub.write({0x04, 0x00, 0x10}, 21, false);
   const QorRT::Qor_ReadResult read = hub.read(16, false);
   EXPECT_EQ(hexOf(bitsOfBytes(read.bits, 32)), "66D8CD0A");
@@ -63,16 +64,16 @@ class Sequencer : public testing::Test {
     script.answers.assign(answers.begin(), answers.end());
   }
 
-  std::string write() {
-    return thrownBy(
-        [this] { Qor_CoreComm::commandSequence(session.handle, writeText, nullptr, 0, nullptr); });
+  std::string run(const std::string& text, unsigned char* result, unsigned bits,
+                  QOR_PROGRESS_CALLBACK progress = nullptr) {
+    return thrownBy([&] { Qor_CoreComm::commandSequence(session.handle, text, result, bits, progress); });
   }
+  std::string write() { return run(writeText, nullptr, 0); }
 
   /// The digits of the result, or what was thrown.
   std::string read(const std::string& text = readText, unsigned bytes = 5) {
     Qor_ByteBuffer result(bytes, 0, 0), digits;
-    const std::string thrown = thrownBy(
-        [&] { Qor_CoreComm::commandSequence(session.handle, text, result.uPtr(), bytes * 8, nullptr); });
+    const std::string thrown = run(text, result.uPtr(), bytes * 8);
     result.bin2HexString(0, digits);
     return thrown == "nothing" ? digits.ptr() : thrown;
   }
@@ -85,12 +86,12 @@ class Sequencer : public testing::Test {
 
   std::string status(unsigned core = 0) {
     QOR_CORE_INFO info{1, 2, 3, 4, 5};
-    std::vector<unsigned char> word(17, 0xFF);
+    std::vector<unsigned char> bits(17, 0xFF);
     unsigned found = 9;
     const std::string thrown = thrownBy([&] {
-      found = QorCore_getCoreStatus(session.handle, {0, 1, core}, &info, word.data(), 132);
+      found = QorCore_getCoreStatus(session.handle, {0, 1, core}, &info, bits.data(), 132);
     });
-    EXPECT_TRUE(found == 0 || (word == std::vector<unsigned char>(17) && info.core_type == 0)) << thrown;
+    EXPECT_TRUE(found == 0 || (bits == std::vector<unsigned char>(17) && info.core_type == 0)) << thrown;
     return thrown + ", " + std::to_string(found);
   }
 
@@ -117,9 +118,8 @@ struct Row {
 // write.
 TEST_F(Sequencer, RepeatsUnderTheSameTagWhatMayHaveBeenDone) {
   const std::string done = "nothing", found = "nothing, 0";
-  const Reply flippedStatus = flipped(reply(0xA0, Bits(128, '1')));
   const Row rows[] = {
-      {'s', {flippedStatus, reply(0xA0, Bits(128, '1'))}, {"0.1 /237", "0.1 /237"}, found},
+      {'s', {flipped(word), word}, {"0.1 /237", "0.1 /237"}, found},
       {'w', {flipped(good), good, good}, {intro, intro, "2.1 100004 /162"}, done},
       {'w', {flipped(good), atHeader(0xA0)}, {"2.2 100004 /162", "A.2 100004 /162"}, done},
       {'w', {silent, good}, {"2.3 100004 /162", "A.3 100004 /162"}, done},
@@ -129,19 +129,19 @@ TEST_F(Sequencer, RepeatsUnderTheSameTagWhatMayHaveBeenDone) {
        {silent, atHeader(0xA4), atHeader(0xA0)},
        {"2.6 100004 /162", "A.6 100004 /162", "A.6 100004 /218"},
        done},
-      {'r', {reply(0xA8, records)}, {"3.1 /125"}, "08CD0A"},
-      {'r', {flipped(reply(0xA0, records)), reply(0xA0, records)}, {"3.2 /125", "B.2 /125"}, "00CD0A"},
-      {'r', {slow, slow, reply(0xA0, records, 300)}, {"3.3 /125", "B.3 /181", "B.3 /629"}, "00CD0A"},
-      {'r', {reply(0xA0, records, 60)}, {"3.4 /629"}, "00CD0A"},
-      {'r', {reply(0xA0, records, 20)}, {"3.5 /629"}, "00CD0A"},
-      {'r', {reply(0xA0, records, 20)}, {"3.6 /181"}, "00CD0A"},
-      {'r', {reply(0xA0, records, 5)}, {"3.7 /181"}, "00CD0A"},
-      {'r', {reply(0xA0, records, 8)}, {"3.8 /125"}, "00CD0A"},
+      {'r', {Reply{0xA8, records}}, {"3.1 /125"}, "08CD0A"},
+      {'r', {flipped(whole), whole}, {"3.2 /125", "B.2 /125"}, "00CD0A"},
+      {'r', {slow, slow, waiting(300)}, {"3.3 /125", "B.3 /181", "B.3 /629"}, "00CD0A"},
+      {'r', {waiting(60)}, {"3.4 /629"}, "00CD0A"},
+      {'r', {waiting(20)}, {"3.5 /629"}, "00CD0A"},
+      {'r', {waiting(20)}, {"3.6 /181"}, "00CD0A"},
+      {'r', {waiting(5)}, {"3.7 /181"}, "00CD0A"},
+      {'r', {waiting(8)}, {"3.8 /125"}, "00CD0A"},
       {'r',
        {silent, silent, silent, silent},
        {"3.9 /125", "B.9 /125", "B.9 /125", "B.9 /125"},
        "runtime: " + where + "the hub did not answer the frame, in 4 attempts"},
-      {'r', {slow, reply(0xA0, records)}, {"5.A /125", "D.A /181"}, "00CD0A"},
+      {'r', {slow, whole}, {"5.A /125", "D.A /181"}, "00CD0A"},
   };
   for (const Row& row : rows) {
     SCOPED_TRACE(row.frames[0]);
@@ -160,7 +160,7 @@ TEST_F(Sequencer, RepeatsUnderTheSameTagWhatMayHaveBeenDone) {
 }
 
 TEST_F(Sequencer, SaysWhatItSawAtEachAttempt) {
-  const Reply whole = reply(0xA0, records), badCrc = flipped(whole);
+  const Reply badCrc = flipped(whole);
   const std::string in4 = ", in 4 attempts", crc = "the CRC of the answer does not hold over 16 data bits";
   const std::string noHub = "no debug hub answers, TDO is ";
   const std::pair<std::vector<Answer>, std::string> cases[] = {
@@ -169,22 +169,18 @@ TEST_F(Sequencer, SaysWhatItSawAtEachAttempt) {
       {std::vector<Answer>(4, "01" + Bits(98, '0') + "1"), "the hub did not answer the frame" + in4},
       {std::vector<Answer>(4, Bits("0101011")), noHub + "another pattern, its first 32 bits 0000006A" + in4},
       {std::vector<Answer>(4, badCrc), crc + in4},
-      {{badCrc, silent, reply(0x50), Bits()},
+      {{badCrc, silent, Reply{0x50}, Bits()},
        "4 attempts: " + crc +
            "; the hub did not answer the frame; the answer begins with 50, which is no head; " + noHub +
            "all zeros"},
       {{noSuchCore}, "no such core, or it cannot be read"},
   };
   for (const auto& [answers, said] : cases) {
-    ScriptedSession fresh;
-    fresh.script->answers.assign(answers.begin(), answers.end());
     std::vector<unsigned char> result(5, 0x5A);
-    const auto call = [&] {
-      Qor_CoreComm::commandSequence(fresh.handle, readText, result.data(), 40, nullptr);
-    };
-    EXPECT_EQ(thrownBy(call), "runtime: " + where + said);
+    answer(answers);
+    EXPECT_EQ(run(readText, result.data(), 40), "runtime: " + where + said);
     EXPECT_EQ(result, std::vector<unsigned char>(5, 0x5A)) << said;
-    EXPECT_EQ(fresh.script->frames.size(), answers.size()) << said;
+    EXPECT_EQ(script.frames.size(), answers.size()) << said;
   }
   answer({});
   EXPECT_THROW(Qor_CoreComm::commandSequence(session.handle, writeText, nullptr, 0, nullptr),
@@ -203,66 +199,62 @@ TEST_F(Sequencer, GivesUpOnADesignClockThatStandsStillAfterTwoSeconds) {
   EXPECT_EQ(script.frames[2], "B.1 /629");
   EXPECT_EQ(script.frames.back(), "B.1 /629");
   EXPECT_LT(script.frames.size(), 60U);
-  answer({reply(0xA0, Bits(128, '1'))});
+  answer({word});
   EXPECT_EQ(status(), "nothing, 0");
-  answer({reply(0xA0, records)});
+  answer({whole});
   EXPECT_EQ(read().substr(6), "CD0A");
   EXPECT_EQ(script.frames, Lines({"5.2 /629"}));
 }
 
 TEST_F(Sequencer, DrawsOtherTagsAfterEightFailuresInARow) {
   for (const bool isWrite : {true, false}) {
-    answer({isWrite ? good : reply(0xA0, records), good});
-    EXPECT_EQ(isWrite ? write() : read().substr(6), isWrite ? "nothing" : "CD0A");
+    const auto expectDone = [&] {
+      answer({isWrite ? good : whole, good});
+      EXPECT_EQ(isWrite ? write() : read().substr(6), isWrite ? "nothing" : "CD0A");
+    };
+    expectDone();
     const unsigned before = script.tags.back() >> 4;
     for (int i = 0; i < 8; ++i) {
       EXPECT_EQ(script.tags.back() >> 4, before);
       answer({});
       EXPECT_NE(isWrite ? write() : read(), "nothing");
     }
-    answer({isWrite ? good : reply(0xA0, records), good});
-    EXPECT_EQ(isWrite ? write() : read().substr(6), isWrite ? "nothing" : "CD0A");
+    expectDone();
     EXPECT_NE(script.tags.back() >> 4, before);
     EXPECT_EQ(script.frames.size(), isWrite ? 2U : 1U);  // the hub must know new tags of writes first
   }
 }
 
-std::string hex8(std::size_t value) {
-  return hexOf(bitsOf(static_cast<unsigned>(value), 32));
-}
-
 TEST_F(Sequencer, BuildsAndChecksFramesOfEveryLengthWithLateLinesToo) {
   std::vector<QorJtag_Hub> hubs;
-  std::size_t late = 0;
   for (const unsigned bits : {1U, 7U, 8U, 9U, 55U, 63U, 64U, 65U, 1001U, 65600U}) {
-    Reply word = reply(0xA0, Bits(128, '1')), read = reply(0xA0, noise(bits)), write = good;
-    for (Reply* each : {&word, &read, &write}) {
-      each->lateTdi = bits % 3;
-      each->lateTdo = bits / 8 % 3;
-    }
-    answer({word, write, write, read});
+    const auto late = [bits](Reply reply) {
+      reply.lateTdi = bits % 3;
+      reply.lateTdo = bits / 8 % 3;
+      return reply;
+    };
+    answer({late(word), late(good), late(good), late({0xA0, noise(bits)})});
     if (bits != 1) script.answers.erase(script.answers.begin() + 1);
     EXPECT_EQ(status(), "nothing, 0");
     QorJtag_session_getHubs(session.handle, hubs);
     ASSERT_EQ(hubs.size(), 1U);
-    EXPECT_EQ(hubs[0].lateTdi, word.lateTdi);
-    EXPECT_EQ(hubs[0].lateTdo, word.lateTdo);
-    late = hubs[0].late();
+    EXPECT_EQ(hubs[0].lateTdi, bits % 3);
+    EXPECT_EQ(hubs[0].lateTdo, bits / 8 % 3);
     const Bits data = noise(bits - 1) + "1";
-    const std::string text = "00 1 0 01 0 " + hex8(bits + 1) + " " + hexOf(data + "0") +
-                             "\n00 1 0 02 0 00000004 0\n00 1 0 03 1 " + hex8(bits + 16) +
+    const std::string text = "00 1 0 01 0 " + hexOf(bitsOf(bits + 1, 32)) + " " + hexOf(data + "0") +
+                             "\n00 1 0 02 0 00000004 0\n00 1 0 03 1 " + hexOf(bitsOf(bits + 16, 32)) +
                              " 0\n00 1 0 04 1 00000004 0";
     const unsigned bytes = (bits + 16 + 7) / 8 + 1;
     const std::string digits = this->read(text, bytes);
     EXPECT_EQ(bitsOfHex(digits, bytes * 8).substr(0, bits), noise(bits)) << bits;
-    EXPECT_EQ(script.frames.back().substr(4), "/" + std::to_string(109 + bits + late));
-    EXPECT_EQ(script.frames.rbegin()[1].substr(4), hexOf(data) + " /" + std::to_string(141 + bits + late));
+    EXPECT_EQ(script.frames.back().substr(4), "/" + std::to_string(109 + bits + hubs[0].late()));
+    EXPECT_EQ(script.frames.rbegin()[1].substr(4),
+              hexOf(data) + " /" + std::to_string(141 + bits + hubs[0].late()));
   }
 }
 
 TEST_F(Sequencer, TakesAReadForFailedWhenALaterPairOfItsTextFails) {
   const std::string otherCore = "\n01 2 0 03 1 00000020 0\n01 2 0 04 1 00000004 0";
-  const Reply whole = reply(0xA0, records);
   answer({whole, whole});
   EXPECT_EQ(read(readText + "\n" + readText + otherCore, 15),
             "runtime: device 1, user chain 2, core 0: no debug hub answers, TDO is all zeros, in 4 attempts");
@@ -271,7 +263,7 @@ TEST_F(Sequencer, TakesAReadForFailedWhenALaterPairOfItsTextFails) {
   EXPECT_EQ(script.frames, Lines({"5.3 /125", "3.4 /125"}));
 }
 
-std::vector<std::string> progressSeen;
+Lines progressSeen;
 unsigned abortAt;
 
 QOR_PROGRESS_RETURN noteProgress(unsigned, unsigned done, unsigned count, QOR_PROGRESS_STATUS status) {
@@ -281,29 +273,26 @@ QOR_PROGRESS_RETURN noteProgress(unsigned, unsigned done, unsigned count, QOR_PR
 }
 
 TEST_F(Sequencer, TellsItsProgressAndCanBeAborted) {
-  const auto twice = [this] {
-    progressSeen.clear();
-    Qor_CoreComm::commandSequence(session.handle, writeText + "\n" + writeText, nullptr, 0, noteProgress);
-  };
+  const std::string twice = writeText + "\n" + writeText;
   abortAt = 3;
   answer({good, good, good});
-  twice();
+  EXPECT_EQ(run(twice, nullptr, 0, noteProgress), "nothing");
   EXPECT_EQ(progressSeen, Lines({"0/2", "1/2", "2/2 done"}));
   abortAt = 1;
   answer({good});
-  EXPECT_EQ(thrownBy(twice), "logic: Qor abort command");
+  EXPECT_EQ(run(twice, nullptr, 0, noteProgress), "logic: Qor abort command");
   EXPECT_EQ(script.frames.size(), 1U);
 }
 
 TEST_F(Sequencer, DeliversAsManyStatusBitsAsItIsAskedForAndNoneWithoutACore) {
   QOR_CORE_INFO info{};
-  std::vector<unsigned char> word(3, 0xFF);
+  std::vector<unsigned char> seen(3, 0xFF);
   const auto bits = [&](unsigned char* into, unsigned count) {
     return QorCore_getCoreStatus(session.handle, {0, 1, 0}, &info, into, count);
   };
-  answer({reply(0xA0, Bits(128, '1')), reply(0xA0, Bits(128, '1')), noSuchCore});
-  EXPECT_EQ(bits(word.data(), 12), 0U);
-  EXPECT_EQ(word, std::vector<unsigned char>({0xFF, 0x0F, 0xFF}));
+  answer({word, word, noSuchCore});
+  EXPECT_EQ(bits(seen.data(), 12), 0U);
+  EXPECT_EQ(seen, std::vector<unsigned char>({0xFF, 0x0F, 0xFF}));
   EXPECT_EQ(bits(nullptr, 0), 0U);
   EXPECT_EQ(info.core_revision, 255U);
   EXPECT_EQ(status(), "nothing, 1");
@@ -313,13 +302,10 @@ TEST_F(Sequencer, DeliversAsManyStatusBitsAsItIsAskedForAndNoneWithoutACore) {
 }
 
 TEST_F(Sequencer, RefusesNullRecordsAndResultsOfTheWrongSize) {
-  Qor_ByteBuffer word(16, 0, 0);
+  Qor_ByteBuffer into(16, 0, 0);
   unsigned char result[5];
-  const auto run = [this](const std::string& text, unsigned char* into, unsigned bits) {
-    return thrownBy([&] { Qor_CoreComm::commandSequence(session.handle, text, into, bits, nullptr); });
-  };
   EXPECT_EQ(thrownBy([&] {
-              Qor_CoreComm::getCoreStatus(session.handle, {0, 1, 0}, nullptr, word, 128);
+              Qor_CoreComm::getCoreStatus(session.handle, {0, 1, 0}, nullptr, into, 128);
             }),
             "logic: the core information record of a status read is null");
   EXPECT_EQ(run(readText, result, 32), "logic: the result has 32 bits, but the command text returns 40");
