@@ -1,6 +1,5 @@
 // Signals files and play scripts: what is refused, and where it says so.
 #include <gtest/gtest.h>
-#include <sys/stat.h>
 #include <unistd.h>
 
 #include <filesystem>
@@ -75,16 +74,6 @@ TEST(SignalFile, NamesSeveralCores) {
   EXPECT_EQ(qor::refText(table.cores()[1]), "0.1.0");
   EXPECT_EQ(table.find("a", qor::Direction::output).core, 1U);
   EXPECT_EQ(qor::bitsText(table.find("a", qor::Direction::input).bits), "7,0");
-}
-
-TEST(Files, ThatAreNoneAreRefusedWithoutWaiting) {
-  const File file("");
-  std::filesystem::remove(file.path);
-  EXPECT_EQ(problemOfSignals(file.path), " cannot be opened: No such file or directory");
-  ASSERT_EQ(mkfifo(file.path.c_str(), 0600), 0);
-  EXPECT_EQ(problemOfSignals(file.path), " cannot be opened: it is not a regular file");
-  EXPECT_EQ(problemOf(file.path, [](const std::string& path) { qor::readPlayScript(path, {}); }),
-            "cannot read the file " + file.path + ": Invalid argument");
 }
 
 TEST(PlayScript, TakesRowsOrSaysWhatIsWrong) {

@@ -4,8 +4,6 @@
 //   u TYPE NAME                removes a name
 //   w KEY=TEXT...              writes values by name
 //   a NAME SAMPLES SIZE BURST  writes SAMPLES values of a name from SIZE bytes
-//   s ASYNC SYNC               writes whole ports of so many bits
-//   g ASYNC SYNC               reads them
 // A call that fails reports it once and sends nothing. What was read can be written again and changes nothing.
 #include <sstream>
 
@@ -45,7 +43,7 @@ class Run {
     const bool done = isDone(letter, words);
     require(messages_ == (done ? 0 : 1), "one message for a failure: " + line);
     require(done || board_->exchanges() == sent, "nothing is sent by a failure: " + line);
-    if (done && (letter == 'w' || letter == 's' || letter == 'a')) checkRoundTrip(line);
+    if (done && (letter == 'w' || letter == 'a')) checkRoundTrip(line);
   }
 
  private:
@@ -53,9 +51,7 @@ class Run {
     if (letter == 'd') return define(words);
     if (letter == 'u') return undefine(words);
     if (letter == 'w') return write(words);
-    if (letter == 'a') return writeSamples(words);
-    if (letter == 's') return setPorts(words);
-    return letter != 'g' || getPorts(words);
+    return letter != 'a' || writeSamples(words);
   }
 
   template <class Value>
@@ -100,21 +96,6 @@ class Run {
         thrownBy([&] { core->writeValues(session_, ref, {name}, &values, &size, 1, samples, burst); });
     messages_ = wrong.empty() ? 0 : 1;
     return wrong.empty();
-  }
-
-  bool setPorts(std::istream& words) {
-    const auto async = next<unsigned>(words), sync = next<unsigned>(words);
-    const Bytes bytes(16 * 9, 0x96);
-    const unsigned char* bits = bytes.data();
-    return QorVIO_setPortBits(session_, ref, bits, bits, async, bits, bits, sync) == 0;
-  }
-
-  bool getPorts(std::istream& words) {
-    const auto async = next<unsigned>(words), sync = next<unsigned>(words);
-    Bytes b[8];
-    for (Bytes& bytes : b) bytes.resize(9);
-    return QorVIO_getPortBits(session_, ref, b[0].data(), b[1].data(), b[2].data(), async, b[3].data(),
-                              b[4].data(), b[5].data(), b[6].data(), b[7].data(), sync) == 0;
   }
 
   /// The values of both ports.

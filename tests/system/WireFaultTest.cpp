@@ -309,8 +309,6 @@ TEST_F(Wires, AreCheckedByAnOpenOcdOfOurOwn) {
        "IR of 8 bits by its capture"},
       {"openocd:?config=" + written("longer.cfg", adapter(port, 7) + cpld),
        "openocd does not trust the chain; it says: cpld.tap: IR capture error; saw 0x80 not 0x1"},
-      {openOcd + "&board=" + written("one.toml", "[[device]]\n"),
-       "the chain has 2 devices, the board file says 1"},
       {"openocd:?timeout=1",
        "the cable URL \"openocd:?timeout=1\" must name a server, HOST:PORT, or a configuration to start one, "
        "?config=FILE"},

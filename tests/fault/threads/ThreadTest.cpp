@@ -61,8 +61,13 @@ TEST(Threads, HaveACoreEachAndSomeSetTheirsUpAnew) {
     for (unsigned round = 0; round < rounds; ++round) {
       if (worker % 2 == 1) {
         EXPECT_EQ(QorVIO_terminateCore(own.session, own.ref), 0U);
+        EXPECT_EQ(QorRT::Qor_CoreList::getCore(own.session, own.ref), nullptr);
         EXPECT_EQ(QorVIO_initCore(own.session, own.ref), 0U);
       }
+      for (int look = 0; look < 50; ++look)  // meanwhile others change the list
+        EXPECT_NE(QorRT::Qor_CoreList::getCore(own.session, own.ref), nullptr);
+      Board brief("sim:");  // and the table of sessions
+      EXPECT_EQ(VioCore(brief, first).read()["async_in_data"], "00");
       own.write({{"async_out_data", digit(worker) + digit(round) + "0000"}, {"sync_out_data", digit(round)}});
       TextMap values = own.read();
       EXPECT_EQ(values["async_in_data"], digit(worker) + digit(round) + "0000");
@@ -70,33 +75,6 @@ TEST(Threads, HaveACoreEachAndSomeSetTheirsUpAnew) {
     }
   });
   EXPECT_THAT(boards[0].takeMessages(), testing::IsEmpty());
-}
-
-TEST(Threads, SetUpAndRemoveACoreEach) {
-  auto builder = chain().device(0x11);
-  for (unsigned worker = 0; worker < workers; ++worker) builder.core(1, worker, core());
-  Board board(builder.cable());
-  together([&](unsigned worker) {
-    const QOR_CORE_REF own{0, 1, worker};
-    for (unsigned round = 0; round < 5 * rounds; ++round) {
-      EXPECT_EQ(QorVIO_initCore(board.session, own), 0U);
-      for (int look = 0; look < 50; ++look)  // meanwhile others change the list
-        EXPECT_NE(QorRT::Qor_CoreList::getCore(board.session, own), nullptr);
-      EXPECT_EQ(QorVIO_terminateCore(board.session, own), 0U);
-      EXPECT_EQ(QorRT::Qor_CoreList::getCore(board.session, own), nullptr);
-    }
-  });
-}
-
-TEST(Threads, OpenAndCloseASessionEach) {
-  together([](unsigned worker) {
-    for (unsigned round = 0; round < rounds; ++round) {
-      Board board("sim:");
-      VioCore own(board, first);
-      own.write({{"async_out_data", digit(worker) + digit(round)}});
-      EXPECT_EQ(own.read()["async_in_data"], digit(worker) + digit(round));
-    }
-  });
 }
 
 TEST(Threads, AreToldThatALockWasNotFreeInTime) {
