@@ -3,6 +3,8 @@
 #include <algorithm>
 #include <utility>
 
+#include "os/Cancel.h"
+
 namespace QorRT {
 
 Qor_Session::Qor_Session(std::unique_ptr<Qor_Cable> cable)
@@ -35,6 +37,7 @@ std::vector<Qor_Session::CloseHook> Qor_Session::takeHooks() noexcept {
 }
 
 void Qor_Session::shutDown(unsigned session) noexcept {
+  const os::CancelLater guard;
   for (const CloseHook hook : takeHooks()) hook(session);
   cable_.reset();
 }

@@ -398,6 +398,31 @@ TEST_F(Wires, OpenOcdHasNothingOfItsHostAndEndsThoughACopyOfThatLives) {
   waitpid(copy, nullptr, 0);
 }
 
+void* readForEver(void* board) {
+  unsigned char bits = 0;
+  for (const unsigned session = static_cast<Board*>(board)->session;;)
+    QorVIO_getPortBits(session, {0, 1, 0}, &bits, nullptr, nullptr, 8, nullptr, nullptr, nullptr, nullptr,
+                       nullptr, 0);
+}
+
+TEST_F(Wires, StayWhenAThreadThatReadsIsCancelled) {
+#ifdef __SANITIZE_ADDRESS__
+  GTEST_SKIP() << "AddressSanitizer aborts when a cancelled thread unwinds";
+#endif
+  Board board(openOcd);
+  VioCore core(board, {0, 1, 0});
+  const std::string before = children().back();
+  for (int i = 0; i < 50; ++i) {
+    pthread_t thread;
+    ASSERT_EQ(pthread_create(&thread, nullptr, readForEver, &board), 0);
+    std::this_thread::sleep_for(std::chrono::microseconds(100 * i));
+    pthread_cancel(thread);
+    pthread_join(thread, nullptr);
+  }
+  core.read();
+  EXPECT_EQ(children().back(), before);
+}
+
 }  // namespace
 
 // In the place of the system's: looks up one name for as long as a test likes.

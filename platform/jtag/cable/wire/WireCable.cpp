@@ -3,6 +3,8 @@
 #include <algorithm>
 #include <stdexcept>
 
+#include "os/Cancel.h"
+
 namespace QorRT {
 namespace {
 
@@ -24,7 +26,9 @@ WireCable::WireCable(WireUrl url, StopFunction stop)
       stop_(std::move(stop)),
       board_(url_.board.empty() ? std::vector<DeviceEntry>() : boardDevices(url_.board)) {}
 
+// Sockets and a server's process are used in destructors too: a thread is not cancelled until it has done with them.
 void WireCable::open() {
+  const os::CancelLater guard;
   try {
     keep(connect());
     connected_ = true;
@@ -38,12 +42,16 @@ void WireCable::run(std::vector<Qor_Scan>& scans) {
   if (!connected_) open();
   std::size_t tcks = 0;
   for (const Qor_Scan& scan : scans) tcks += tcksOf(scan);
-  try {
-    exchange(scans, deadlineOf(tcks));
-  } catch (...) {
-    giveUp();
-    throw;
+  {
+    const os::CancelLater guard;
+    try {
+      exchange(scans, deadlineOf(tcks));
+    } catch (...) {
+      giveUp();
+      throw;
+    }
   }
+  os::endIfCancelled();
 }
 
 Deadline WireCable::deadlineOf(std::size_t tcks) const {
