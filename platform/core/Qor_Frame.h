@@ -52,6 +52,7 @@ enum class Qor_Verdict {
 struct Qor_Answer {
   bool isRefused() const { return (head & 4) != 0; }
   bool isNoSuchCore() const { return (head & 2) != 0; }
+  bool isOfTwoCores() const { return isRefused() && isNoSuchCore(); }  // nothing else has both
   unsigned flags() const { return head & 0xF; }
 
   Qor_Verdict verdict;

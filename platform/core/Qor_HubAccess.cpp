@@ -116,6 +116,7 @@ Qor_Answer Qor_HubAccess::ask(Qor_Request request, Qor_WaitingRoom& room) {
     std::string seen;
     Qor_Answer answer = exchange(request, room.bits(), isRepeat, seen);
     const bool isWhole = answer.verdict == Qor_Verdict::good;
+    if (isWhole && answer.isOfTwoCores()) fail("two cores have this index, so the hub obeys neither");
     if (isWhole && !answer.isRefused()) {
       room.needed(answer.waited);
       return answer;

@@ -174,6 +174,7 @@ TEST_F(Sequencer, SaysWhatItSawAtEachAttempt) {
            "; the hub did not answer the frame; the answer begins with 50, which is no head; " + noHub +
            "all zeros"},
       {{noSuchCore}, "no such core, or it cannot be read"},
+      {{Reply{0xA6}}, "two cores have this index, so the hub obeys neither"},
   };
   for (const auto& [answers, said] : cases) {
     std::vector<unsigned char> result(5, 0x5A);

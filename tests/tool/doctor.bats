@@ -3,25 +3,29 @@
 load processes
 
 @test "doctor finds everything well on the demo board" {
-  gives 0 "$(printf 'ok  *\n%.0s' {1..7})" doctor
-  gives 0 $'*\nok       user registers       hubs at 0.1, 1.1\n*\nok       write and read back  8 bits written and read back' \
+  gives 0 "$(printf 'ok  *\n%.0s' {1..7})"$'\nok       line                 100 status words read, none damaged' doctor
+  gives 0 $'*\nok       user registers       hubs at 0.1, 1.1\n*\nok       write and read back  8 bits written and read back\n*' \
     doctor --write
   gives 0 $'*\nok       status word          core 1.1.0, oldest layout, outputs 4 async 4 sync, inputs 16 async 16 sync\n*
-ok       write and read back  the design does not loop its outputs back' --core 1.1.0 doctor --write
+ok       write and read back  the design does not loop its outputs back\n*' --core 1.1.0 doctor --write
 }
 
 @test "doctor names the step that fails, what it saw, and what to try" {
   printf '[[device]]\nidcode = 0x11\n' >empty.toml
   gives 1 $'FAILED   user registers       no debug hub at any user register: all zeros\n*\nqorvio: the check failed: user registers' \
     --cable sim:empty.toml --quiet doctor
-  [ "$("$QORVIO" --cable sim:empty.toml --json doctor 2>&1 | grep -c '"result": "skipped"')" -eq 3 ]
+  [ "$("$QORVIO" --cable sim:empty.toml --json doctor 2>&1 | grep -c '"result": "skipped"')" -eq 4 ]
   run "$QORVIO" --cable "sim:$(printf '\377')" --json doctor # JSON for any bytes
   jq . <<<"${output%qorvio:*}" >/dev/null
   printf '[[device]]\nidcode = 0x10\n' >even.toml
   gives 1 'FAILED   idcodes              bit 0 is not 1: 00000010*' --cable sim:even.toml --quiet doctor
   printf 'tcks_per_clock = 0\n[[device]]\n[[device.core]]\nuser_chain = 1\nindex = 0\ntype = "vio"\nsync_in = 4\n' >stopped.toml
-  gives 1 'FAILED   read                 device 0, user chain 1, core 0: design clock stopped, *' \
+  gives 1 $'FAILED   read                 device 0, user chain 1, core 0: design clock stopped, *\n* the clock of the core*' \
     --cable sim:stopped.toml --quiet doctor
+  sed 1s/0/200/ stopped.toml >slow.toml
+  gives 0 '*4 inputs delivered, CRC right; the design clock is slow: 1 repeat with more room*' --cable sim:slow.toml doctor
+  QORVIO=$QORVIO_LOSSY gives 1 "FAILED   line  *the line is noisy: 100 status words took * repeats (no hub's answer *" \
+    --cable noisy: --quiet doctor
 }
 
 @test "play checks a whole table first, then drives it in bursts where it can" {
@@ -77,7 +81,7 @@ CASES
 }
 
 @test "doctor drives no output whose value it cannot give back, unless it is forced to" {
-  export QORVIO=$QORVIO_LOSSY QORVIO_CABLE=lossy:99 QORVIO_CORE=0.1.0
+  export QORVIO=$QORVIO_LOSSY QORVIO_CABLE=lossy:999 QORVIO_CORE=0.1.0
   "$QORVIO" toggle 'async_out_data[0]' --assume 0
   gives 1 'FAILED   write and read back  what the outputs were last given is not known; --force drives them and leaves zeros*' \
     --quiet doctor --write

@@ -23,7 +23,7 @@ teardown() { kill "$pid" ${host:+"$host"} 2>/dev/null || true; }
     "$QORVIO" --cable "$cable" read >/dev/null
     "$QORVIO" --cable "$cable" write async_out_data=A5
     gives 0 $'*\nasync_in_data  0xA5   ↕*' --cable "$cable" read
-    gives 0 '*8 bits written and read back' --cable "$cable" doctor --write
+    gives 0 '*8 bits written and read back*' --cable "$cable" doctor --write
   done
 }
 

@@ -1,5 +1,5 @@
 // Opens "lossy:N" in the place of all other cables: the demo board behind a link that goes down after N exchanges.
-// "slow:N" is the same, with a third of a second for each of them.
+// "slow:N" is the same, with a third of a second for each of them. "noisy:" flips bits of what comes back.
 #include <charconv>
 #include <chrono>
 #include <stdexcept>
@@ -14,6 +14,11 @@ namespace QorRT {
 
 std::unique_ptr<Qor_Cable> openCable(const char* url, StopFunction) {
   const std::string_view text(url);
+  if (text == "noisy:") {
+    auto noisy = std::make_unique<qorsim::FaultyCable>(qorsim::demoBoard().cable());
+    noisy->noise(0, 2e-4);
+    return noisy;
+  }
   const bool isSlow = text.substr(0, 5) == "slow:";
   const std::string_view kind = isSlow ? "slow:" : "lossy:";
   unsigned exchanges = 0;

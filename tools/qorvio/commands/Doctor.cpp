@@ -23,6 +23,37 @@ struct Check {
   std::function<std::string()> run;  // returns what was seen, or throws what is wrong
 };
 
+/// What to try for a failure that says what it is.
+struct Cure {
+  const char* seen;
+  const char* next;
+};
+
+constexpr Cure cures[] = {
+    {"no debug hub",
+     "is the design with the core loaded, and its hub on a user register? Without a board file the opcodes "
+     "of USER1 "
+     "to USER4 are taken to be 0x02 to 0x05. For others add ?board=FILE to the cable; in it one [[device]] "
+     "for each, "
+     "the one nearest to TDO first, and for this one the line user_opcodes = [0x02, 0x03]"},
+    {"did not answer the frame",
+     "does TDI reach the hub? If it is late there, and other devices are before it: LATE_TDI of the wrapper. "
+     "If only "
+     "writes fail so: the widths of the status word are not those of the core"},
+    {"CRC of the answer does not hold",
+     "the widths of the status word are not those of the core (below version 6.2 at most 255 bits a port), "
+     "or the line "
+     "is noisy: a slower TCK, shorter wires"},
+    {"design clock stopped", "the clock of the core, clk, does not run, or is very slow"},
+    {"two cores have this index", "give each core of the hub an INDEX of its own"},
+};
+
+const char* nextFor(const std::string& seen, const Check& check) {
+  for (const Cure& cure : cures)
+    if (seen.find(cure.seen) != std::string::npos) return cure.next;
+  return check.next;
+}
+
 std::string idcodes(const std::vector<QorRT::Qor_Device>& devices) {
   std::string text;
   for (const QorRT::Qor_Device& each : devices) {
@@ -57,6 +88,55 @@ std::string hubs(QorRT::Qor_Cable& cable) {
   if (found.empty())
     throw Failure("no debug hub at any user register" + (seen.empty() ? ": all zeros" : seen));
   return "hubs at " + found + seen;
+}
+
+QorJtag_Statistics statisticsOf(const Link& link) {
+  QorJtag_Statistics statistics;
+  QorJtag_session_getStatistics(link.session(), statistics);
+  return statistics;
+}
+
+std::string lateBy(const char* line, unsigned tcks) {
+  return tcks == 0 ? "" : std::string(", ") + line + " " + counted(tcks, "TCK") + " late";
+}
+
+std::string cores(Link& link) {
+  std::string found = counted(findCores(link).size(), "core");
+  std::vector<QorJtag_Hub> hubs;
+  QorJtag_session_getHubs(link.session(), hubs);
+  for (const QorJtag_Hub& hub : hubs) {
+    if (hub.late() == 0) continue;
+    found += "; hub " + std::to_string(hub.device_index) + "." + std::to_string(hub.user_chain_number) +
+             lateBy("TDI", hub.lateTdi) + lateBy("TDO", hub.lateTdo);
+  }
+  return found;
+}
+
+std::string inputs(Link& link, Core& core) {
+  const unsigned bits = core.info().async_input_count + core.info().sync_input_count;
+  const std::uint64_t before = statisticsOf(link).repeatsSlow;
+  Sample sample = emptySample(core.info());
+  core.read(sample);
+  if (bits == 0) return "this core has no inputs";
+  const std::uint64_t repeats = statisticsOf(link).repeatsSlow - before;
+  return counted(bits, "input") + " delivered, CRC right" +
+         (repeats > 0 ? "; the design clock is slow: " + counted(repeats, "repeat") + " with more room" : "");
+}
+
+constexpr unsigned trials = 100;
+
+std::string quality(Link& link, const Core& core) {
+  const QorJtag_Statistics before = statisticsOf(link);
+  for (unsigned i = 0; i < trials; ++i) readInfo(link, core.ref());
+  const QorJtag_Statistics after = statisticsOf(link);
+  const std::uint64_t noHub = after.repeatsNoHub - before.repeatsNoHub,
+                      noHead = after.repeatsNoHead - before.repeatsNoHead,
+                      badCrc = after.repeatsBadCrc - before.repeatsBadCrc;
+  if (noHub + noHead + badCrc == 0) return counted(trials, "status word") + " read, none damaged";
+  throw Failure("the line is noisy: " + counted(trials, "status word") + " took " +
+                counted(noHub + noHead + badCrc, "repeat") + " (no hub's answer " + std::to_string(noHub) +
+                ", frame not answered " + std::to_string(noHead) + ", wrong CRC " + std::to_string(badCrc) +
+                ")");
 }
 
 std::string layout(Link& link, const Core& core) {
@@ -124,32 +204,24 @@ std::vector<Check> checksOf(Context& context, std::unique_ptr<QorRT::Qor_Cable>&
        }},
       {"idcodes", "compare with the data sheets; a slower TCK helps on long wires",
        [&] { return idcodes(cable->devices()); }},
-      {"user registers",
-       "is the design with the core loaded, and its hub on a user register? "
-       "Other user registers: cable ...?board=FILE, in it a line user_opcodes = [0x02, 0x03] for the device",
-       [&] { return hubs(*cable); }},
-      {"cores", "do core indexes collide, or does the hub have none?",
+      {"user registers", "is the design with the core loaded?", [&] { return hubs(*cable); }},
+      {"cores", "a slower TCK helps on long wires",
        [&] {
          cable.reset();
-         return counted(findCores(context.link()).size(), "core");
+         return cores(context.link());
        }},
       {"status word", "choose a VIO core with --core; qorvio scan shows them",
        [&] {
          return "core " + refText(context.core().ref()) + ", " + layout(context.link(), context.core());
        }},
-      {"read", "is the clock of the design running?",
-       [&] {
-         Sample sample = emptySample(context.core().info());
-         context.core().read(sample);
-         const QORVIO_CORE_INFO& info = context.core().info();
-         const unsigned bits = info.async_input_count + info.sync_input_count;
-         return bits == 0 ? "this core has no inputs" : counted(bits, "input") + " delivered, CRC right";
-       }},
+      {"read", "is the clock of the design running?", [&] { return inputs(context.link(), context.core()); }},
   };
   if (options.mayWrite) {
     checks.push_back({"write and read back", "is the clock of the design running?",
                       [&] { return loop(context.core(), options.isForced); }});
   }
+  checks.push_back({"line", "calls succeed by repeats; a slower TCK, shorter wires or a better ground help",
+                    [&] { return quality(context.link(), context.core()); }});
   return checks;
 }
 
@@ -168,13 +240,13 @@ void doctor(Context& context, const DoctorOptions& options) {
     const bool isFailure = result == "FAILED";
     if (!failed.empty()) result = "skipped";
     if (isFailure) failed = check.name;
-    json.push_back(
-        {{"step", check.name}, {"result", result}, {"seen", seen}, {"next", isFailure ? check.next : ""}});
+    const char* const next = isFailure ? nextFor(seen, check) : "";
+    json.push_back({{"step", check.name}, {"result", result}, {"seen", seen}, {"next", next}});
     if (context.settings.json || (context.settings.quiet && !isFailure)) continue;
     const Color color = isFailure ? Color::red : result == "ok" ? Color::green : Color::dim;
     std::printf("%s  %-20s %s\n", colored(color, result + std::string(7 - result.size(), ' ')).c_str(),
                 check.name, printable(seen).c_str());
-    if (isFailure) std::printf("         %-20s %s\n", "", check.next);
+    if (isFailure) std::printf("         %-20s %s\n", "", next);
   }
   if (context.settings.json) print({{}, json}, true);
   if (!failed.empty()) throw Failure("the check failed: " + failed);
