@@ -79,8 +79,9 @@ def attack_by_servers():
 
 
 def turning(board, trickles):
-    """A server that passes a board on until it is told to turn: then it is silent, or sends a byte now and then."""
-    turned = threading.Event()
+    """A server that passes a board on until it is to turn: then it is silent, or sends a byte now and then. Returns its
+    port, the event of turning, and what it has been sent."""
+    turned, sent = threading.Event(), bytearray()
     server = socket.create_server(("127.0.0.1", 0))
 
     def serve():
@@ -88,17 +89,28 @@ def turning(board, trickles):
         link = socket.create_connection(board)
         threading.Thread(target=answer, args=(client, link), daemon=True).start()
         while (data := client.recv(65536)) and not turned.is_set():
+            sent.extend(data)
             link.sendall(data)
+        link.close()
 
     def answer(client, link):
-        while (data := link.recv(65536)) and not turned.is_set():
-            client.sendall(data)
         with contextlib.suppress(OSError):
+            while (data := link.recv(65536)) and not turned.is_set():
+                client.sendall(data)
             while trickles:
                 client.sendall(b"0")
                 time.sleep(0.2)
     threading.Thread(target=serve, daemon=True).start()
-    return server.getsockname()[1], turned
+    return server.getsockname()[1], turned, sent
+
+
+@contextlib.contextmanager
+def simulated():
+    """The address of a simulated board."""
+    board = subprocess.Popen([*QORVIO, "--json", "simulate"], stdout=subprocess.PIPE, stderr=subprocess.DEVNULL)
+    yield "127.0.0.1", json.loads(board.stdout.readline())["port"]
+    board.terminate()
+    board.wait()
 
 
 def catches(number, pid):
@@ -108,34 +120,35 @@ def catches(number, pid):
 
 def attack_by_servers_that_turn():
     """A server that falls silent while a command goes on: Ctrl-C ends the wait, though its own time is an hour."""
-    simulated = subprocess.Popen([*QORVIO, "--json", "simulate"], stdout=subprocess.PIPE,
-                                 stderr=subprocess.DEVNULL)
-    board = ("127.0.0.1", json.loads(simulated.stdout.readline())["port"])
-    for command, number, trickles in itertools.product(
-            ("record --for 1h --out turned.csv", "wait async_in_data==77 --timeout 1h", "watch", "events",
-             "press async_out_data[0] --for 1s"), (signal.SIGINT, signal.SIGTERM), (False, True)):
-        port, turned = turning(board, trickles)
-        host = subprocess.Popen([*QORVIO, "--cable", f"rbb:127.0.0.1:{port}?timeout=3600", *command.split()],
-                                cwd=SCRATCH, env={**os.environ, "XDG_STATE_HOME": str(SCRATCH / "state")},
-                                stdout=subprocess.DEVNULL, stderr=subprocess.PIPE, stdin=subprocess.DEVNULL)
-        deadline = time.monotonic() + HANGS
-        while not catches(number, host.pid) and time.monotonic() < deadline:
-            time.sleep(0.02)
-        time.sleep(0.3)
-        turned.set()
-        time.sleep(0.7)  # it waits by now
-        host.send_signal(number)
-        try:
-            text = host.communicate(timeout=HANGS)[1].decode(errors="replace")
-            # Of a program in valgrind it cannot be seen whether it catches signals already.
-            ends = (0, 1, 128 + number, -number if VALGRIND else 0)
-            failure = "" if host.returncode in ends else f"status {host.returncode}: {text[:200]}"
-        except subprocess.TimeoutExpired:
-            failure = f"still running after {HANGS} s"
-            host.kill()
-        check(f"{command}, {number.name}, {'a byte now and then' if trickles else 'silence'}", failure)
-    simulated.terminate()
-    simulated.wait()
+    with simulated() as board:
+        for command, number, trickles in itertools.product(
+                ("record --for 1h --out turned.csv", "wait async_in_data==77 --timeout 1h", "watch", "events",
+                 "press async_out_data[0] --for 1s"), (signal.SIGINT, signal.SIGTERM), (False, True)):
+            check(f"{command}, {number.name}, {'a byte now and then' if trickles else 'silence'}",
+                  failure_to_stop(command.split(), number, turning(board, trickles)))
+
+
+def failure_to_stop(command, number, server):
+    port, turned, _ = server
+    host = subprocess.Popen([*QORVIO, "--cable", f"rbb:127.0.0.1:{port}?timeout=3600", *command],
+                            cwd=SCRATCH, env={**os.environ, "XDG_STATE_HOME": str(SCRATCH / "state")},
+                            stdout=subprocess.DEVNULL, stderr=subprocess.PIPE, stdin=subprocess.DEVNULL)
+    deadline = time.monotonic() + HANGS
+    while not catches(number, host.pid) and time.monotonic() < deadline:
+        time.sleep(0.02)
+    time.sleep(0.3)
+    turned.set()
+    time.sleep(0.7)  # it waits by now
+    host.send_signal(number)
+    try:
+        text = host.communicate(timeout=HANGS)[1].decode(errors="replace")
+    except subprocess.TimeoutExpired:
+        host.kill()
+        host.wait()
+        return f"still running after {HANGS} s"
+    # Of a program in valgrind it cannot be seen whether it catches signals already.
+    ends = (0, 1, 128 + number, -number if VALGRIND else 0)
+    return "" if host.returncode in ends else f"status {host.returncode}: {text[:200]}"
 
 
 def hostile_files():
@@ -199,30 +212,20 @@ def attack_by_kill():
 
 
 def attack_by_descriptors():
-    """Without standard descriptors no error text reaches the wires of a board."""
-    allowed = b"".join(bytes([c]) for c in b"01234567RrstuBbQ")
-    for closed in itertools.chain.from_iterable(itertools.combinations((0, 1, 2), n) for n in (1, 2, 3)):
-        received = bytearray()
-        with socket.create_server(("127.0.0.1", 0)) as board:
-            def listen():
-                client, _ = board.accept()
-                with client:
-                    while data := client.recv(4096):
-                        received.extend(data)
-                        client.sendall(b"0" * data.count(b"R"))
-            listener = threading.Thread(target=listen, daemon=True)
-            listener.start()
+    """Without standard descriptors nothing that is printed reaches the wires of a board."""
+    with simulated() as board:
+        for closed in itertools.chain.from_iterable(itertools.combinations((0, 1, 2), n) for n in (1, 2, 3)):
+            port, _, sent = turning(board, False)
             redirect = " ".join(f"{fd}>&-" if fd else "0<&-" for fd in closed)
-            port = board.getsockname()[1]
             try:
                 done = subprocess.run(["sh", "-c", f'exec "$@" {redirect}', "sh", *QORVIO, "--cable",
-                                       f"rbb:127.0.0.1:{port}?timeout=1", "scan"], timeout=HANGS, stdout=subprocess.DEVNULL, stderr=subprocess.DEVNULL)
-                failure = f"crashed ({done.returncode})" if done.returncode < 0 or done.returncode > 2 else ""
+                                       f"rbb:127.0.0.1:{port}", "watch", "--frames", "2"], timeout=HANGS,
+                                      stdout=subprocess.DEVNULL, stderr=subprocess.DEVNULL)
+                failure = "" if done.returncode == 0 else f"exit status {done.returncode}"
             except subprocess.TimeoutExpired:
                 failure = "hangs"
-            listener.join(HANGS)
-        others = bytes(received).translate(None, allowed)
-        check(f"descriptors {closed} closed", failure or (f"sent {others[:60]!r} to the board" if others else ""))
+            others = bytes(sent).translate(None, b"01234567RrstuBbQ")
+            check(f"descriptors {closed} closed", failure or (f"sent {others[:60]!r} to the board" if others else ""))
 
 
 def main():
