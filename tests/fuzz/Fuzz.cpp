@@ -51,6 +51,7 @@ int main(int argc, char** argv) {
       std::ifstream file(entry.path(), std::ios::binary);
       const std::string input{std::istreambuf_iterator<char>(file), {}};
       std::printf("%s\n", entry.path().c_str());
+      require(file.is_open(), "it can be read");
       fuzz(input);
       ++count;
     }

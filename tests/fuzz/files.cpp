@@ -51,14 +51,16 @@ void fuzz(std::string_view input) {
   static const std::string folder = [] {
     std::string name = std::filesystem::temp_directory_path() / "fuzz.XXXXXX";
     require(mkdtemp(name.data()) != nullptr, "a folder");
-    std::filesystem::current_path(name);
     return name;
   }();
   const std::string kind(input.substr(0, input.find('\n')));
   const std::string text = grown(input.substr(std::min(kind.size() + 1, input.size())));
   if (kind.empty() || kind.find_first_not_of("abcdefghijklmnopqrstuvwxyz.") != kind.npos) return;
+  const auto before = std::filesystem::current_path();  // inputs may be named relative to it
+  std::filesystem::current_path(folder);
   std::ofstream(kind) << text;
   const std::string wrong = thrownBy([&] { use(kind, kind, text); });
   std::filesystem::remove(kind);
+  std::filesystem::current_path(before);
   require(wrong.empty() || kind == "words" || wrong.rfind(kind, 0) == 0, wrong);
 }
