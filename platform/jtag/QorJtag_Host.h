@@ -48,7 +48,7 @@ QOR_API std::string readTomlText(const std::string& path);
 /// cable.
 extern "C" QOR_API unsigned QorJtag_session_openCable(std::unique_ptr<QorRT::Qor_Cable> cable);
 
-/// Closes a session, its cable and its cores, after waiting for the call that holds its target lock. Throws
+/// Closes a session, its cable and its cores, after waiting for the call that has its target lock. Throws
 /// when the session is unknown.
 extern "C" QOR_API void QorJtag_session_close(unsigned session);
 

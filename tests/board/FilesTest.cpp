@@ -35,7 +35,7 @@ std::string problemOfSignals(const std::string& path) {
   return problemOf(path, [](const std::string& file) { qor::readSignalFile(file); });
 }
 
-// Every row ends its first signal, whose port is on the first line behind the head.
+// Every row ends its first signal, whose port is on the first line after the head.
 TEST(SignalFile, SaysWhatIsWrongAndWhere) {
   const std::string another = "\n[[signal]]\nport = \"async_out\"\nbits = 2\n";
   const std::pair<std::string, const char*> rows[] = {

@@ -38,7 +38,7 @@ constexpr FileKind kinds[] = {
      10, false},
 };
 
-/// A counter behind a link that fails by a script, recorded into a file of its own.
+/// A counter on a link that fails by a script, recorded into a file of its own.
 class Recording : public testing::TestWithParam<FileKind> {
  protected:
   ~Recording() override { std::filesystem::remove(path_); }

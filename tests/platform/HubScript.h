@@ -7,7 +7,7 @@
 
 #include "tests/platform/WireBits.h"
 
-/// A frame that stands at the beginning of a scan.
+/// A frame that is at the beginning of a scan.
 struct SentFrame {
   explicit SentFrame(const Bits& scan) : header(scan.substr(2, 24)), bits(scan.size()) {
     const std::size_t last = scan.rfind('0');
@@ -34,7 +34,7 @@ struct SentFrame {
   unsigned numberAt(std::size_t at, std::size_t count) const {
     return static_cast<unsigned>(std::stoul(hexOf(header.substr(at, count)), nullptr, 16));
   }
-  /// Where the payload ends: the longest one whose CRC follows it with nothing but ones behind.
+  /// Where the payload ends: the longest one whose CRC follows it with nothing but ones after it.
   std::size_t lastOf(const Bits& scan) const {
     for (std::size_t end = scan.size() - 32; end > 58; --end) {
       const bool onesFollow = scan.find('0', end + 32) == scan.npos;
@@ -46,7 +46,7 @@ struct SentFrame {
 
 /// What a hub says to a scan that begins with a frame, on a chain with one bypassed device.
 struct Reply {
-  unsigned head = 0xA0;  // 0: it tells nothing
+  unsigned head = 0xA0;  // 0: it says nothing
   Bits data{};
   std::size_t wait = 0;
   bool takesPayload = true;

@@ -1,4 +1,4 @@
-// A chain of two devices that writes down what it is told, and answers from a script.
+// A chain of two devices that writes down what it is sent, and answers from a script.
 #pragma once
 
 #include <deque>
@@ -79,7 +79,7 @@ class ScriptedCable : public QorRT::Qor_Cable {
       script_->answers.pop_front();
     }
     bits.resize(sent.size(), '0');
-    bits.resize((sent.size() + 7) / 8 * 8, '1');  // what stands above a capture in its last byte is nobody's
+    bits.resize((sent.size() + 7) / 8 * 8, '1');  // what is above a capture in its last byte is nobody's
     return bits;
   }
 

@@ -1,4 +1,4 @@
-// The simulated chain: a hub scan by scan, the TAP behind its wires, the builder, board files. The comparison with the
+// The simulated chain: a hub scan by scan, the TAP and its wires, the builder, board files. The comparison with the
 // Verilog plays random scans to it.
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>

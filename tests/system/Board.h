@@ -21,7 +21,7 @@ using testing::ElementsAre;
 
 constexpr unsigned failed = 0x80000000;
 
-/// The demo board: simulated in process, or behind the cable that the environment names, as it stands there.
+/// The demo board: simulated in process, or at the cable that the environment names, as it is there.
 inline std::string demoUrl() {
   const char* const url = std::getenv("QORVIO_TEST_CABLE");
   return url != nullptr ? url : "sim:";

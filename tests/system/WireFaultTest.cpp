@@ -59,7 +59,7 @@ class FaultyPins : public qorsim::Pins {
   std::unique_ptr<qorsim::Pins> board_ = qorsim::demoBoard().pins();
 };
 
-/// A demo board behind a server, which can die and come back at the same port.
+/// A demo board at a server, which can die and come back at the same port.
 class Wires : public testing::Test {
  protected:
   Wires() {

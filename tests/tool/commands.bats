@@ -32,7 +32,7 @@ unit = "V"
 TOML
 }
 
-@test "scan and info tell what stands on the board" {
+@test "scan and info report what is on the board" {
   gives 0 "DEVICE  IDCODE    NAME  IR
 0       0A5F1093  fpga  6
 1       1234567B  cpld  8
@@ -49,7 +49,7 @@ CORE   TYPE    VERSION  ASYNC OUT  SYNC OUT  ASYNC IN  SYNC IN
   gives 0 $'NAME*\nsync_in_data\\[0:3]  0b1010  ↕         ↕' --core 1.1.0 read 'sync_in_data[0:3]' --radix bin
 }
 
-@test "write takes every spelling of a value, and tells it in one exchange" {
+@test "write takes every spelling of a value, and reports it, in one exchange" {
   signals_file
   run qorvio --signals bench.toml --json write mode=fast 'async_out_data[7:4]=0b1010' 'sync_out_data=0d200' \
     'sync_out_data[0].pulsetrain=0,1,0'

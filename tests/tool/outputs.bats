@@ -4,7 +4,7 @@ load processes
 
 setup() { begin && export QORVIO=$QORVIO_LOSSY QORVIO_CORE=0.1.0 QORVIO_CABLE=lossy:7; }
 
-remembers() {  # remembers ASYNC KNOWN SYNC KNOWN: what the file holds, which is the only one in its folder
+remembers() {  # remembers ASYNC KNOWN SYNC KNOWN: what the file contains, which is the only one in its folder
   local file
   file=$(find qorvio -name '*.json')
   cat "$file"

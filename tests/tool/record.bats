@@ -2,13 +2,13 @@
 
 load processes
 
-# The counter behind core 1.1.0 has run 21 clocks at the first sample, and 10 more at each that follows.
+# The counter of core 1.1.0 has run 21 clocks at the first sample, and 10 more at each that follows.
 counted() {
   local sample
   for ((sample = 0; sample < $1; ++sample)); do echo $((21 + 10 * sample)); done
 }
 
-@test "a VCD recording holds every value, as an independent reader tells" {
+@test "a VCD recording contains every value, as an independent reader reports" {
   gives 0 "300 samples in counter.vcd" --core 1.1.0 record async_in_data 'sync_in_data[0]' --samples 300 --out counter.vcd
   vcd2fst counter.vcd counter.fst
   fst2vcd counter.fst >back.vcd
@@ -21,7 +21,7 @@ counted() {
   [ "$(awk -v id="$id" '/^[01]/ && substr($0, 2) == id' back.vcd)" = "1$id" ]
 }
 
-@test "CSV and JSON lines hold every sample, with time stamps that only grow" {
+@test "CSV and JSON lines contain every sample, with time stamps that only grow" {
   "$QORVIO" --quiet --core 1.1.0 record async_in_data --samples 50 --out counter.csv
   [ "$(head -1 counter.csv)" = "time_s,missed,async_in_data" ]
   diff <(tail -n +2 counter.csv | cut -d, -f3) <(counted 50 | xargs printf '0x%04X\n')

@@ -2,7 +2,7 @@
 
 load processes
 
-serve() {  # serve ARGUMENTS: starts the board, and waits until it tells where
+serve() {  # serve ARGUMENTS: starts the board, and waits until it says where
   "$QORVIO" simulate "$@" >told 2>wrong 3>&- &
   pid=$!
   tells told
@@ -20,7 +20,7 @@ serve() {  # serve ARGUMENTS: starts the board, and waits until it tells where
   [ ! -s wrong ]
 }
 
-@test "it tells where it is, and why it cannot be there" {
+@test "it says where it is, and why it cannot be there" {
   serve "$QORVIO_SOURCES/examples/boards/lab.toml"
   [[ $(cat told) =~ ^serving\ .*/lab.toml\ on\ 127.0.0.1:([0-9]+)\;\ cable\ rbb:127.0.0.1:([0-9]+)\;\ Ctrl-C\ ends\ it$ ]]
   port=${BASH_REMATCH[1]}

@@ -88,7 +88,7 @@ hides() { ! on_screen capture-pane -p | grep -qE "$1"; }  # hides REGEX: in no l
   shows '(^| )echo '
 }
 
-@test "as JSON a frame is a line, told until Ctrl-C or until the link is lost" {
+@test "as JSON a frame is a line, printed until Ctrl-C or until the link is lost" {
   run "$QORVIO_LOSSY" --cable lossy:6 --core 1.1.0 --json watch --rate 100 'sync_in_data[3:0]'
   [ "$status" -eq 1 ]
   [ "${#lines[@]}" -eq 5 ]
@@ -103,7 +103,7 @@ hides() { ! on_screen capture-pane -p | grep -qE "$1"; }  # hides REGEX: in no l
   [[ $(tail -1 told) == '{"frame":'*']}' ]]
   mkfifo full
   exec {unread}<>full
-  head -c 65536 /dev/zero >&$unread  # all that a pipe holds
+  head -c 65536 /dev/zero >&$unread  # all that a pipe takes
   "$QORVIO" --json watch >&$unread 3>&- &
   pid=$!
   catches_interrupt

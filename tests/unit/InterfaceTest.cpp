@@ -53,7 +53,7 @@ static_assert(Core::BEFORE_062_PORT_BIT_LEN == 8 && Core::BEFORE_101_PORT_BIT_LE
 
 static_assert(std::is_same_v<decltype(&QorVIO_SignalGroup::size), unsigned (QorVIO_SignalGroup::*)() const>);
 
-/// The place of a virtual member in its class's table: its offset stands in the pointer's first word.
+/// The place of a virtual member in its class's table: its offset is in the pointer's first word.
 template <class Member>
 std::uintptr_t slotOf(Member member) {
   std::uintptr_t word;

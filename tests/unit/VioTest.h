@@ -1,4 +1,4 @@
-// A core behind the fakes, and the short names that the tests use.
+// A core on the fakes, and the short names that the tests use.
 #pragma once
 
 #include <gmock/gmock.h>

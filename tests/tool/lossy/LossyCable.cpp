@@ -1,4 +1,4 @@
-// Opens "lossy:N" in the place of all other cables: the demo board behind a link that goes down after N exchanges.
+// Opens "lossy:N" in the place of all other cables: the demo board on a link that goes down after N exchanges.
 // "slow:N" is the same, with a third of a second for each of them. "noisy:" flips bits of what comes back.
 #include <charconv>
 #include <chrono>

@@ -1,4 +1,4 @@
-// Recording stand-ins for libQorJtag and libQorCore: they note every call, answer what a test prepared, and
+// Recording replacements for libQorJtag and libQorCore: they note every call, answer what a test prepared, and
 // fail where a test asks for it.
 #pragma once
 
@@ -26,7 +26,7 @@ struct Platform {
   std::string readDigits;                                         // the record digits of the next reads
   std::map<std::string, std::unique_ptr<QorRT::Qor_Core>> cores;  // by "device.chain.core"
 
-  /// A VIO core of the current layout behind every address.
+  /// A VIO core of the current layout at every address.
   void answerAsVioCore(unsigned asyncIn, unsigned syncIn, unsigned asyncOut, unsigned syncOut);
 
   /// Puts an unsigned field into the status word.
