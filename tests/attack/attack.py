@@ -1,4 +1,4 @@
-"""Attacks on the command line: hostile servers, hostile files, killed recordings, missing standard descriptors.
+"""Attacks on the command line: hostile servers, long and killed recordings, missing standard descriptors.
 usage: attack.py BIN [--valgrind], BIN the folder of the built programs. Nothing may crash, hang, grow without limit,
 run a program or send control characters to the terminal; nor err in its memory, says valgrind or a sanitizer.
 """
@@ -151,45 +151,6 @@ def failure_to_stop(command, number, server):
     return "" if host.returncode in ends else f"status {host.returncode}: {text[:200]}"
 
 
-def hostile_files():
-    """Name and content of files that are no TOML, or too much of it."""
-    yield "dotted", "a." * 31000 + "a = 1"
-    yield "table", "[" + "a." * 31000 + "a]"
-    yield "array", "a = " + "[" * 31000 + "]" * 31000
-    yield "inline", "a = " + "{a=" * 31000 + "1" + "}" * 31000
-    yield "large", "# " + "x" * (8 << 20)
-    yield "nul", "a\0b = 1"
-    yield "bytes", b"\xff\xfe\x00\x01" * 100
-    yield "escape", 'core = "\x1b[2J"\nname = "\\u001b[2J"'
-    yield "key", '"\\u001b]0;x\\u0007" = 1'
-    yield "name", '[[signal]]\nname = "$(touch ran)"\nport = "async_out"\nbits = 0'
-    yield "vcd", '[[signal]]\nname = "$end"\nport = "async_in"\nbits = 0'
-
-
-def attack_by_files():
-    uses = {
-        "sim:FILE": lambda path: ["--cable", f"sim:{path}", "read"],
-        "board=FILE": lambda path: ["--cable", f"rbb:127.0.0.1:1?board={path}", "read"],
-        "signals": lambda path: ["--cable", "sim:", "--signals", path, "read"],
-        "signals check": lambda path: ["signals", "check", path],
-    }
-    for name, content in hostile_files():
-        path = SCRATCH / f"{name}.toml"
-        path.write_bytes(content if isinstance(content, bytes) else content.encode())
-        for use, arguments in uses.items():
-            check(f"{use} {name}", misbehaviour(lambda: run(*arguments(str(path))), (1, 2)))
-        folder = SCRATCH / f"in-{name}"
-        folder.mkdir()
-        shutil.copy(path, folder / "qorvio.toml")
-        check(f"qorvio.toml {name}", misbehaviour(lambda: run("scan", cwd=folder), (1, 2)))
-    fifo = SCRATCH / "fifo"
-    os.mkfifo(fifo)
-    for special in (fifo, SCRATCH, "/dev/zero"):
-        for use, arguments in uses.items():
-            check(f"{use} {special}", misbehaviour(lambda: run(*arguments(str(special))), (1, 2)))
-    check("a name was run", "yes" if list(SCRATCH.rglob("ran")) else "")
-
-
 def attack_by_recordings():
     path = SCRATCH / "times.vcd"
     path.write_text("$timescale 1ns $end\n$var wire 1 ! a $end\n$enddefinitions $end\n" +
@@ -230,7 +191,7 @@ def attack_by_descriptors():
 
 def main():
     try:
-        for attack in (attack_by_servers, attack_by_servers_that_turn, attack_by_files, attack_by_recordings,
+        for attack in (attack_by_servers, attack_by_servers_that_turn, attack_by_recordings,
                        attack_by_kill, attack_by_descriptors):
             before, begin = len(results), time.monotonic()
             attack()

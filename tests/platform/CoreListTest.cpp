@@ -102,19 +102,4 @@ TEST_F(CoreList, CoresKeepWhatTheyWereGiven) {
   EXPECT_EQ(other.getCoreRef().core_index, 3U);
 }
 
-TEST(Signals, KeepTypeNamePositionsAndProperties) {
-  std::vector<unsigned> positions{5, 3, 5};
-  QorRT::Qor_SignalGroup group(2, 0, positions, "bus");
-  EXPECT_EQ(group.getType(), 0x102U);
-  EXPECT_EQ(group.getPositionVector(), positions);
-  QorRT::Qor_Signal signal(3, 1, 7, "reset"), copy(1, 0, 0, "other");
-  signal.setProperty("radix", "hex");
-  std::string name = "radix", value = "binary";
-  EXPECT_EQ(signal.getProperty("radix"), "hex");
-  signal.setProperty(name, value);
-  copy = signal;
-  EXPECT_EQ(copy.getName() + " " + copy.getProperty("radix") + copy.getProperty("colour"), "reset binary");
-  EXPECT_EQ(copy.getType() * 100 + copy.getUnit() * 10 + copy.getPosition(), 317U);
-}
-
 }  // namespace

@@ -1,4 +1,4 @@
-# A simulated board for other programs. Needs QORVIO, the tool; jq.
+# A simulated board for other programs. Needs QORVIO, the tool; openocd, jq.
 
 load processes
 
@@ -30,4 +30,15 @@ serve() {  # serve ARGUMENTS: starts the board, and waits until it says where
   kill -TERM $pid
   wait $pid
   pid=
+}
+
+@test "an OpenOCD of our own ends with its host, though the host is killed" {
+  serve --json
+  QORVIO_BOARD_PORT=$(jq .port told)
+  export QORVIO_BOARD_PORT
+  "$QORVIO" --cable "openocd:?config=$QORVIO_SOURCES/rtl/cosim/openocd.cfg" watch --json >frames &
+  host=$!
+  tells frames
+  kill -KILL $host
+  gives 0 '*0       0A5F1093  device0  6*' --cable "rbb:127.0.0.1:$QORVIO_BOARD_PORT" scan # the board takes one client at a time
 }
