@@ -118,6 +118,8 @@ class QORVIO_API QorVIO_Command {
   /// @}
 
  private:
+  /// Fields 1 to 3 of a line, each with the blank after it.
+  const std::string& addressText(const QOR_CORE_REF& coreRef);
   const std::string& outputData();
   unsigned int recordDigitCount() const;
   void decodeRecords(const char* digits);
@@ -143,6 +145,8 @@ class QORVIO_API QorVIO_Command {
     Scratch(const Scratch& /*other*/) noexcept {}
     Scratch& operator=(const Scratch& /*other*/) noexcept { return *this; }
 
+    std::string address;
+    QOR_CORE_REF addressOf{};
     std::string outputDigits;
     std::string outputHex;
     std::string text;

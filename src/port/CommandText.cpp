@@ -22,14 +22,25 @@ void appendField(std::string& text, unsigned value, unsigned bitWidth) {
   text += ' ';
 }
 
-/// Fields 1 to 3, each with the blank after it.
-void appendAddress(std::string& text, const QOR_CORE_REF& coreRef) {
-  appendField(text, coreRef.device_index, 8);
-  appendField(text, coreRef.user_chain_number, 4);
-  appendField(text, coreRef.core_index, 4);
+bool isSame(const QOR_CORE_REF& left, const QOR_CORE_REF& right) {
+  return left.device_index == right.device_index && left.user_chain_number == right.user_chain_number &&
+         left.core_index == right.core_index;
 }
 
 }  // namespace
+
+// A command is nearly always that of one core, and these fields are half of a short text.
+const std::string& QorVIO_Command::addressText(const QOR_CORE_REF& coreRef) {
+  std::string& text = scratch.address;
+  if (!text.empty() && isSame(coreRef, scratch.addressOf)) return text;
+  std::string made;
+  appendField(made, coreRef.device_index, 8);
+  appendField(made, coreRef.user_chain_number, 4);
+  appendField(made, coreRef.core_index, 4);
+  text.swap(made);
+  scratch.addressOf = coreRef;
+  return text;
+}
 
 const std::string& QorVIO_Command::outputData() {
   std::string& data = scratch.outputDigits;
@@ -49,20 +60,20 @@ std::string& QorVIO_Command::buildCommandText(const QOR_CORE_REF& coreRef, unsig
     const std::string& data = outputData();
     const std::string& hex = Qor_NumberUtil::binStr2HexStr(data, scratch.outputHex);
     text.reserve(hex.size() + otherLinesLength);
-    appendAddress(text, coreRef);
+    text += addressText(coreRef);
     text += "01 0 ";
     appendField(text, static_cast<unsigned>(data.size() + 1), 32);
     text += hex;
   } else if (commandCode == obeyCode) {
-    appendAddress(text, coreRef);
+    text += addressText(coreRef);
     text += "02 0 00000004 0";
   } else if (commandCode == readCode) {
     unsigned bitCount = recordDigitCount() + 16;
-    appendAddress(text, coreRef);
+    text += addressText(coreRef);
     text += "03 1 ";
     appendField(text, bitCount, 32);
     text += "0\n";
-    appendAddress(text, coreRef);
+    text += addressText(coreRef);
     text += "04 1 00000004 0";
     resultBits = (bitCount + 7) / 8 * 8 + 8;
   }

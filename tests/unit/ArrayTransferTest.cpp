@@ -141,6 +141,7 @@ TEST_F(Group, AsksForTheBytesOfWhatItStages) {
   EXPECT_EQ(image.buildCommandText({0, 1, 0}, 1, text, nullptr),
             "00 1 0 01 0 000000A1 " + std::string(40, '0'));
   EXPECT_EQ(image.buildCommandText({0, 1, 0}, 5, text, nullptr), "");
+  EXPECT_EQ(image.buildCommandText({0x12, 3, 4}, 2, text, nullptr), "12 3 4 02 0 00000004 0");
   async.setValues(ones.data(), 2, 5);
   sync.setValues(ones.data(), 20, 20);
   sync.setValues(ones.data(), 1, 0);
