@@ -98,9 +98,15 @@ TEST_P(Recording, MarksThePollsThatItMissed) {
   const std::string text = this->text();
   const std::regex mark(GetParam().missed);
   std::uint64_t told = 0;
-  for (std::sregex_iterator each(text.begin(), text.end(), mark); each != std::sregex_iterator(); ++each)
+  std::ptrdiff_t marks = 0;
+  for (std::sregex_iterator each(text.begin(), text.end(), mark); each != std::sregex_iterator();
+       ++each, ++marks)
     told = (GetParam().isRunningSum ? 0 : told) + std::stoul((*each)[1], nullptr, GetParam().base);
   EXPECT_EQ(told, recorded.missed) << text;
+  const std::regex sum(R"(\nb[01]{32} #)");  // each but the first comes after a gap
+  if (GetParam().isRunningSum) {
+    EXPECT_EQ(std::distance(std::sregex_iterator(text.begin(), text.end(), sum), {}), marks + 1) << text;
+  }
 }
 
 INSTANTIATE_TEST_SUITE_P(Files, Recording, testing::ValuesIn(kinds),
