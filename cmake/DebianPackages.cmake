@@ -1,8 +1,9 @@
 # Debian packages of the three components, for CPack. scripts/package configures such a build, and makes them.
 set(QORVIO_MAINTAINER "The QorVIO authors <authors@qorvio.invalid>" CACHE STRING "Who answers for the packages")
 set(release 1)
-set(about "A debug core inside an FPGA has inputs and outputs for a host program: inputs whose
-values and activity it can watch, outputs that it can drive, over JTAG.")
+set(about "A debug core inside an FPGA has inputs and outputs for a host program:
+inputs whose values and activity it can watch, outputs that it can drive,
+over JTAG.")
 
 set(CPACK_GENERATOR DEB)
 set(CPACK_PACKAGE_NAME qorvio)
