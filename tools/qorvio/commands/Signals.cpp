@@ -5,6 +5,7 @@
 #include "board/model/CoreAddress.h"
 #include "board/model/Errors.h"
 #include "tools/qorvio/Report.h"
+#include "tools/qorvio/Stubs.h"
 #include "tools/qorvio/commands/Commands.h"
 #include "tools/qorvio/terminal/Printable.h"
 #include "tools/qorvio/terminal/Table.h"
@@ -79,6 +80,12 @@ void addSignals(CLI::App& app, Context& context) {
       ->callback([&context] {
         std::printf("%s", firstSignalFile(context.core().ref(), context.core().info()).c_str());
       });
+  auto file = std::make_shared<std::string>();
+  CLI::App* stubs =
+      command->add_subcommand("stubs", "writes types of the names of a signals file, for Python editors");
+  stubs->add_option("FILE", *file, "the signals file; needs no board")->required();
+  stubs->footer("Example:\n  qorvio signals stubs bench.toml > bench.pyi");
+  stubs->callback([file] { std::printf("%s", stubsOf(readSignalFile(*file)).c_str()); });
   command->callback([&context, command, namesOnly] {
     if (!command->get_subcommands().empty()) return;
     const std::vector<Signal>& signals = context.signals().signals();
