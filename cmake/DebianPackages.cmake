@@ -1,4 +1,4 @@
-# Debian packages of the three components, for CPack. scripts/package configures such a build, and makes them.
+# Debian packages of the four components, for CPack. scripts/package configures such a build, and makes them.
 set(QORVIO_MAINTAINER "The QorVIO authors <authors@qorvio.invalid>" CACHE STRING "Who answers for the packages")
 set(release 1)
 set(about "A debug core inside an FPGA has inputs and outputs for a host program:
@@ -12,7 +12,7 @@ set(CPACK_PACKAGING_INSTALL_PREFIX /usr)
 set(CPACK_STRIP_FILES ON)
 set(CPACK_INSTALL_DEFAULT_DIRECTORY_PERMISSIONS
     OWNER_READ OWNER_WRITE OWNER_EXECUTE GROUP_READ GROUP_EXECUTE WORLD_READ WORLD_EXECUTE)
-set(CPACK_COMPONENTS_ALL libqorvio libqorvio-dev qorvio)
+set(CPACK_COMPONENTS_ALL libqorvio libqorvio-dev qorvio python3-qorvio)
 set(CPACK_DEB_COMPONENT_INSTALL ON)
 set(CPACK_DEBIAN_FILE_NAME DEB-DEFAULT)
 set(CPACK_DEBIAN_PACKAGE_RELEASE ${release})
@@ -43,6 +43,24 @@ set(CPACK_DEBIAN_QORVIO_PACKAGE_DEPENDS "libqorvio (= ${PROJECT_VERSION}-${relea
 set(CPACK_COMPONENT_QORVIO_DESCRIPTION "${about}
 
 This package contains the command line.")
+
+set(CPACK_DEBIAN_PYTHON3-QORVIO_PACKAGE_NAME python3-qorvio)
+set(CPACK_DEBIAN_PYTHON3-QORVIO_PACKAGE_SECTION python)
+set(CPACK_DEBIAN_PYTHON3-QORVIO_PACKAGE_SHLIBDEPS ON)
+math(EXPR next_python "${Python_VERSION_MINOR} + 1")
+set(CPACK_DEBIAN_PYTHON3-QORVIO_PACKAGE_DEPENDS "libqorvio (= ${PROJECT_VERSION}-${release}), python3 (>= 3.${Python_VERSION_MINOR}), \
+python3 (<< 3.${next_python}), python3-numpy")
+set(CPACK_DEBIAN_PYTHON3-QORVIO_PACKAGE_RECOMMENDS "qorvio")
+set(CPACK_DEBIAN_PYTHON3-QORVIO_PACKAGE_SUGGESTS "python3-pandas, python3-matplotlib, python3-pytest, labgrid")
+set(CPACK_DEBIAN_PYTHON3-QORVIO_PACKAGE_CONTROL_EXTRA ${PROJECT_BINARY_DIR}/python/postinst ${PROJECT_BINARY_DIR}/python/prerm)
+set(CPACK_COMPONENT_PYTHON3-QORVIO_DESCRIPTION "${about}
+
+This package holds the module for Python 3, a plugin for pytest, and resources
+and drivers for labgrid.")
+set(script_permissions FILE_PERMISSIONS OWNER_READ OWNER_WRITE OWNER_EXECUTE GROUP_READ GROUP_EXECUTE WORLD_READ WORLD_EXECUTE)
+file(WRITE ${PROJECT_BINARY_DIR}/python/postinst "#!/bin/sh\nset -e\nif [ \"$1\" = configure ]; then py3compile -p python3-qorvio; fi\n")
+file(WRITE ${PROJECT_BINARY_DIR}/python/prerm "#!/bin/sh\nset -e\npy3clean -p python3-qorvio\n")
+file(CHMOD ${PROJECT_BINARY_DIR}/python/postinst ${PROJECT_BINARY_DIR}/python/prerm ${script_permissions})
 
 file(WRITE ${PROJECT_BINARY_DIR}/triggers "activate-noawait ldconfig\n")
 set(shlibs "")
