@@ -20,6 +20,12 @@ thread_local PyObject* raisedType = nullptr;
 thread_local PyObject* raisedValue = nullptr;
 thread_local PyObject* raisedTrace = nullptr;
 
+void forgetRaised() {
+  Py_CLEAR(raisedType);
+  Py_CLEAR(raisedValue);
+  Py_CLEAR(raisedTrace);
+}
+
 // With the GIL. True leaves the exception of the handler pending.
 bool isInterrupted() {
   return PyErr_CheckSignals() != 0;
@@ -40,10 +46,8 @@ SignalTable tableOf(const std::string& path) {
 }  // namespace
 
 void keepRaised(py::error_already_set&& raised) {
+  forgetRaised();
   raised.restore();
-  Py_XDECREF(raisedType);
-  Py_XDECREF(raisedValue);
-  Py_XDECREF(raisedTrace);
   PyErr_Fetch(&raisedType, &raisedValue, &raisedTrace);
 }
 
@@ -177,6 +181,7 @@ Session::Turn::Turn(Session& session, bool isLast) : session_(session) {
     session.engine_.unlock();
     throw WrongUse("the board is closed");
   }
+  forgetRaised();
   ++session.inside_;
   ++session.turns_;
   thread_ = PyEval_SaveThread();
