@@ -15,7 +15,7 @@ toml::table readToml(const std::string& path) {
   } catch (const toml::parse_error& wrong) {
     throw WrongUse(path + ":" + std::to_string(wrong.source().begin.line) + ": " +
                    std::string(wrong.description()));
-  } catch (const std::runtime_error& error) {
+  } catch (const std::invalid_argument& error) {
     throw WrongUse(error.what());
   }
 }

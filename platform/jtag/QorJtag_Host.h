@@ -38,7 +38,7 @@ namespace QorRT {
 QOR_API std::unique_ptr<Qor_Cable> openCable(const char* url, StopFunction stop = {});
 
 /// The text of a TOML file, for a host that parses files of its own: at most 1 MB, with no more than 16 levels of
-/// nesting, so that its parser needs little of the stack. Throws runtime_error, "FILE: what is wrong" or "FILE:LINE:
+/// nesting, so that its parser needs little of the stack. Throws invalid_argument, "FILE: what is wrong" or "FILE:LINE:
 /// what is wrong", for a file without these bounds or that cannot be read, a directory, a FIFO or a device among them.
 QOR_API std::string readTomlText(const std::string& path);
 

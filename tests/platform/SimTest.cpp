@@ -161,7 +161,7 @@ TEST(BoardFiles, SayWhatIsWrongAndWhere) {
   };
   for (const auto& [text, message] : cases)
     EXPECT_THAT(thrownBy([&, &t = text] { qorsim::boardText(t, "F"); }),
-                testing::StartsWith(message.empty() ? "nothing" : "runtime: F" + message))
+                testing::StartsWith(message.empty() ? "nothing" : "logic: F" + message))
         << text.substr(0, 80);
 }
 
@@ -175,7 +175,7 @@ TEST(BoardFiles, AreRegularFiles) {
   };
   for (const auto& [name, reason] : cases)
     EXPECT_EQ(thrownBy([&, &n = name] { qorsim::boardFile(n); }),
-              "runtime: " + name + ": cannot be opened: " + reason);
+              "logic: " + name + ": cannot be opened: " + reason);
   std::filesystem::remove(path);
   const std::string examples = QORVIO_SOURCE_DIR "/examples/";
   EXPECT_EQ(qorsim::boardFile(examples + "adapters/board.toml").cable()->devices()[0].idcode, 0x0A5F1093u);

@@ -144,10 +144,10 @@ TEST(BoardFacts, AreLaidOverWhatWasFoundAndMayNotContradictIt) {
       {"[[device]]\nuser_opcodes = [64]\n" + five,
        "runtime: device 0 has an IR of 6 bits, too short for the opcode 64 of a user register"},
       {"[[device]]\nuser_opcodes = [1, -2]\n",
-       "runtime: b.toml:2: device[0].user_opcodes[1]: must be 0 to 4294967295, is -2"},
+       "logic: b.toml:2: device[0].user_opcodes[1]: must be 0 to 4294967295, is -2"},
       {"[[device]]\nuser_opcodes = []\n",
-       "runtime: b.toml:2: device[0].user_opcodes: must be the opcodes of 1 to 4 user registers, is 0"},
-      {"[[device]]\nspeed = 3\n", "runtime: b.toml:2: device[0].speed: is no key of a board file"},
+       "logic: b.toml:2: device[0].user_opcodes: must be the opcodes of 1 to 4 user registers, is 0"},
+      {"[[device]]\nspeed = 3\n", "logic: b.toml:2: device[0].speed: is no key of a board file"},
   };
   for (const auto& [board, result] : rows)
     EXPECT_EQ(resultOf([&, &b = board] { return laidOver(b); }), result);

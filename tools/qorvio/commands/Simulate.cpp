@@ -25,7 +25,7 @@ struct SimulateOptions {
 std::unique_ptr<qorsim::Pins> powerUp(const std::string& board) {
   try {
     return (board.empty() ? qorsim::demoBoard() : qorsim::boardFile(board)).pins();
-  } catch (const std::runtime_error& error) {
+  } catch (const std::invalid_argument& error) {
     throw WrongUse(error.what());
   }
 }

@@ -25,7 +25,7 @@ struct BoardFile {
   unsigned tcksPerClock = 1;         ///< of the simulated design clocks
 };
 
-/// Throws runtime_error, "FILE:LINE: KEY: what is wrong". `file` is the name that messages give the text.
+/// Throws invalid_argument, "FILE:LINE: KEY: what is wrong". `file` is the name that messages give the text.
 BoardFile readBoard(const std::string& text, const std::string& file);
 
 }  // namespace QorRT

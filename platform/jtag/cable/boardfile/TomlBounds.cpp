@@ -31,8 +31,8 @@ class NestingScan {
 
   void count(unsigned& levels) const {
     if (++levels <= mostTomlLevels) return;
-    throw std::runtime_error(file_ + ":" + std::to_string(line_) + ": is nested more than " +
-                             std::to_string(mostTomlLevels) + " levels deep");
+    throw std::invalid_argument(file_ + ":" + std::to_string(line_) + ": is nested more than " +
+                                std::to_string(mostTomlLevels) + " levels deep");
   }
 
   void skipComment() {
@@ -65,7 +65,7 @@ class NestingScan {
 
 void requireTomlBounds(std::string_view text, const std::string& file) {
   if (text.size() > mostTomlBytes)
-    throw std::runtime_error(file + ": is larger than " + std::to_string(mostTomlBytes) + " bytes");
+    throw std::invalid_argument(file + ": is larger than " + std::to_string(mostTomlBytes) + " bytes");
   NestingScan(text, file).run();
 }
 

@@ -29,7 +29,7 @@ TomlEntry::TomlEntry(const std::string& file, const toml::node& node, std::strin
 
 void TomlEntry::fail(const std::string& problem) const {
   const std::string line = std::to_string(node_->source().begin.line);
-  throw std::runtime_error(*file_ + ":" + line + ": " + key_ + ": " + problem);
+  throw std::invalid_argument(*file_ + ":" + line + ": " + key_ + ": " + problem);
 }
 
 void TomlEntry::failKind(const char* wanted) const {

@@ -9,7 +9,7 @@
 
 namespace QorRT {
 
-/// A view of a node of the parsed file, which must outlive it. Failures are runtime_error, "FILE:LINE: KEY:
+/// A view of a node of the parsed file, which must outlive it. Failures are invalid_argument, "FILE:LINE: KEY:
 /// what is wrong".
 class TomlEntry {
  public:

@@ -14,7 +14,7 @@ namespace QorRT {
 namespace {
 
 [[noreturn]] void failToOpen(const std::string& path, const std::string& why) {
-  throw std::runtime_error(path + ": cannot be opened: " + why);
+  throw std::invalid_argument(path + ": cannot be opened: " + why);
 }
 
 // Opening a FIFO would wait for somebody who writes to it.
@@ -37,7 +37,7 @@ std::string fileContents(const std::string& path) {
   std::array<char, 4096> block{};
   while (text.size() <= mostTomlBytes && (file.read(block.data(), block.size()) || file.gcount() > 0))
     text.append(block.data(), static_cast<std::size_t>(file.gcount()));
-  if (file.bad()) throw std::runtime_error(path + ": cannot be read");
+  if (file.bad()) throw std::invalid_argument(path + ": cannot be read");
   return text;
 }
 
@@ -52,8 +52,8 @@ toml::table parseToml(const std::string& text, const std::string& file) {
   try {
     return toml::parse(text);
   } catch (const toml::parse_error& error) {
-    throw std::runtime_error(file + ":" + std::to_string(error.source().begin.line) + ": " +
-                             std::string(error.description()));
+    throw std::invalid_argument(file + ":" + std::to_string(error.source().begin.line) + ": " +
+                                std::string(error.description()));
   }
 }
 

@@ -1,4 +1,4 @@
-// Reading a file that describes a board. Failures are runtime_error, "FILE: what is wrong" or "FILE:LINE: what is
+// Reading a file that describes a board. Failures are invalid_argument, "FILE: what is wrong" or "FILE:LINE: what is
 // wrong".
 #pragma once
 

@@ -5,6 +5,7 @@
 #include <string>
 #include <vector>
 
+#include "platform/jtag/cable/Qor_ServerLog.h"
 #include "platform/jtag/cable/openocd/OpenOcdServer.h"
 #include "platform/jtag/cable/openocd/OpenOcdText.h"
 #include "platform/jtag/cable/wire/WireCable.h"
@@ -12,12 +13,14 @@
 namespace QorRT {
 
 /// A queue is one command, so that nobody else's scans come between; only one far above a megabyte goes in several.
-class OpenOcdCable : public WireCable {
+class OpenOcdCable : public WireCable, public Qor_ServerLog {
  public:
   /// The server at the endpoint of the URL, or one of our own for its configuration file, whose chain nobody else uses.
   /// Throws runtime_error when there is no such server, or its chain does not fit the board file.
   OpenOcdCable(WireUrl url, StopFunction stop);
   ~OpenOcdCable() override;
+
+  std::string takeRemarks() override { return server_ ? server_->takeRemarks() : ""; }
 
  private:
   using Scans = std::vector<Qor_Scan>::iterator;

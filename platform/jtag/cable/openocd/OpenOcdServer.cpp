@@ -107,8 +107,10 @@ struct OpenOcdServer::Process {
                         [this](boost::system::error_code error, std::size_t count) {
                           isClosed = error.failed();
                           if (isClosed) return;
-                          text.append(block.data(), count);
-                          if (text.size() > 2 * logBytes) text.erase(0, text.size() - logBytes);
+                          for (std::string* each : {&text, &fresh}) {
+                            each->append(block.data(), count);
+                            if (each->size() > 2 * logBytes) each->erase(0, each->size() - logBytes);
+                          }
                           drain();
                         });
   }
@@ -116,6 +118,7 @@ struct OpenOcdServer::Process {
   Socket log;
   std::array<char, 4096> block{};
   std::string text;       // the end of the log
+  std::string fresh;      // what of it has come since takeRemarks()
   bool isClosed = false;  // the server is about to end
   process::child child;
 };
@@ -181,6 +184,16 @@ std::string OpenOcdServer::errors() {
   std::istringstream lines(process_->text);
   for (std::string line; std::getline(lines, line);) complaints.add(std::move(line));
   return complaints.text();
+}
+
+std::string OpenOcdServer::takeRemarks() {
+  stream_.link().io.restart();
+  stream_.link().io.poll();
+  std::string remarks;
+  std::istringstream lines(std::exchange(process_->fresh, {}));
+  for (std::string line; std::getline(lines, line);)
+    if (startsWith(line, "Warn :") || startsWith(line, "Error:")) remarks += line + '\n';
+  return remarks;
 }
 
 }  // namespace QorRT

@@ -29,6 +29,9 @@ class OpenOcdServer {
   /// and uses it even so.
   void requireTrust();
 
+  /// The warnings and errors that it has logged since the call before, a line each.
+  std::string takeRemarks();
+
   /// After a failure of its stream that says `seen`: throws runtime_error with that, or that the server has ended, and
   /// errors().
   [[noreturn]] void explain(const std::string& seen);

@@ -64,6 +64,7 @@ struct Stream::Places {
 Stream::Stream(const Endpoint& endpoint, const Deadline& deadline, StopFunction stop)
     : Stream(std::make_unique<Link>(), endpoint.text(), std::move(stop)) {
   connect(endpoint, deadline);
+  isSilent_ = true;
   link_->socket.set_option(tcp::no_delay(true));
 }
 
@@ -149,6 +150,7 @@ std::string Stream::transfer(std::string_view out, const Wanted& wanted, const D
       link_->socket, boost::asio::dynamic_buffer(in, wanted.most),
       [&](error_code result, std::size_t count) {
         got = count;
+        isSilent_ = isSilent_ && count == 0;
         return result || wanted.isWhole(in) ? 0 : blockBytes;
       },
       ended);
@@ -171,7 +173,9 @@ void Stream::runUntil(const std::function<bool()>& done, const std::function<std
 
 void Stream::requireTime(const std::function<std::string()>& seen, const Deadline& deadline) {
   if (stop_ && deadline.mayStop() && stop_()) fail(seen() + " before the host stopped the wait");
-  if (Deadline::Clock::now() >= deadline.end) fail(seen() + " within " + secondsText(deadline.allowed));
+  if (Deadline::Clock::now() >= deadline.end)
+    fail(seen() + " within " + secondsText(deadline.allowed) +
+         (isSilent_ ? ": another program may be connected" : ""));
 }
 
 void Stream::fail(const std::string& seen) const {

@@ -60,6 +60,7 @@ class Stream {
   std::unique_ptr<Link> link_;
   std::string name_;
   StopFunction stop_;
+  bool isSilent_ = false;  // whether the server has taken the connection and said nothing at all
 };
 
 }  // namespace QorRT
