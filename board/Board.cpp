@@ -50,14 +50,22 @@ Board::Board(std::unique_ptr<Link> link, SignalTable signals, BoardOptions optio
   open(std::move(signals));
 }
 
-Board::~Board() = default;
+Board::~Board() {
+  try {
+    if (reads_) markSeen({});
+    for (std::size_t core = 0; core < unseen_.size(); ++core) cores_[core]->keepActivity(unseen_[core]);
+  } catch (const std::exception&) {  // out of memory: then it is lost
+    return;
+  }
+}
 
 void Board::open(SignalTable signals) {
   chooseFirstCore(signals, options_, *link_);
   std::vector<Core*> cores;
   std::vector<QORVIO_CORE_INFO> infos;
   for (QOR_CORE_REF ref : signals.cores()) {
-    cores_.push_back(std::make_unique<LocalCore>(*link_, ref, options_.stateFolder));
+    cores_.push_back(
+        std::make_unique<LocalCore>(*link_, ref, SharedState{options_.stateFolder, options_.share}));
     cores.push_back(cores_.back().get());
     infos.push_back(cores_.back()->info());
   }
@@ -67,6 +75,7 @@ void Board::open(SignalTable signals) {
   signals_ = std::make_shared<const SignalTable>(std::move(signals));
   poller_ = std::make_unique<Poller>(cores);
   reads_ = std::make_unique<Subscription>(*poller_);
+  for (const QORVIO_CORE_INFO& info : infos) unseen_.push_back(emptySample(info));
 }
 
 void Board::give(const std::vector<Assignment>& assignments) {
@@ -91,7 +100,34 @@ void Board::rememberOutputs() {
 
 Frame Board::read() {
   poller_->pollAll();
-  return {signals_, reads_->look()};
+  Frame frame(signals_, collect());
+  for (Sample& each : unseen_) forgetActivity(each);
+  return frame;
+}
+
+Frame Board::read(const std::vector<Signal>& inputs) {
+  const Subscription wanted(*poller_, inputs);
+  poller_->poll();
+  Frame frame(signals_, collect());
+  for (const Signal& each : inputs) forgetActivity(unseen_[each.core], each);
+  return frame;
+}
+
+void Board::markSeen(const std::vector<Signal>& inputs) {
+  std::vector<Sample> fresh = reads_->look();
+  for (const Signal& each : inputs) forgetActivity(fresh[each.core], each);
+  for (std::size_t core = 0; core < fresh.size(); ++core) addActivity(unseen_[core], fresh[core]);
+}
+
+// The newest values, with all activity that nobody has seen.
+const std::vector<Sample>& Board::collect() {
+  const std::vector<Sample>& fresh = reads_->look();
+  for (std::size_t core = 0; core < fresh.size(); ++core) {
+    unseen_[core].asyncIn = fresh[core].asyncIn;
+    unseen_[core].syncIn = fresh[core].syncIn;
+    addActivity(unseen_[core], fresh[core]);
+  }
+  return unseen_;
 }
 
 Frame Board::waitFor(const Condition& condition, std::chrono::nanoseconds timeout) {

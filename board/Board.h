@@ -43,8 +43,12 @@ struct BoardOptions {
   /// Whether `core` counts though the signals file names another one; otherwise that is wrong use.
   bool forceCore = false;
 
-  /// Where to remember what outputs were given; empty: nowhere. userStateFolder() is the one of the command line.
+  /// Where to remember what outputs were given, to keep activity that was read and not asked for, and to claim the cores
+  /// that are read; empty: nowhere. userStateFolder() is the one of the command line.
   std::string stateFolder{};
+
+  /// Read cores though other hosts that use the same state folder do: then each misses activity that another one took.
+  bool share = false;
 
   /// Interrupts waits: those for a condition, and those for the server of a cable that the board itself opens, which fail
   /// then.
@@ -88,8 +92,16 @@ class QORBOARD_API Board {
   /// Keeps now what outputs were given. Throws Failure.
   void rememberOutputs();
 
-  /// Reads all inputs, in one exchange per core. Its activity is that since the read before.
+  /// Reads all inputs, in one exchange per core. Its activity is that since the read before, in this process or in one that
+  /// had the same state folder and was asked for other inputs. Throws Busy, the first time, when another host reads.
   Frame read();
+
+  /// The same for one who asks for these inputs only: reads their cores; what other inputs did is kept for the next read.
+  Frame read(const std::vector<Signal>& inputs);
+
+  /// Of what was polled since the last read or call of this, the activity of these inputs was seen by the user; that of the
+  /// others is kept for the next read, by whom ever.
+  void markSeen(const std::vector<Signal>& inputs);
 
   /// One of them.
   Reading read(const std::string& input) { return read()[input]; }
@@ -120,6 +132,7 @@ class QORBOARD_API Board {
 
  private:
   void open(SignalTable signals);
+  const std::vector<Sample>& collect();
 
   BoardOptions options_;
   std::unique_ptr<Link> link_;
@@ -127,6 +140,7 @@ class QORBOARD_API Board {
   std::vector<std::unique_ptr<Core>> cores_;
   std::unique_ptr<Poller> poller_;
   std::unique_ptr<Subscription> reads_;
+  std::vector<Sample> unseen_;  // one a core: activity that was read and not asked for
 };
 
 }  // namespace qor

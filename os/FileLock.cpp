@@ -43,4 +43,10 @@ FileLock::~FileLock() {
   close(file_);
 }
 
+void FileLock::write(std::string_view text) {
+  const bool isWritten = ftruncate(file_, 0) == 0 &&
+                         pwrite(file_, text.data(), text.size(), 0) == static_cast<ssize_t>(text.size());
+  if (!isWritten) throw std::system_error(errno, std::generic_category(), "cannot write a lock file");
+}
+
 }  // namespace os

@@ -3,6 +3,7 @@
 
 #include <chrono>
 #include <string>
+#include <string_view>
 
 namespace os {
 
@@ -15,6 +16,9 @@ class FileLock {
   FileLock(const FileLock&) = delete;
   FileLock& operator=(const FileLock&) = delete;
   ~FileLock();
+
+  /// Makes this the file's whole content. Throws std::system_error.
+  void write(std::string_view text);
 
  private:
   int file_;

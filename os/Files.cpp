@@ -103,8 +103,4 @@ void replaceFile(const std::string& path, std::string_view content) {
   fail(error, what, path);
 }
 
-unsigned long processId() {
-  return static_cast<unsigned long>(getpid());
-}
-
 }  // namespace os

@@ -20,7 +20,4 @@ std::string distrust(const std::string& path);
 /// its folder are never written through. Throws std::system_error, with the file as it was.
 void replaceFile(const std::string& path, std::string_view content);
 
-/// The number of this process.
-unsigned long processId();
-
 }  // namespace os

@@ -21,8 +21,8 @@ struct Sampling {
 // The polls of a sampling, as if they were being recorded.
 class Replay {
  public:
-  Replay(const Samples& samples, const std::vector<Signal>& inputs, std::size_t cores)
-      : samples_(samples), values_(inputs.size()), moved_(inputs.size()), noSamples_(cores) {}
+  Replay(const Samples& samples, const std::vector<Signal>& inputs)
+      : samples_(samples), values_(inputs.size()), moved_(inputs.size()) {}
 
   Poll poll(std::size_t number) {
     changed_.clear();
@@ -33,8 +33,7 @@ class Replay {
             values_,
             changed_,
             moved_,
-            movedOtherwise_,
-            noSamples_};
+            movedOtherwise_};
   }
 
  private:
@@ -42,7 +41,7 @@ class Replay {
     const SampledInput& input = samples_.inputs[i];
     const auto first = input.values.begin() + static_cast<std::ptrdiff_t>(number * input.bytesEach);
     const Bytes value(first, first + static_cast<std::ptrdiff_t>(input.bytesEach));
-    const unsigned char moved = input.moves[number] != 0 ? 1 : 0;
+    const unsigned char moved = input.moves[number];
     if (number == 0 || value != values_[i]) changed_.push_back(i);
     if (number == 0 || moved != moved_[i]) movedOtherwise_.push_back(i);
     values_[i] = value;
@@ -53,7 +52,6 @@ class Replay {
   std::vector<Bytes> values_;
   std::vector<unsigned char> moved_;
   std::vector<std::size_t> changed_, movedOtherwise_;
-  std::vector<Sample> noSamples_;
 };
 
 // A row of bytes of a sampling, which it keeps alive; for numpy.
@@ -118,8 +116,8 @@ std::shared_ptr<Sampling> samplingOf(Session& session, const std::vector<double>
 void save(const Sampling& self, const std::string& path) {
   const py::gil_scoped_release released;
   const std::unique_ptr<SampleWriter> writer = sampleWriter(path);
-  Replay replay(self.samples, self.inputs, self.cores.size());
-  writer->begin(self.inputs, self.cores);
+  Replay replay(self.samples, self.inputs);
+  writer->begin({self.inputs, self.cores, {}});
   for (std::size_t i = 0; i < self.samples.nanoseconds.size(); ++i) writer->add(replay.poll(i));
   writer->end();
 }

@@ -32,6 +32,12 @@ class QORBOARD_API Failure : public Error {
   using Error::Error;
 };
 
+/// Another host reads the core.
+class QORBOARD_API Busy : public Failure {
+ public:
+  using Failure::Failure;
+};
+
 /// A file could not be written: nothing more of it is worth keeping.
 class QORBOARD_API FileFailure : public Failure {
  public:

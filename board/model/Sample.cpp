@@ -3,6 +3,12 @@
 #include <algorithm>
 
 namespace qor {
+namespace {
+
+constexpr Bytes Sample::*flagImages[] = {&Sample::asyncUp,  &Sample::asyncDown,  &Sample::syncUp,
+                                         &Sample::syncDown, &Sample::syncSyncUp, &Sample::syncSyncDown};
+
+}  // namespace
 
 Sample emptySample(const QORVIO_CORE_INFO& info) {
   const Bytes async(byteCount(info.async_input_count)), sync(byteCount(info.sync_input_count));
@@ -12,6 +18,24 @@ Sample emptySample(const QORVIO_CORE_INFO& info) {
 bool anyOf(const Signal& signal, const Bytes& portImage) {
   return std::any_of(signal.bits.begin(), signal.bits.end(),
                      [&](unsigned bit) { return bitAt(portImage, bit) != 0; });
+}
+
+void addActivity(Sample& sample, const Sample& more) {
+  for (const auto image : flagImages)
+    for (std::size_t i = 0; i < (sample.*image).size(); ++i)
+      (sample.*image)[i] = static_cast<unsigned char>((sample.*image)[i] | (more.*image)[i]);
+}
+
+void forgetActivity(Sample& sample) {
+  for (const auto image : flagImages) std::fill((sample.*image).begin(), (sample.*image).end(), 0);
+}
+
+void forgetActivity(Sample& sample, const Signal& signal) {
+  for (const auto image : flagImages) {
+    const bool isAsync = image == &Sample::asyncUp || image == &Sample::asyncDown;
+    if (isAsync != (signal.port == Port::asyncIn)) continue;
+    for (unsigned bit : signal.bits) setBit(sample.*image, bit, 0);
+  }
 }
 
 Activity activityOf(const Signal& signal, const Sample& sample) {

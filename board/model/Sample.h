@@ -31,6 +31,15 @@ struct Activity {
   bool syncUp = false, syncDown = false;  ///< as the design's clock saw it; synchronous inputs only
 };
 
+/// Adds the flags of another sample of the same core.
+QORBOARD_API void addActivity(Sample& sample, const Sample& more);
+
+/// Clears all flags, or those of one signal.
+/// @{
+QORBOARD_API void forgetActivity(Sample& sample);
+QORBOARD_API void forgetActivity(Sample& sample, const Signal& signal);
+/// @}
+
 QORBOARD_API Activity activityOf(const Signal& signal, const Sample& sample);
 
 /// The signal's value, out of an image of its port, into `value`, whose memory is used again.

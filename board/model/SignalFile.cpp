@@ -177,21 +177,33 @@ SignalTable readSignalFile(const std::string& path) {
 }
 
 std::string firstSignalFile(QOR_CORE_REF ref, const QORVIO_CORE_INFO& info) {
+  std::vector<Signal> signals;
+  for (Port port : ports) {
+    Signal signal{portName(port), port};
+    for (unsigned bit = 0; bit < widthOf(info, port); ++bit) signal.bits.push_back(bit);
+    if (signal.width() != 0) signals.push_back(std::move(signal));
+  }
+  return signalFileText(ref, signals);
+}
+
+std::string signalFileText(const std::optional<QOR_CORE_REF>& ref, const std::vector<Signal>& signals) {
   std::string text =
       "# Names for port bits. bits: one bit, a range such as \"7:4\", or a list, most significant first.\n"
       "# Also: radix = \"hex\" (bin, dec, signed), enum = { off = 0 }, scale = 0.5, unit = \"V\",\n"
-      "# core = \"...\" (another one than the file's), description = \"...\".\n"
-      "core = \"" +
-      refText(ref) + "\"\n";
-  for (Port port : ports) {
-    const unsigned width = widthOf(info, port);
-    if (width == 0) continue;
-    const std::string bits = width == 1 ? "0" : "\"" + std::to_string(width - 1) + ":0\"";
+      "# core = \"...\" (another one than the file's), description = \"...\".\n";
+  if (ref) text += "core = \"" + refText(*ref) + "\"\n";
+  for (const Signal& each : signals) {
+    const std::string bits = bitsText(each.bits);
+    const bool isList = bits.find(',') != bits.npos, isBit = each.width() == 1;
     text.append("\n[[signal]]\nname = \"")
-        .append(portName(port))
+        .append(each.name)
         .append("\"\nport = \"")
-        .append(portName(port));
-    text.append("\"\nbits = ").append(bits).append("\n");
+        .append(portName(each.port));
+    text.append("\"\nbits = ")
+        .append(isBit    ? bits
+                : isList ? "[" + bits + "]"
+                         : '"' + bits + '"')
+        .append("\n");
   }
   return text;
 }

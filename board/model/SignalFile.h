@@ -14,7 +14,9 @@
 ///     description = "..."
 #pragma once
 
+#include <optional>
 #include <string>
+#include <vector>
 
 #include "board/Export.h"
 #include "board/model/SignalTable.h"
@@ -26,5 +28,9 @@ QORBOARD_API SignalTable readSignalFile(const std::string& path);
 
 /// A first signals file for a core: a signal for each port, ready to be renamed and divided.
 QORBOARD_API std::string firstSignalFile(QOR_CORE_REF ref, const QORVIO_CORE_INFO& info);
+
+/// A signals file of these signals: their names, ports and bits; without a core, of any.
+QORBOARD_API std::string signalFileText(const std::optional<QOR_CORE_REF>& ref,
+                                        const std::vector<Signal>& signals);
 
 }  // namespace qor

@@ -8,9 +8,20 @@
 #include "board/model/Errors.h"
 
 namespace qor {
+namespace {
+
+bool isStandardOutput(const std::string& path) {
+  return path == "-" || path.rfind("-.", 0) == 0;
+}
+
+std::FILE* opened(const std::string& path) {
+  return isStandardOutput(path) ? stdout : std::fopen(path.c_str(), "wb");
+}
+
+}  // namespace
 
 OutputFile::OutputFile(const std::string& path)
-    : path_(path), file_(std::fopen(path.c_str(), "wb"), std::fclose) {
+    : path_(path), file_(opened(path), isStandardOutput(path) ? std::fflush : std::fclose) {
   if (file_ == nullptr) fail();
   std::setvbuf(file_.get(), nullptr, _IONBF, 0);  // it is buffered here
   text_.reserve(2 * bufferSize);
@@ -24,7 +35,8 @@ void OutputFile::write(std::uint64_t nanoseconds) {
 
 void OutputFile::close() {
   write(written_);
-  if (std::fclose(file_.release()) != 0) fail();
+  const auto finish = file_.get_deleter();
+  if (finish(file_.release()) != 0) fail();
 }
 
 void OutputFile::fail() const {

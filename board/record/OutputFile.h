@@ -10,7 +10,7 @@ namespace qor {
 
 class OutputFile {
  public:
-  /// Throws Failure when the file cannot be made.
+  /// "-", or a path that begins with "-.", is standard output. Throws Failure when the file cannot be made.
   explicit OutputFile(const std::string& path);
 
   std::string& text() { return text_; }

@@ -58,32 +58,42 @@ class Reader {
   explicit Reader(PlayScript& script) : script_(script) {}
 
   void readNames(const Fields& fields, const SignalTable& signals) {
+    columns_ = fields.size();
     isTimed_ = fields.front() == "time_s";
-    if (isTimed_) firstValue_ = fields.size() > 1 && fields[1] == "missed" ? 2 : 1;
-    // None at all would select every output.
-    if (fields.size() == firstValue_) throw WrongUse("names no output");
-    script_.signals = signals.select(valuesOf(fields), Direction::output);
+    Fields names;
+    for (std::size_t i = isTimed_ ? 1 : 0; i < columns_; ++i) {
+      if (isTimed_ && isOfRecording(fields[i])) continue;
+      names.push_back(fields[i].substr(0, fields[i].find(" [")));
+      places_.push_back(i);
+    }
+    if (names.empty()) throw WrongUse("names no output");  // which would select every one
+    script_.signals = signals.select(names, Direction::output);
     requireDistinct(script_.signals);
   }
 
   void readRow(const Fields& fields) {
-    const std::size_t wanted = script_.signals.size(),
-                      given = fields.size() - std::min(firstValue_, fields.size());
-    if (given != wanted)
-      throw WrongUse(std::to_string(given) + " values for " + std::to_string(wanted) + " outputs");
-    if (firstValue_ == 2 && areEmpty(fields)) return;  // the end of a recording that missed its last polls
+    if (fields.size() != columns_)
+      throw WrongUse(std::to_string(fields.size()) + " fields below " + std::to_string(columns_) + " names");
+    if (isTimed_ && areEmpty(fields)) return;  // the end of a recording that missed its last polls
     if (isTimed_) readTime(fields.front());
     std::vector<Bytes> row;
-    row.reserve(wanted);
-    for (std::size_t i = 0; i < wanted; ++i)
-      row.push_back(parseValue(script_.signals[i], fields[firstValue_ + i]));
+    row.reserve(places_.size());
+    for (std::size_t i = 0; i < places_.size(); ++i)
+      row.push_back(parseValue(script_.signals[i], fields[places_[i]]));
     script_.rows.push_back(std::move(row));
   }
 
  private:
+  // Whether record writes such a column beside the values.
+  static bool isOfRecording(const std::string& name) {
+    constexpr std::string_view moved = " moved";
+    const bool isMoved = name.size() > moved.size() && name.substr(name.size() - moved.size()) == moved;
+    return name == "missed" || name.rfind("trigger [", 0) == 0 || isMoved;
+  }
+
   bool areEmpty(const Fields& fields) const {
-    return std::all_of(fields.begin() + static_cast<std::ptrdiff_t>(firstValue_), fields.end(),
-                       [](const std::string& field) { return field.empty(); });
+    return std::all_of(places_.begin(), places_.end(),
+                       [&](std::size_t place) { return fields[place].empty(); });
   }
 
   static void requireDistinct(const std::vector<Signal>& signals) {
@@ -95,10 +105,6 @@ class Reader {
     if (twice != names.end()) throw WrongUse("names an output twice: " + *twice);
   }
 
-  Fields valuesOf(const Fields& fields) const {
-    return {fields.begin() + static_cast<std::ptrdiff_t>(firstValue_), fields.end()};
-  }
-
   void readTime(const std::string& text) {
     const nanoseconds time = timeOf(text);
     if (script_.hasTimes() && time < script_.times.back())
@@ -108,7 +114,8 @@ class Reader {
 
   PlayScript& script_;
   bool isTimed_ = false;
-  std::size_t firstValue_ = 0;
+  std::size_t columns_ = 0;
+  std::vector<std::size_t> places_;  // of the values, in a row
 };
 
 }  // namespace

@@ -21,8 +21,8 @@ struct PlayScript {
   bool hasTimes() const { return !times.empty(); }
 };
 
-/// Reads a script from its text; `path` is for messages. Its first column may be time_s, in seconds, and the one after it
-/// missed, which is skipped: so record writes them. A byte order mark, blanks around fields and empty lines are skipped.
+/// Reads a script from its text; `path` is for messages. Its first column may be time_s, in seconds; then what record
+/// writes beside the values, and units behind names, are skipped. A byte order mark, blanks around fields and empty lines are skipped.
 /// Throws WrongUse, "FILE:LINE: what is wrong".
 QORBOARD_API PlayScript parsePlayScript(std::string_view text, const std::string& path,
                                         const SignalTable& signals);

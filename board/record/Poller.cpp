@@ -24,6 +24,15 @@ std::uint64_t wordAt(const Bytes& image, std::size_t byte) {
   return word;
 }
 
+// The bits of a word whose flags are not the same in both.
+std::uint64_t flagsDiffer(const Sample& now, const Sample& before, Port port, std::size_t byte) {
+  const auto differ = [&](const Bytes& a, const Bytes& b) { return wordAt(a, byte) ^ wordAt(b, byte); };
+  const std::uint64_t word =
+      differ(now.up(port), before.up(port)) | differ(now.down(port), before.down(port));
+  if (port == Port::asyncIn) return word;
+  return word | differ(now.syncSyncUp, before.syncSyncUp) | differ(now.syncSyncDown, before.syncSyncDown);
+}
+
 void addFlags(Bytes& image, const Bytes& more) {
   for (std::size_t i = 0; i < image.size(); ++i) image[i] = static_cast<unsigned char>(image[i] | more[i]);
 }
@@ -175,20 +184,13 @@ const std::vector<std::size_t>& Subscription::changedValues() {
 
 const std::vector<std::size_t>& Subscription::changedMoves() {
   // A bit that moved otherwise than before need not be the only one of its input.
-  return find([](const Sample& now, const Sample& before, Port port, std::size_t byte) {
-    return (wordAt(now.up(port), byte) | wordAt(now.down(port), byte)) ^
-           (wordAt(before.up(port), byte) | wordAt(before.down(port), byte));
-  });
+  return find(flagsDiffer);
 }
 
 const std::vector<std::size_t>& Subscription::changed() {
   return find([](const Sample& now, const Sample& before, Port port, std::size_t byte) {
-    const auto differ = [&](const Bytes& a, const Bytes& b) { return wordAt(a, byte) ^ wordAt(b, byte); };
-    const std::uint64_t word = differ(now.values(port), before.values(port)) |
-                               differ(now.up(port), before.up(port)) |
-                               differ(now.down(port), before.down(port));
-    if (port == Port::asyncIn) return word;
-    return word | differ(now.syncSyncUp, before.syncSyncUp) | differ(now.syncSyncDown, before.syncSyncDown);
+    return (wordAt(now.values(port), byte) ^ wordAt(before.values(port), byte)) |
+           flagsDiffer(now, before, port, byte);
   });
 }
 

@@ -73,7 +73,7 @@ class QORBOARD_API Subscription {
   /// The same without a look: valid until the next poll.
   const std::vector<Sample>& pending() const { return pending_; }
 
-  /// Which inputs differ between the last two looks: in value; in whether they moved; in value or in any activity flag.
+  /// Which inputs differ between the last two looks: in value; in any activity flag; in either.
   /// All of them after the first look. To be asked for before the next poll; valid until the next of these calls.
   /// @{
   const std::vector<std::size_t>& changedValues();

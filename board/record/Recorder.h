@@ -12,8 +12,8 @@ namespace qor {
 
 class Recorder {
  public:
-  /// Poller and writer must outlive the recorder. Begins the file.
-  Recorder(Poller& poller, std::vector<Signal> signals, SampleWriter& writer);
+  /// Poller and writer must outlive the recorder. Begins the file; `when` is the trigger's condition.
+  Recorder(Poller& poller, std::vector<Signal> signals, SampleWriter& writer, const std::string& when = {});
 
   /// Writes the newest poll; times as in Poll.
   void write(std::uint64_t nanoseconds, std::uint64_t missed);

@@ -2,8 +2,10 @@
 
 #include <algorithm>
 
+#include "board/model/Duration.h"
 #include "board/model/Errors.h"
 #include "board/record/Recorder.h"
+#include "board/record/TriggerGate.h"
 
 namespace qor {
 namespace {
@@ -48,23 +50,20 @@ class Schedule {
   std::uint64_t next_ = 0;
 };
 
-void runPolls(Poller& poller, Recorder& recorder, SampleWriter& writer, const Limits& limits,
-              const StopFunction& stop, const OnSample& onSample, Recorded& recorded) {
+// False when the time is over, or the stop function says so.
+bool runPolls(Poller& poller, Recorder& recorder, TriggerGate& gate, const Limits& limits,
+              const StopFunction& stop, const OnSample& onSample, const Recorded& recorded) {
   Schedule schedule(limits);
-  while (limits.samples == 0 || recorded.samples < limits.samples) {
+  while (!gate.isDone()) {
     const auto [now, missed, isEnd] = schedule.await(stop);
     const auto nanosecond = static_cast<std::uint64_t>(now.count());
-    if (isEnd) {
-      if (missed != 0) writer.addMissed(nanosecond, missed);
-      recorded.missed += missed;
-      return;
-    }
+    if (isEnd && missed != 0) gate.addMissed(nanosecond, missed);
+    if (isEnd) return false;
     poller.poll();
     recorder.write(nanosecond, missed);
-    ++recorded.samples;
-    recorded.missed += missed;
     if (onSample) onSample(recorded, now);
   }
+  return true;
 }
 
 // Keeps the samples in arrays.
@@ -72,11 +71,10 @@ class ArrayWriter : public SampleWriter {
  public:
   ArrayWriter(Samples& samples, std::size_t expected) : samples_(samples), expected_(expected) {}
 
-  void begin(const std::vector<Signal>& inputs, const std::vector<QOR_CORE_REF>&) override {
-    inputs_ = inputs;
+  void begin(const Heading& heading) override {
     samples_.nanoseconds.reserve(expected_);
     samples_.missed.reserve(expected_);
-    for (const Signal& each : inputs) {
+    for (const Signal& each : heading.signals) {
       SampledInput& input = samples_.inputs.emplace_back(SampledInput{byteCount(each.width()), {}, {}});
       input.values.reserve(expected_ * input.bytesEach);
       input.moves.reserve(expected_);
@@ -86,11 +84,11 @@ class ArrayWriter : public SampleWriter {
   void add(const Poll& poll) override {
     samples_.nanoseconds.push_back(static_cast<std::int64_t>(poll.nanoseconds));
     samples_.missed.push_back(poll.missed);
-    for (std::size_t i = 0; i < inputs_.size(); ++i) {
+    if (poll.isTrigger) samples_.trigger = samples_.missed.size() - 1;
+    for (std::size_t i = 0; i < samples_.inputs.size(); ++i) {
       SampledInput& input = samples_.inputs[i];
       input.values.insert(input.values.end(), poll.values[i].begin(), poll.values[i].end());
-      input.moves.push_back(
-          poll.moved[i] != 0 ? movesOf(activityOf(inputs_[i], poll.samples[inputs_[i].core])) : 0);
+      input.moves.push_back(poll.moved[i]);
     }
   }
 
@@ -98,14 +96,8 @@ class ArrayWriter : public SampleWriter {
   void end() override {}
 
  private:
-  static unsigned char movesOf(const Activity& activity) {
-    return static_cast<unsigned char>((activity.up ? 1 : 0) + (activity.down ? 2 : 0) +
-                                      (activity.syncUp ? 4 : 0) + (activity.syncDown ? 8 : 0));
-  }
-
   Samples& samples_;
   std::size_t expected_;
-  std::vector<Signal> inputs_;
 };
 
 }  // namespace
@@ -120,9 +112,13 @@ std::string summary(const Recorded& recorded, const std::string& path) {
 
 void record(SampleWriter& writer, Poller& poller, const std::vector<Signal>& inputs, const Limits& limits,
             Recorded& recorded, const StopFunction& stop, const OnSample& onSample) {
-  Recorder recorder(poller, inputs, writer);
+  TriggerGate gate(writer, poller, limits, recorded);
+  Recorder recorder(poller, inputs, gate, limits.when ? limits.when->text() : "");
+  bool isComplete = false;
   try {
-    runPolls(poller, recorder, writer, limits, stop, onSample, recorded);
+    if (limits.when || limits.until) poller.poll();
+    gate.forget();
+    isComplete = runPolls(poller, recorder, gate, limits, stop, onSample, recorded);
   } catch (const FileFailure&) {
     throw;
   } catch (const Failure&) {  // what was recorded until then is worth keeping
@@ -130,6 +126,8 @@ void record(SampleWriter& writer, Poller& poller, const std::vector<Signal>& inp
     throw;
   }
   writer.end();
+  if (limits.when && !isComplete && !recorded.isTriggered && !(stop && stop()))
+    throw Timeout("not within " + durationText(limits.time) + ": " + limits.when->text());
 }
 
 Recorded recordTo(const std::string& path, Poller& poller, const std::vector<Signal>& inputs,
@@ -149,7 +147,7 @@ Recorded recordTo(const std::string& path, Poller& poller, const std::vector<Sig
 Samples recordToArrays(Poller& poller, const std::vector<Signal>& inputs, const Limits& limits,
                        const StopFunction& stop) {
   Samples samples;
-  ArrayWriter writer(samples, limits.samples);
+  ArrayWriter writer(samples, limits.samples != 0 ? limits.samples : limits.before + limits.after);
   Recorded recorded;
   record(writer, poller, inputs, limits, recorded, stop);
   return samples;

@@ -3,6 +3,7 @@
 
 #include <nlohmann/json.hpp>
 
+#include "board/model/CoreAddress.h"
 #include "board/model/Value.h"
 #include "board/record/OutputFile.h"
 #include "board/record/Writers.h"
@@ -26,18 +27,20 @@ std::string csvField(const std::string& text) {
 }
 
 std::string jsonText(const std::string& text) {
-  return nlohmann::json(text).dump();
+  return nlohmann::json(text).dump(-1, ' ', false, nlohmann::json::error_handler_t::replace);
 }
 
-bool isShownInDigits(const Signal& signal) {
-  return signal.names.empty() && signal.unit.empty();
+// As the head says the unit, values are without it.
+std::vector<Signal> withoutUnits(std::vector<Signal> signals) {
+  for (Signal& each : signals) each.unit.clear();
+  return signals;
 }
 
 // A line's cells, kept as one text from poll to poll: a cell that changes and keeps its length is changed in place.
 class Row {
  public:
   /// `key` goes before the cell.
-  void add(std::string key) { cells_.push_back({std::move(key), {}, 0}); }
+  void add(std::string key, const std::string& text = {}) { cells_.push_back({std::move(key), text, 0}); }
 
   void set(std::size_t i, const std::string& text) {
     Cell& cell = cells_[i];
@@ -70,101 +73,134 @@ class Row {
 
   std::vector<Cell> cells_;
   std::string line_;
-  bool isWhole_ = true;
+  bool isWhole_ = false;
 };
 
-class CsvWriter : public SampleWriter {
+// What both have in common: a column for each value, and behind them one for what each signal did.
+class RowWriter : public SampleWriter {
  public:
-  explicit CsvWriter(const std::string& path) : file_(path) {}
+  explicit RowWriter(const std::string& path) : file_(path) {}
 
-  void begin(const std::vector<Signal>& signals, const std::vector<QOR_CORE_REF>&) override {
-    signals_ = signals;
+  void begin(const Heading& heading) override {
+    signals_ = withoutUnits(heading.signals);
+    isTriggered_ = !heading.when.empty();
+    writeHead(heading);
+  }
+
+  void add(const Poll& poll) override {
+    for (std::size_t i : poll.changed) row_.set(i, cellOf(signals_[i], poll.values[i]));
+    for (std::size_t i : poll.movedOtherwise)
+      row_.set(signals_.size() + i, std::string(1, static_cast<char>('0' + (poll.moved[i] & 3))));
+    writePlace(poll.nanoseconds, poll.missed, poll.isTrigger);
+    file_.text() += row_.line();
+    writeEnd();
+    file_.spill(poll.nanoseconds);
+  }
+
+  void end() override { file_.close(); }
+
+ protected:
+  virtual void writeHead(const Heading& heading) = 0;
+  virtual void writePlace(std::uint64_t nanoseconds, std::uint64_t missed, bool isTrigger) = 0;
+  virtual void writeEnd() = 0;
+  virtual const std::string& cellOf(const Signal& signal, const Bytes& value) = 0;
+
+  OutputFile file_;
+  std::vector<Signal> signals_;
+  Row row_;
+  std::string cell_;
+  bool isTriggered_ = false;
+};
+
+class CsvWriter : public RowWriter {
+ public:
+  using RowWriter::RowWriter;
+
+  // A line whose cells are empty.
+  void addMissed(std::uint64_t nanoseconds, std::uint64_t missed) override {
+    writePlace(nanoseconds, missed, false);
+    file_.text().append(2 * signals_.size(), ',') += '\n';
+  }
+
+ private:
+  void writeHead(const Heading& heading) override {
     file_.text() += "time_s,missed";
-    for (const Signal& each : signals) {
-      file_.text() += ',' + csvField(each.name);
+    if (isTriggered_) file_.text() += ',' + csvField("trigger [" + heading.when + "]");
+    for (const Signal& each : heading.signals) {
+      file_.text() += ',' + csvField(each.unit.empty() ? each.name : each.name + " [" + each.unit + "]");
       row_.add(",");
+    }
+    for (const Signal& each : heading.signals) {
+      file_.text() += ',' + csvField(each.name + " moved");
+      row_.add(",", "0");
     }
     file_.text() += '\n';
   }
 
-  void add(const Poll& poll) override {
-    for (std::size_t i : poll.changed) set(i, poll.values[i]);
-    appendPlace(poll.nanoseconds, poll.missed);
-    file_.text() += row_.line();
-    file_.text() += '\n';
-    file_.spill(poll.nanoseconds);
-  }
-
-  // A line whose cells are empty.
-  void addMissed(std::uint64_t nanoseconds, std::uint64_t missed) override {
-    appendPlace(nanoseconds, missed);
-    file_.text().append(signals_.size(), ',') += '\n';
-  }
-
-  void end() override { file_.close(); }
-
- private:
-  void appendPlace(std::uint64_t nanoseconds, std::uint64_t missed) {
+  void writePlace(std::uint64_t nanoseconds, std::uint64_t missed, bool isTrigger) override {
     appendSeconds(file_.text(), nanoseconds);
     file_.text() += ',';
     file_.text() += std::to_string(missed);
+    if (isTriggered_) file_.text() += isTrigger ? ",1" : ",0";
   }
 
-  void set(std::size_t i, const Bytes& value) {
+  void writeEnd() override { file_.text() += '\n'; }
+
+  const std::string& cellOf(const Signal& signal, const Bytes& value) override {
     cell_.clear();
-    appendShown(cell_, signals_[i], value);
-    row_.set(i, isShownInDigits(signals_[i]) ? cell_ : csvField(cell_));
+    appendShown(cell_, signal, value);
+    if (!signal.names.empty()) cell_ = csvField(cell_);
+    return cell_;
   }
-
-  OutputFile file_;
-  std::vector<Signal> signals_;
-  Row row_;
-  std::string cell_;
 };
 
-class JsonLinesWriter : public SampleWriter {
+class JsonLinesWriter : public RowWriter {
  public:
-  explicit JsonLinesWriter(const std::string& path) : file_(path) {}
-
-  void begin(const std::vector<Signal>& signals, const std::vector<QOR_CORE_REF>&) override {
-    signals_ = signals;
-    for (const Signal& each : signals) row_.add(',' + jsonText(each.name) + ':');
-  }
-
-  void add(const Poll& poll) override {
-    for (std::size_t i : poll.changed) set(i, poll.values[i]);
-    appendPlace(poll.nanoseconds, poll.missed);
-    file_.text() += row_.line();
-    file_.text() += "}\n";
-    file_.spill(poll.nanoseconds);
-  }
+  using RowWriter::RowWriter;
 
   void addMissed(std::uint64_t nanoseconds, std::uint64_t missed) override {
-    appendPlace(nanoseconds, missed);
+    writePlace(nanoseconds, missed, false);
     file_.text() += "}\n";
   }
 
-  void end() override { file_.close(); }
-
  private:
-  void appendPlace(std::uint64_t nanoseconds, std::uint64_t missed) {
+  void writeHead(const Heading& heading) override {
+    nlohmann::ordered_json signals = nlohmann::ordered_json::array();
+    for (const Signal& each : heading.signals) {
+      signals.push_back(
+          {{"name", each.name}, {"core", refText(heading.cores[each.core])}, {"width", each.width()}});
+      if (!each.unit.empty()) signals.back()["unit"] = each.unit;
+      row_.add(',' + jsonText(each.name) + ':');
+    }
+    for (const Signal& each : heading.signals)
+      row_.add((&each == heading.signals.data() ? R"(,"moved":{)" : ",") + jsonText(each.name) + ':', "0");
+    nlohmann::ordered_json head{{"signals", signals}};
+    if (isTriggered_) head["when"] = heading.when;
+    file_.text() += head.dump(-1, ' ', false, nlohmann::json::error_handler_t::replace) + '\n';
+  }
+
+  void writePlace(std::uint64_t nanoseconds, std::uint64_t missed, bool isTrigger) override {
     file_.text() += "{\"time_s\":";
     appendSeconds(file_.text(), nanoseconds);
     file_.text() += ",\"missed\":";
     file_.text() += std::to_string(missed);
+    if (isTrigger) file_.text() += ",\"trigger\":true";
   }
 
-  void set(std::size_t i, const Bytes& value) {
-    cell_ = '"';
-    appendShown(cell_, signals_[i], value);
-    cell_ += '"';
-    row_.set(i, isShownInDigits(signals_[i]) ? cell_ : jsonText(shown(signals_[i], value)));
-  }
+  void writeEnd() override { file_.text() += "}}\n"; }
 
-  OutputFile file_;
-  std::vector<Signal> signals_;
-  Row row_;
-  std::string cell_;
+  // Numbers as such: scaled ones, and those of decimal signals.
+  const std::string& cellOf(const Signal& signal, const Bytes& value) override {
+    cell_.clear();
+    const bool isDecimal =
+        signal.scale != 0 || signal.radix == Radix::dec || signal.radix == Radix::signedDec;
+    if (!signal.names.empty() && enumeratedName(signal, value) != nullptr)
+      return cell_ = jsonText(shown(signal, value));
+    if (!isDecimal) cell_ = '"';
+    appendShown(cell_, signal, value);
+    if (!isDecimal) cell_ += '"';
+    return cell_;
+  }
 };
 
 }  // namespace

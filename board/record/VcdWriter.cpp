@@ -8,7 +8,6 @@
 #include "board/record/Writers.h"
 
 namespace qor {
-namespace {
 
 // Viewers take brackets for bits of a vector, and dots for scopes.
 std::string vcdName(std::string name) {
@@ -17,16 +16,25 @@ std::string vcdName(std::string name) {
   return name;
 }
 
+std::string vcdScope(QOR_CORE_REF core) {
+  return "core_" + vcdName(refText(core));
+}
+
+namespace {
+
 class VcdWriter : public SampleWriter {
  public:
   explicit VcdWriter(const std::string& path) : file_(path) {}
 
   // A scope for each core with signals; what is of the recording is in the last one.
-  void begin(const std::vector<Signal>& signals, const std::vector<QOR_CORE_REF>& cores) override {
-    signals_ = signals;
-    for (std::size_t i = 0; i <= 2 * signals.size(); ++i) ids_.push_back(idOf(i));
+  void begin(const Heading& heading) override {
+    signals_ = heading.signals;
+    isTriggered_ = !heading.when.empty();
+    hasMoved_.resize(signals_.size());
+    for (std::size_t i = 0; i <= triggerNumber(); ++i) ids_.push_back(idOf(i));
     file_.text() += "$version qorvio $end\n$timescale 1 ns $end\n";
-    for (std::size_t core = 0; core < cores.size(); ++core) scope(core, cores[core]);
+    if (isTriggered_) file_.text() += "$comment trigger: " + commentText(heading.when) + " $end\n";
+    for (std::size_t core = 0; core < heading.cores.size(); ++core) scope(core, heading.cores[core]);
     file_.text() += "$enddefinitions $end\n";
   }
 
@@ -38,8 +46,10 @@ class VcdWriter : public SampleWriter {
     file_.text() += '\n';
     const std::size_t stamped = file_.text().size();
     for (std::size_t i : poll.changed) value(i, poll.values[i]);
-    for (std::size_t i : isFirst_ ? poll.changed : poll.movedOtherwise) moved(i, poll.moved[i] != 0);
+    for (std::size_t i : isFirst_ ? poll.changed : poll.movedOtherwise) moved(i, (poll.moved[i] & 3) != 0);
     if (isFirst_ || poll.missed != 0) missed(poll.missed);
+    if (isTriggered_ && (isFirst_ || poll.isTrigger != wasTrigger_)) bit(triggerNumber(), poll.isTrigger);
+    wasTrigger_ = poll.isTrigger;
     isFirst_ = false;
     last_ = poll.nanoseconds;
     // A poll that shows nothing new needs no time stamp; the last one gets its own at the end.
@@ -60,6 +70,14 @@ class VcdWriter : public SampleWriter {
   }
 
  private:
+  std::size_t triggerNumber() const { return 2 * signals_.size() + 1; }
+
+  // No $end of its own.
+  static std::string commentText(std::string text) {
+    std::replace(text.begin(), text.end(), '$', '_');
+    return text;
+  }
+
   static std::string idOf(std::size_t number) {
     std::string id;
     do {
@@ -74,12 +92,13 @@ class VcdWriter : public SampleWriter {
     const bool isUsed =
         std::any_of(signals_.begin(), signals_.end(), [&](const Signal& each) { return each.core == core; });
     if (!isUsed && !isLast) return;
-    file_.text() += "$scope module core_" + vcdName(refText(ref)) + " $end\n";
+    file_.text() += "$scope module " + vcdScope(ref) + " $end\n";
     for (std::size_t i = 0; i < signals_.size(); ++i)
       if (signals_[i].core == core) variable(signals_[i].width(), 2 * i, signals_[i].name);
     for (std::size_t i = 0; i < signals_.size(); ++i)
       if (signals_[i].core == core) variable(1, 2 * i + 1, signals_[i].name + "_moved");
     if (isLast) variable(32, 2 * signals_.size(), "missed_polls");
+    if (isLast && isTriggered_) variable(1, triggerNumber(), "trigger");
     file_.text() += "$upscope $end\n";
   }
 
@@ -109,8 +128,14 @@ class VcdWriter : public SampleWriter {
   }
 
   void moved(std::size_t i, bool isMoved) {
-    file_.text() += isMoved ? '1' : '0';
-    endValue(2 * i + 1);
+    if (!isFirst_ && isMoved == hasMoved_[i]) return;
+    hasMoved_[i] = isMoved;
+    bit(2 * i + 1, isMoved);
+  }
+
+  void bit(std::size_t number, bool value) {
+    file_.text() += value ? '1' : '0';
+    endValue(number);
   }
 
   void missing() {
@@ -131,7 +156,8 @@ class VcdWriter : public SampleWriter {
   std::vector<std::string> ids_;
   std::uint64_t missed_ = 0;
   std::uint64_t last_ = 0;
-  bool isFirst_ = true;
+  bool isFirst_ = true, isTriggered_ = false, wasTrigger_ = false;
+  std::vector<bool> hasMoved_;
 };
 
 }  // namespace

@@ -6,6 +6,12 @@ namespace qor {
 
 Core::~Core() = default;
 
+std::optional<Gift> Core::lastGift(const Signal&) const {
+  return std::nullopt;
+}
+
+void Core::keepActivity(const Sample&) noexcept {}
+
 Assignment toggled(const Core& core, const Signal& output, std::optional<bool> assumed) {
   requireBit(output);
   const std::optional<Bytes> last = core.lastGiven(output);

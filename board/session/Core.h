@@ -7,6 +7,7 @@
 
 #include "board/model/Assignment.h"
 #include "board/model/Sample.h"
+#include "board/session/OutputMemory.h"
 
 namespace qor {
 
@@ -30,6 +31,12 @@ class QORBOARD_API Core {
 
   /// The value that an output was last given; nothing where that is not known of every bit. Outputs cannot be read.
   virtual std::optional<Bytes> lastGiven(const Signal& output) const = 0;
+
+  /// Who gave it, and when, as far as is remembered.
+  virtual std::optional<Gift> lastGift(const Signal& output) const;
+
+  /// Keeps activity that was read and not shown, for whoever reads next. Never throws: what cannot be kept is lost.
+  virtual void keepActivity(const Sample& unshown) noexcept;
 
   /// Keeps what the outputs were given, not only at the end: for hosts that run for long, and for those that are to know
   /// whether it was kept. Throws Failure.

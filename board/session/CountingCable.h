@@ -26,8 +26,10 @@ class QORBOARD_API CountingCable : public QorRT::Qor_Cable {
   const std::vector<QorRT::Qor_Device>& devices() const override { return cable_->devices(); }
   bool isStopped() const override { return cable_->isStopped(); }
 
- private:
+ protected:
   void run(std::vector<QorRT::Qor_Scan>& scans) override;
+
+ private:
   std::size_t forward(const QorRT::Qor_Scan& scan);
 
   std::unique_ptr<QorRT::Qor_Cable> cable_;

@@ -46,6 +46,20 @@ void findBehind(Link& link, unsigned device, unsigned userChain, std::vector<Fou
   }
 }
 
+// "no VIO core at 0.1.1, a core of type 7 is there"; empty when the hub does not say.
+std::string whatIsAt(unsigned session, QOR_CORE_REF ref) {
+  FoundCore core{ref, {}};
+  try {
+    const bool isThere = probe(session, core);
+    if (isThere && core.isVio()) return {};
+    return "no VIO core at " + refText(ref) + ", " +
+           (isThere ? "a core of type " + std::to_string(core.info.core_type) : "no core") +
+           " is there, see qorvio scan: ";
+  } catch (const std::exception&) {
+    return {};
+  }
+}
+
 }  // namespace
 
 std::unique_ptr<QorRT::Qor_Cable> openCable(const std::string& url, StopFunction stop) {
@@ -107,8 +121,13 @@ QOR_CORE_REF firstVioCore(Link& link) {
 
 QORVIO_CORE_INFO readInfo(Link& link, QOR_CORE_REF ref) {
   QORVIO_CORE_INFO info{};
-  link.check(QorVIO_getInfo(link.session(), ref, &info));
+  if (QorVIO_getInfo(link.session(), ref, &info) != 0) failAt(link, ref);
   return info;
+}
+
+void failAt(Link& link, QOR_CORE_REF ref) {
+  const std::string said = link.takeMessage();
+  throw Failure(whatIsAt(link.session(), ref) + said);
 }
 
 }  // namespace qor

@@ -61,4 +61,8 @@ QORBOARD_API QOR_CORE_REF firstVioCore(Link& link);
 /// Reads the core's status word afresh; the core need not be set up. Throws Failure.
 QORBOARD_API QORVIO_CORE_INFO readInfo(Link& link, QOR_CORE_REF ref);
 
+/// After a call that failed for a core: throws Failure with the session's message, and before it what is at the address if
+/// that is no VIO core.
+[[noreturn]] QORBOARD_API void failAt(Link& link, QOR_CORE_REF ref);
+
 }  // namespace qor

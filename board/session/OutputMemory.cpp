@@ -1,7 +1,6 @@
 #include "board/session/OutputMemory.h"
 
 #include <algorithm>
-#include <chrono>
 #include <cstdlib>
 #include <filesystem>
 #include <system_error>
@@ -10,56 +9,46 @@
 
 #include "board/model/Digits.h"
 #include "board/model/Errors.h"
-#include "board/model/Value.h"
-#include "os/FileLock.h"
-#include "os/Files.h"
-#include "os/Folder.h"
+#include "board/model/Sample.h"
+#include "board/session/StateFile.h"
+#include "os/Process.h"
 
 namespace qor {
 namespace {
 
 namespace fs = std::filesystem;
 
-constexpr std::chrono::seconds lockTimeout(2);
-constexpr std::size_t largestFile = 1 << 20;
-
-// The key in characters that every file system takes; a long one in several folders, since a name has 255 at most.
-std::string fileName(const std::string& key) {
-  constexpr std::size_t longest = 200;
-  std::string name;
-  std::size_t begin = 0;
-  for (const char letter : key) {
-    const bool isPlain = (letter >= 'a' && letter <= 'z') || (letter >= 'A' && letter <= 'Z') ||
-                         (letter >= '0' && letter <= '9') || letter == '.' || letter == '-';
-    const auto byte = static_cast<unsigned char>(letter);
-    if (name.size() - begin > longest) begin = (name += "_/").size();
-    name += isPlain ? std::string(1, letter) : "%" + hexText({byte}, 8);
-  }
-  return name + ".json";
-}
-
 const char* variable(const char* name) {
   const char* const text = std::getenv(name);
   return text != nullptr ? text : "";
 }
 
-// The number of a file, as an image of the port; nothing when there is none that fits.
-std::optional<Bytes> imageIn(const nlohmann::json& file, const char* key, unsigned width) {
-  const auto entry = file.find(key);
-  if (entry == file.end() || !entry->is_string()) return std::nullopt;
-  std::optional<Bytes> number = numberOf(entry->get<std::string>(), 16, width);
-  if (!number || bitLength(*number) > width) return std::nullopt;
-  number->resize(byteCount(width));
-  return number;
-}
-
-std::string textOf(const Bytes& image) {
-  return hexText(image, static_cast<unsigned>(8 * image.size()));
-}
-
 void overlay(Bytes& image, const Bytes& bits, const Bytes& mask) {
   for (std::size_t i = 0; i < image.size(); ++i)
     image[i] = static_cast<unsigned char>((image[i] & ~mask[i]) | (bits[i] & mask[i]));
+}
+
+void remove(Bytes& bits, const Bytes& mask) {
+  for (std::size_t i = 0; i < bits.size(); ++i) bits[i] = static_cast<unsigned char>(bits[i] & ~mask[i]);
+}
+
+// Those of before without the bits that were given now, and this process.
+template <class Givers>
+nlohmann::ordered_json mergedGivers(Givers before, const Bytes& async, const Bytes& sync) {
+  nlohmann::ordered_json list = nlohmann::ordered_json::array();
+  const auto add = [&](const Gift& gift, const Bytes& asyncBits, const Bytes& syncBits) {
+    list.push_back({{"by", gift.by},
+                    {"at", gift.at},
+                    {"async_out", imageText(asyncBits)},
+                    {"sync_out", imageText(syncBits)}});
+  };
+  for (auto& each : before) {
+    remove(each.async, async);
+    remove(each.sync, sync);
+    if (bitLength(each.async) + bitLength(each.sync) != 0) add(each.gift, each.async, each.sync);
+  }
+  add({os::programName() + ", process " + std::to_string(os::processId()), os::now()}, async, sync);
+  return list;
 }
 
 }  // namespace
@@ -82,8 +71,8 @@ OutputMemory::OutputMemory(const QORVIO_CORE_INFO& info, bool isNew) : info_(inf
 }
 
 OutputMemory::OutputMemory(const QORVIO_CORE_INFO& info, const std::string& folder, const std::string& key)
-    : path_((fs::path(folder) / fileName(key)).string()), info_(info), now_(info), given_(info) {
-  if (os::isWritableFolder(fs::path(path_).parent_path().string())) now_ = remembered();
+    : file_(std::make_unique<StateFile>(folder, key, ".json")), info_(info), now_(info), given_(info) {
+  if (file_->isUsable()) now_ = remembered();
 }
 
 OutputMemory::~OutputMemory() {
@@ -116,17 +105,9 @@ void OutputMemory::set(const Signal& output, const Bytes& value) {
 
 OutputMemory::Images OutputMemory::remembered() const {
   Images images(info_);
-  std::string text;
-  try {
-    text = os::readFile(path_, largestFile);
-  } catch (const std::system_error&) {
-    return images;
-  }
-  const auto json = nlohmann::json::parse(text, nullptr, false);
-  if (!json.is_object()) return images;
+  const nlohmann::json json = file_->content();
   const auto fill = [&](Image& image, const std::string& port, unsigned width) {
-    const auto values = imageIn(json, port.c_str(), width),
-               known = imageIn(json, (port + "_known").c_str(), width);
+    const auto values = imageIn(json, port, width), known = imageIn(json, port + "_known", width);
     if (values && known) image = {*values, *known};
   };
   fill(images.async, "async_out", info_.async_output_count);
@@ -134,34 +115,56 @@ OutputMemory::Images OutputMemory::remembered() const {
   return images;
 }
 
+std::vector<OutputMemory::Giver> OutputMemory::givers() const {
+  std::vector<Giver> givers;
+  if (file_ == nullptr) return givers;
+  const nlohmann::json json = file_->content();
+  const auto list = json.find("givers");
+  if (list == json.end() || !list->is_array()) return givers;
+  for (const nlohmann::json& each : *list) {
+    if (!each.is_object() || !each.value("by", nlohmann::json()).is_string() ||
+        !each.value("at", nlohmann::json()).is_number_integer())
+      continue;
+    const auto async = imageIn(each, "async_out", info_.async_output_count),
+               sync = imageIn(each, "sync_out", info_.sync_output_count);
+    if (async && sync) givers.push_back({{each["by"], each["at"]}, *async, *sync});
+  }
+  return givers;
+}
+
+std::optional<Gift> OutputMemory::lastGift(const Signal& output) const {
+  std::optional<Gift> newest;
+  for (const Giver& each : givers())
+    if ((!newest || each.gift.at > newest->at) && anyOf(output, each.of(output.port))) newest = each.gift;
+  return newest;
+}
+
 void OutputMemory::save() {
-  if (!isChanged_ || path_.empty()) return;
-  const fs::path folder = fs::path(path_).parent_path();
-  std::error_code failed;
-  fs::create_directories(folder, failed);
-  if (!os::isWritableFolder(folder.string())) return;
+  if (!isChanged_ || file_ == nullptr) return;
+  file_->makeFolder();
+  if (!file_->isUsable()) return;
   try {
     merge();
   } catch (const std::system_error& error) {
     const bool isLocked = error.code() == std::errc::timed_out;
-    throw Failure("cannot remember what the outputs were given, in " + path_ + ": " +
+    throw Failure("cannot remember what the outputs were given, in " + file_->path() + ": " +
                   (isLocked ? "another program keeps the folder locked" : error.code().message()));
   }
 }
 
 void OutputMemory::merge() {
-  const os::FileLock lock((fs::path(path_).parent_path() / ".lock").string(), lockTimeout);
+  const os::FileLock lock = file_->lock();
   Images images = remembered();
   for (Port port : {Port::asyncOut, Port::syncOut}) {
     const Image& given = given_.of(port);
     overlay(images.of(port).values, given.values, given.known);
     overlay(images.of(port).known, given.known, given.known);
   }
-  const nlohmann::ordered_json json{{"async_out", textOf(images.async.values)},
-                                    {"async_out_known", textOf(images.async.known)},
-                                    {"sync_out", textOf(images.sync.values)},
-                                    {"sync_out_known", textOf(images.sync.known)}};
-  os::replaceFile(path_, json.dump() + "\n");
+  file_->replace({{"async_out", imageText(images.async.values)},
+                  {"async_out_known", imageText(images.async.known)},
+                  {"sync_out", imageText(images.sync.values)},
+                  {"sync_out_known", imageText(images.sync.known)},
+                  {"givers", mergedGivers(givers(), given_.async.known, given_.sync.known)}});
   now_ = images;
   given_ = Images(info_);
   isChanged_ = false;

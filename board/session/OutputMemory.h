@@ -2,8 +2,11 @@
 /// What the outputs of a core were last given. The hardware cannot be asked, so it is kept from run to run in a file.
 #pragma once
 
+#include <cstdint>
+#include <memory>
 #include <optional>
 #include <string>
+#include <vector>
 
 #include "QorVIO_Records.h"
 #include "board/Export.h"
@@ -12,9 +15,17 @@
 
 namespace qor {
 
+class StateFile;
+
 /// The folder that the command line keeps such files in: "qorvio" in XDG_STATE_HOME, else in ~/.local/state; empty when
 /// neither is set.
 QORBOARD_API std::string userStateFolder();
+
+/// Who gave an output its value, and when.
+struct Gift {
+  std::string by;   ///< "qorvio, process 4711"
+  std::int64_t at;  ///< seconds since 1970
+};
 
 /// Reads the file at its beginning and writes it at its end and whenever save() is called: what a host that is killed
 /// gave since then is not remembered. Of a bit that was never given, or whose file is damaged, cannot be kept up to date
@@ -36,6 +47,10 @@ class QORBOARD_API OutputMemory {
   /// The value that the output was last given; nothing where that is not known of every bit.
   std::optional<Bytes> lastGiven(const Signal& output) const;
 
+  /// Who last gave any of its bits a value; nothing where that is not remembered. Reads the file: what was not saved does
+  /// not count.
+  std::optional<Gift> lastGift(const Signal& output) const;
+
   void set(const Signal& output, const Bytes& value);
 
   /// Writes the file, whole or not at all, if anything was set since the time before. Bits that were not stay as the file
@@ -55,10 +70,18 @@ class QORBOARD_API OutputMemory {
     Image async, sync;
   };
 
+  struct Giver {
+    const Bytes& of(Port port) const { return port == Port::asyncOut ? async : sync; }
+
+    Gift gift;
+    Bytes async, sync;  ///< masks of the bits that nobody has given since
+  };
+
   Images remembered() const;
+  std::vector<Giver> givers() const;
   void merge();
 
-  std::string path_;
+  std::unique_ptr<StateFile> file_;  // null without one
   QORVIO_CORE_INFO info_;
   Images now_;
   Images given_;  // since the last save

@@ -139,6 +139,15 @@ TEST(Recording, FillsArrays) {
   EXPECT_EQ((count(999) - count(0)) & 0xFFFF, (999 * (count(1) - count(0))) & 0xFFFF);
   EXPECT_EQ(samples.inputs[0].moves[500], 3);
   EXPECT_EQ(samples.inputs[1].moves[500], 0);
+  limits.samples = 0;
+  limits.when = board.condition("count[15]");
+  limits.before = 4;
+  limits.after = 2;
+  const qor::Samples around = qor::recordToArrays(board.poller(), inputs, limits);
+  ASSERT_EQ(around.missed.size(), 7U);
+  EXPECT_EQ(around.trigger, 4U);
+  EXPECT_EQ(around.nanoseconds[0], 0);
+  EXPECT_GE(around.inputs[0].values[9], 0x80);
 }
 
 }  // namespace

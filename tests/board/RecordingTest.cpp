@@ -33,9 +33,12 @@ constexpr FileKind kinds[] = {
      R"([^]*\$var wire 8 ! counter \$end\n\$var wire 1 " counter_moved \$end\n)"
      R"(\$var wire 32 # missed_polls \$end\n\$upscope \$end\n\$enddefinitions \$end\n(#\d+\nb[01]{8} !\n(1"\nb0{32} #\n)?){5}#\d+\n)",
      R"(\nbx #\n#\d+\n(?:b[01]{8} !\n)?(?:[01]"\n)?b([01]{32}) #)", 2, true},
-    {"csv", R"(time_s,missed,counter\n(\d+\.\d{9},0,0x[0-9A-F]{2}\n){5})", R"(,(\d+),)", 10, false},
-    {"jsonl", R"((\{"time_s":\d+\.\d{9},"missed":0,"counter":"0x[0-9A-F]{2}"\}\n){5})", R"("missed":(\d+))",
+    {"csv", R"(time_s,missed,counter,counter moved\n(\d+\.\d{9},0,0x[0-9A-F]{2},[0-3]\n){5})", R"(,(\d+),)",
      10, false},
+    {"jsonl",
+     R"(\{"signals":\[\{"name":"counter","core":"1.1.0","width":8\}\]\}\n)"
+     R"((\{"time_s":\d+\.\d{9},"missed":0,"counter":"0x[0-9A-F]{2}","moved":\{"counter":[0-3]\}\}\n){5})",
+     R"("missed":(\d+))", 10, false},
 };
 
 /// A counter on a link that fails by a script, recorded into a file of its own.

@@ -8,6 +8,7 @@
 
 #include "os/FileLock.h"
 #include "os/Files.h"
+#include "os/Process.h"
 
 namespace {
 

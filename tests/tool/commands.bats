@@ -80,7 +80,10 @@ CORE   TYPE    VERSION  ASYNC OUT  SYNC OUT  ASYNC IN  SYNC IN
   fails 2 "too short a time to record: --for 0.0001us" record --for 0.0001us --out short.csv
   fails 2 "a rate is 0.001 to 1000000000 a second: nan" record --samples 1 --rate nan --out never.csv
   fails 2 "a rate is 0.001 to 1000000000 a second: 1e-12" play never.csv --rate 1e-12
-  fails 2 "a rate is 0.01 to 1000 a second: 2000" watch --rate 2000
+  fails 2 "a rate is 0.001 to 1000000000 a second: 0" watch --rate 0
+  fails 2 "cannot open the cable sim:nix.toml: nix.toml: cannot be opened: No such file or directory" \
+    --cable sim:nix.toml scan
+  fails 2 "--before and --after count from --when, which is not given: record n.csv" record --after 1 --out n.csv
   fails 2 'cannot open the cable demo: the cable URL "demo" has no colon after its kind' --cable demo scan
   fails 2 "no such command (did you mean read?): raed" raed
   signals_file
@@ -91,10 +94,10 @@ CORE   TYPE    VERSION  ASYNC OUT  SYNC OUT  ASYNC IN  SYNC IN
 }
 
 @test "a board that fails says so with the library's words, and ends with 1" {
-  fails 1 "cannot open the cable sim:nix.toml: nix.toml: cannot be opened: No such file or directory" \
-    --cable sim:nix.toml scan
-  fails 1 "cannot set up the core 0.1.7: QorVIO_initCore() for the wrong core type or non-existant core." \
+  fails 1 "no VIO core at 0.1.7, no core is there, see qorvio scan: QorVIO_initCore() for the wrong core type or non-existant core." \
     --core 0.1.7 read
+  fails 1 "no VIO core at 0.1.1, a core of type 7 is there, see qorvio scan: QorVIO_getCoreInfo() for the wrong core type or non-existant core." \
+    --core 0.1.1 info
 }
 
 @test "whole ports, gestures, and settings from environment and file" {
@@ -107,4 +110,45 @@ CORE   TYPE    VERSION  ASYNC OUT  SYNC OUT  ASYNC IN  SYNC IN
   gives 0 '*1.1.0*' info
   [[ $(QORVIO_CORE=0.1.0 qorvio info) == *"0.1.0"* ]]
   [[ $(QORVIO_CORE=0.1.0 qorvio --core 1.1.0 info) == *"1.1.0"* ]]
+}
+
+@test "a design gives its names to the bits that it connects" {
+  cat >top.json <<'JSON'
+{"modules": {"top": {"ports": {"go": {"direction": "input", "bits": [2]}, "leds": {"direction": "output", "bits": [5, 6]}},
+  "cells": {"vio": {"type": "qor_vio", "connections":
+    {"async_in": [5, "0", 9, 10, 11, 13], "async_out": [2], "sync_in": [21, 22, 9]}}},
+  "netnames": {"go": {"hide_name": 0, "bits": [2]}, "leds": {"hide_name": 0, "bits": [5, 6]},
+    "u.state": {"hide_name": 0, "bits": [8, 9, 10, 11]}, "$auto$1": {"hide_name": 1, "bits": [13]},
+    "count": {"hide_name": 0, "bits": [21, 22]}, "u.copy": {"hide_name": 0, "bits": [21, 22]}}}}}
+JSON
+  qorvio --core 1.1.0 signals from top.json >names.toml
+  [ "$(grep -v '^#' names.toml | tr -d '" \n' | sed 's/\[\[signal\]\]name=/ /g; s/port=/,/g; s/bits=/,/g')" = \
+    "core=1.1.0 go,async_out,0 leds_0,async_in,0 u_state_3_1,async_in,4:2 async_in_5,async_in,5 count,sync_in,1:0 u_state_1,sync_in,2" ]
+  [ "$(qorvio signals from --module top top.json | grep -A1 leds | xargs)" = "name = leds port = async_in" ]
+  fails 2 "top.json: has no instance of qor_vio named via" signals from top.json --instance via
+  run env PATH=/nowhere "$QORVIO" signals from top.v
+  [ "$status" -eq 1 ]
+  [[ $output == "qorvio: cannot start yosys: No such file or directory: "* ]]
+}
+
+@test "probes lists what OpenOCD could drive, and configures it" {
+  mkdir -p usb/1-1 usb/1-2
+  echo 0403 | tee usb/1-1/idVendor >usb/1-2/idVendor
+  echo 6014 >usb/1-1/idProduct
+  echo beef >usb/1-2/idProduct
+  printf 'Cable; exit\n' >usb/1-1/product
+  echo 'A1; exit' >usb/1-1/serial
+  [ "$(qorvio --json probes --sysfs usb | jq -c 'map([.product, .driver, .serial])')" = '[["6014","ftdi","A1; exit"]]' ]
+  qorvio probes --sysfs usb --init >my.cfg
+  grep -qx 'ftdi vid_pid 0x0403 0x6014' my.cfg
+  ! grep -q exit my.cfg
+  fails 1 "a configuration needs one adapter that this tool knows, plugged in are: 0" probes --sysfs nix --init
+}
+
+@test "a log has each exchange with its bits" {
+  qorvio --core 1.1.0 --log log read
+  grep -qE '^[0-9.]+ s, took [0-9.]+ s; IR device 1 USER1; DR device 1, [0-9]+ bits, out F+[0-9A-F]+0401, in 0[0-9A-F]+1$' log ||
+    { cat log; false; }
+  qorvio -v --core 1.1.0 read 2>said
+  [ "$(wc -l <said)" -eq "$(wc -l <log)" ]
 }

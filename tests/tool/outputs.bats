@@ -8,7 +8,7 @@ remembers() {  # remembers ASYNC KNOWN SYNC KNOWN: what the file contains, which
   local file
   file=$(find qorvio -name '*.json')
   cat "$file"
-  [ "$(cat "$file")" = "{\"async_out\":\"$1\",\"async_out_known\":\"$2\",\"sync_out\":\"$3\",\"sync_out_known\":\"$4\"}" ]
+  [ "$(jq -r '[.async_out, .async_out_known, .sync_out, .sync_out_known] | join(" ")' "$file")" = "$1 $2 $3 $4" ]
 }
 
 @test "an interrupted press releases its output, and leaves alone what others gave meanwhile" {
@@ -43,6 +43,31 @@ remembers() {  # remembers ASYNC KNOWN SYNC KNOWN: what the file contains, which
   for row in {1..9}; do echo "$row,1"; done >>steps.csv
   fails 1 "device 0, user chain 1, core 0: the link is down" play steps.csv
   remembers 04 FF 01 01
+}
+
+@test "outputs says by whom and when each was given its value" {
+  "$QORVIO" write async_out_data=FF
+  sleep 1.1 # the time has seconds
+  "$QORVIO" toggle 'async_out_data[3]'
+  run "$QORVIO" --json outputs 'async_out_data[0]' 'async_out_data[3]' sync_out_data
+  [ "$(jq -c 'map(.last_given)' <<<"$output")" = '["1","0",null]' ]
+  [[ $(jq -r '.[0].by' <<<"$output") =~ ^qorvio_lossy,\ process\ [0-9]+$ ]]
+  [ "$(jq -r '.[0].by' <<<"$output")" != "$(jq -r '.[1].by' <<<"$output")" ]
+  [[ $(jq -r '.[0].at' <<<"$output") < $(jq -r '.[1].at' <<<"$output") ]]
+}
+
+@test "a core that another program reads is told of, and free when that one is killed" {
+  "$QORVIO" --cable lossy:9999 watch --json >frames 3>&- &
+  pid=$!
+  tells frames
+  run "$QORVIO" --cable lossy:9999 read
+  [ "$status" -eq 1 ]
+  [[ $output == "qorvio: core 0.1.0 of lossy:9999 is read by qorvio_lossy, process $pid, since 20"* ]]
+  "$QORVIO" --cable lossy:9999 write async_out_data=1
+  "$QORVIO" --cable lossy:9999 --share read
+  kill -KILL $pid
+  wait $pid || true
+  "$QORVIO" --cable lossy:9999 read
 }
 
 @test "toggle needs to know what the output was given, by whom ever" {

@@ -23,11 +23,45 @@ counted() {
 
 @test "CSV and JSON lines contain every sample, with time stamps that only grow" {
   "$QORVIO" --quiet --core 1.1.0 record async_in_data --samples 50 --out counter.csv
-  [ "$(head -1 counter.csv)" = "time_s,missed,async_in_data" ]
+  [ "$(head -1 counter.csv)" = "time_s,missed,async_in_data,async_in_data moved" ]
   diff <(tail -n +2 counter.csv | cut -d, -f3) <(counted 50 | xargs printf '0x%04X\n')
   tail -n +2 counter.csv | cut -d, -f1 | sort -C -g
   "$QORVIO" --quiet --core 1.1.0 record async_in_data --samples 50 --out counter.jsonl
-  diff <(sed 's/.*"async_in_data":"\(.*\)"}/\1/' counter.jsonl) <(counted 50 | xargs printf '0x%04X\n')
+  diff <(jq -r '.async_in_data // empty' counter.jsonl) <(counted 50 | xargs printf '0x%04X\n')
+}
+
+@test "a trigger keeps the samples around it, and is said in the file" {
+  cat >lab.toml <<'TOML'
+core = "1.1.0"
+[[signal]]
+name = "level"
+port = "async_in"
+bits = "7:0"
+scale = 0.5
+unit = "V"
+[[signal]]
+name = "top"
+port = "async_in"
+bits = 7
+enum = { low = 0, high = 1 }
+TOML
+  export QORVIO_SIGNALS=lab.toml
+  "$QORVIO" record --when 'level > 50 V' --before 1 --after 2 --out -.csv | cut -d, -f2- >level.csv
+  diff level.csv - <<'CSV'
+missed,trigger [level > 50 V],level [V],top,level moved,top moved
+0,0,45.5,low,3,0
+0,1,50.5,low,3,0
+0,0,55.5,low,3,0
+0,0,60.5,low,3,0
+CSV
+  "$QORVIO" record level --when 'level > 50 V' --until top --out level.jsonl
+  [ "$(jq -c '.when, .signals[0].unit, .level, .trigger' level.jsonl | xargs)" = \
+    "level > 50 V V null null null null 50.5 true null null 55.5 null null null 60.5 null null null 65.5 null" ]
+  "$QORVIO" --quiet record level --when 'level > 50 V' --samples 2 --out level.vcd
+  grep -qF '$comment trigger: level > 50 V $end' level.vcd
+  run "$QORVIO" record --when 'level > 500 V' --for 20ms --out never.csv
+  [ "$status" -eq 1 ]
+  [ "$output" = "qorvio: not within 20 ms: level > 500 V" ]
 }
 
 @test "Ctrl-C ends a recording whose file is whole" {

@@ -36,7 +36,7 @@ outputs level
 sleep 1ms
 echo all "is  well"
 SCRIPT
-  gives 0 $'level\\[0] = 1\nNAME   LAST GIVEN\nlevel  0x5B\nall is  well' --signals level.toml run good.qv
+  gives 0 $'level\\[0] = 1\nNAME   LAST GIVEN  AT  BY\nlevel  0x5B\nall is  well' --signals level.toml run good.qv
   printf 'write async_out_data=1\n\nexpect async_in_data==2\necho never\n' >bad.qv
   gives 1 $'1..3\nok 1 - write async_out_data=1\nnot ok 2 - expect async_in_data==2\nBail out! bad.qv:3: not true: async_in_data==2; *' \
     run bad.qv --tap

@@ -84,7 +84,7 @@ CASES
 @test "missing standard streams are no files of the tool, and no control sequence reaches the terminal" {
   for closed in '<&-' '>&-' '2>&-' '<&- >&-' '<&- 2>&-' '>&- 2>&-' '<&- >&- 2>&-'; do
     eval "'$QORVIO' record --samples 1 --out one.csv $closed" # it says which board, and how many samples
-    [ "$(head -1 one.csv)" = "time_s,missed,async_in_data,sync_in_data" ]
+    [ "$(head -1 one.csv)" = "time_s,missed,async_in_data,sync_in_data,async_in_data moved,sync_in_data moved" ]
     [ "$(wc -l <one.csv)" -eq 2 ]
   done
   run "$QORVIO" --cable "sim:$(printf '\033[31m\233')" info

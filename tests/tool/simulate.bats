@@ -14,6 +14,14 @@ serve() {  # serve ARGUMENTS: starts the board, and waits until it says where
   [ "$(jq -c . told)" = "{\"host\":\"127.0.0.1\",\"port\":$port,\"board\":\"demo\"}" ]
   "$QORVIO" --cable "rbb:127.0.0.1:$port" write async_out_data=5A
   gives 0 $'*\nasync_in_data  0x5A *' --cable "rbb:127.0.0.1:$port" read async_in_data
+  # What moved is shown once, to whoever asks for it.
+  "$QORVIO" --cable "rbb:127.0.0.1:$port" write async_out_data=5B
+  for shown in '0 0x1 ↑' '1 0x1 ·' '0 0x1 ·'; do
+    read -r bit value arrow <<<"$shown"
+    "$QORVIO" --cable "rbb:127.0.0.1:$port" read 'async_in_data[7:4]'
+    run "$QORVIO" --cable "rbb:127.0.0.1:$port" read "async_in_data[$bit]"
+    [[ ${lines[1]} =~ $value\ +$arrow ]]
+  done
   kill -INT $pid
   wait $pid
   pid=
@@ -41,4 +49,16 @@ serve() {  # serve ARGUMENTS: starts the board, and waits until it says where
   tells frames
   kill -KILL $host
   gives 0 '*0       0A5F1093  device0  6*' --cable "rbb:127.0.0.1:$QORVIO_BOARD_PORT" scan # the board takes one client at a time
+}
+
+@test "a board that serves another client is told of as one" {
+  serve --json
+  cable=rbb:127.0.0.1:$(jq .port told)
+  "$QORVIO" --cable "$cable" watch --json >frames 3>&- &
+  other=$!
+  until [ -s frames ]; do sleep 0.05; done
+  run "$QORVIO" --cable "$cable?timeout=1" scan
+  kill $other
+  [ "$status" -eq 1 ]
+  [[ $output == *" gave 0 of "*" answers within "*": another program may be connected" ]]
 }

@@ -30,18 +30,25 @@ hides() { ! on_screen capture-pane -p | grep -qE "$1"; }  # hides REGEX: in no l
 @test "keys toggle and pulse outputs, the table follows, and q leaves a clean terminal" {
   types "'$QORVIO' watch --rate 20"
   shows '^async_in_data +0x00 +·'
-  shows '^> async_out_data\[0\] +0x0'
-  keys j Space
+  shows '^> async_out_data +0x00'
+  keys j j Space
   shows '^async_in_data +0x02 +· +↑'
   shows '^> async_out_data\[1\] +0x1'
   keys p
   shows 'plays no pulses, press it instead: async_out_data\[1\]'
-  for i in {1..7}; do keys j; done
+  keys k k = q Enter
+  shows 'not a value for async_out_data, whose radix is hex: q'
+  keys h Enter 5 B C-h A Enter
+  shows '^async_in_data +0x5A +.* +↑ +.*▃$'
+  for i in {1..10}; do keys j; done
   keys p
   shows '^sync_in_data +0x00 +· +· +↕'
   keys 'C-\' C-z q
   shows 'left with 0'
   [ "$(on_screen capture-pane -p | grep -c 'OUTPUT')" -eq 0 ]
+  keys "'$QORVIO' watch" Enter
+  shows '^> sync_out_data\[0\]' # as it was left
+  shows '^INPUT.* LATEST$'
 }
 
 @test "Ctrl-C ends it as cleanly, and without a terminal it prints frames" {
@@ -54,15 +61,15 @@ hides() { ! on_screen capture-pane -p | grep -qE "$1"; }  # hides REGEX: in no l
 
 @test "lines without room scroll into sight, and a resize redraws all" {
   on_screen new-session -d -x 100 -y 12 "'$QORVIO' watch"
-  shows '^12 lines not shown, 0 above and 12 below'
+  shows '^14 lines not shown, 0 above and 14 below'
   hides 'sync_out_data\[7\]'
   keys PageDown Down
-  shows '^13 lines not shown, 10 above and 3 below'
+  shows '^15 lines not shown, 10 above and 5 below'
   hides INPUT
-  shows '^> async_out_data\[0\]' # the chosen one is always in sight
+  shows '^> async_out_data ' # the chosen one is always in sight
   keys Up PageUp j j j j j j
-  shows '^> async_out_data\[6\]'
-  shows '^12 lines not shown, 3 above and 9 below'
+  shows '^> async_out_data\[5\]'
+  shows '^14 lines not shown, 3 above and 11 below'
   on_screen resize-window -x 100 -y 30
   shows '^INPUT'
   shows '^  sync_out_data\[7\]'
@@ -71,13 +78,15 @@ hides() { ! on_screen capture-pane -p | grep -qE "$1"; }  # hides REGEX: in no l
 
 @test "keys do not wait for a frame each where the link is slower than the rate" {
   types "'$QORVIO_LOSSY' --cable slow:99 --core 0.1.0 watch --frames 6"
-  keys j j j j j j j Space # which wait in the terminal until they are read
+  keys j j j j j j j j Space # which wait in the terminal until they are read
   shows 'left with 0'
-  [[ $(cat qorvio/*) == '{"async_out":"80","async_out_known":"80",'* ]]
+  [[ $(cat qorvio/*.json) == '{"async_out":"80","async_out_known":"80",'* ]]
 }
 
 @test "a lost link leaves the last frame on a clean terminal, and ends with 1" {
   types "'$QORVIO_LOSSY' --cable lossy:12 --core 0.1.0 watch --rate 50"
+  shows 'link is down; trying again'
+  keys q
   shows 'left with 1'
   shows '^async_in_data +0x00'
   shows '^frame 10 '

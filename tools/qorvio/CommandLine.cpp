@@ -6,8 +6,8 @@ namespace qor::tool {
 namespace {
 
 constexpr AddCommand scriptCommands[] = {
-    addScan, addInfo,   addSignals, addRead,   addWrite,  addOutputs, addBitCommands, addPort,
-    addWait, addExpect, addEvents,  addRecord, addRender, addPlay,    addDoctor,      addBench,
+    addScan,   addInfo,   addSignals, addRead,   addWrite, addOutputs, addBitCommands, addPort,   addWait,
+    addExpect, addEvents, addRecord,  addRender, addPlay,  addDoctor,  addBench,       addProbes,
 };
 constexpr AddCommand otherCommands[] = {addWatch, addRun, addSimulate};
 

@@ -138,7 +138,7 @@ class Place {
   Words valuesOf(const std::string& kind, const std::string& word) {
     if (kind.find('|') != kind.npos) return split(kind, '|');
     if (kind == "URL") return isInFileName(word) ? Words{fileNames} : Words{"sim:", "rbb:", "openocd:"};
-    if (kind == "INPUT") return names(Direction::input, "");
+    if (kind == "INPUT" || kind == "CONDITION") return names(Direction::input, "");
     if (kind == "OUTPUT") return names(Direction::output, "");
     if (kind == "OUTPUT=VALUE")
       return word.find('=') == word.npos ? names(Direction::output, "=") : enumeration(word);

@@ -1,12 +1,14 @@
 // What the commands share: settings, and the board, core and names that they lead to, opened when first asked for.
 #pragma once
 
+#include <cstdio>
 #include <memory>
 #include <optional>
 #include <string>
 
 #include "board/Board.h"
 #include "board/session/CountingCable.h"
+#include "board/session/LoggingCable.h"
 #include "os/Stop.h"
 #include "tools/qorvio/Settings.h"
 
@@ -59,6 +61,9 @@ class Context {
   };
 
  private:
+  LogFunction logFunction();
+
+  std::unique_ptr<std::FILE, int (*)(std::FILE*)> log_{nullptr, std::fclose};
   Traffic* traffic_ = nullptr;
   std::unique_ptr<Link> link_;
   std::unique_ptr<Board> board_;

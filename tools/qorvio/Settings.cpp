@@ -136,6 +136,12 @@ void Settings::addOptions(CLI::App& app) {
       ->type_name("DEVICE.CHAIN.INDEX");
   add("--signals", signals, "names for its bits (QORVIO_SIGNALS)")->type_name("FILE");
   app.add_flag("--force-core", forceCore, "use --core though the signals file is for another core");
+  app.add_flag("--share", share,
+               "read a core though another program does: both miss activity that the other one took");
+  app.add_option("--log", log,
+                 "writes down each exchange with the board: time, scans, bits, the server's warnings")
+      ->type_name("FILE");
+  app.add_flag("-v,--verbose", verbose, "the same on standard error");
   app.add_flag("--json", json, "results as JSON");
   app.add_flag("--quiet", quiet, "no progress, no remarks");
 }

@@ -13,6 +13,9 @@ struct Settings {
   std::string core;
   std::string signals;
   bool forceCore = false;  ///< --core counts though the signals file is for another one
+  bool share = false;      ///< read cores that other programs read
+  std::string log;         ///< where exchanges are written down; empty: nowhere
+  bool verbose = false;    ///< exchanges on standard error
   bool json = false;
   bool quiet = false;
 

@@ -24,6 +24,7 @@ void addBench(CLI::App& app, Context& context);
 void addWait(CLI::App& app, Context& context);
 void addExpect(CLI::App& app, Context& context);
 void addEvents(CLI::App& app, Context& context);
+void addProbes(CLI::App& app, Context& context);
 void addOutputs(CLI::App& app, Context& context);
 void addRun(CLI::App& app, Context& context);
 void addSimulate(CLI::App& app, Context& context);

@@ -68,7 +68,8 @@ void events(Context& context, const EventOptions& options) {
   Subscription inputs(poller, context.signals().select(options.names, Direction::input));
   poller.poll();
   inputs.look();  // what moved before is no event
-  const os::Stop stop;
+  context.board().markSeen({});
+  const Context::Stoppable stop(context);
   pace.begin = pace.due = Clock::now();
   for (std::uint64_t count = 0; pace.await(stop);) {
     poller.poll();
@@ -79,7 +80,8 @@ void events(Context& context, const EventOptions& options) {
       lines += lineOf(each, samples[each.core], pace.seconds(), context.settings.json);
       if (++count == options.count) break;
     }
-    if (!os::writeOutput(lines, stop) || (count == options.count && count != 0)) return;
+    context.board().markSeen(inputs.inputs());
+    if (!os::writeOutput(lines, stop) || (count == options.count && count != 0)) break;
   }
 }
 

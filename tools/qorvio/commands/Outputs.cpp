@@ -1,4 +1,5 @@
 // What outputs were given.
+#include "os/Process.h"
 #include "tools/qorvio/Report.h"
 #include "tools/qorvio/commands/Commands.h"
 #include "tools/qorvio/terminal/Table.h"
@@ -7,13 +8,16 @@ namespace qor::tool {
 namespace {
 
 void outputs(Context& context, const std::vector<std::string>& names) {
-  Table table({"NAME", "LAST GIVEN"});
+  Table table({"NAME", "LAST GIVEN", "AT", "BY"});
   nlohmann::ordered_json json = nlohmann::ordered_json::array();
   for (const Signal& each : context.signals().select(names, Direction::output)) {
     const std::optional<Bytes> value = context.board().lastGiven(each);
-    table.add({each.name, value ? shown(each, *value) : "unknown"});
+    const std::optional<Gift> gift = context.board().core(each.core).lastGift(each);
+    const std::string time = gift ? os::localTime(gift->at) : "";
+    table.add({each.name, value ? shown(each, *value) : "unknown", time, gift ? gift->by : ""});
     json.push_back({{"name", each.name}, {"width", each.width()}, {"last_given", nullptr}});
     if (value) json.back()["last_given"] = hexText(*value, each.width());
+    if (gift) json.back().update({{"at", time}, {"by", gift->by}});
   }
   print({table.text(), json}, context.settings.json);
 }

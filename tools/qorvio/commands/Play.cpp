@@ -1,5 +1,7 @@
 #include <chrono>
 #include <cstdio>
+#include <iostream>
+#include <iterator>
 
 #include "board/model/Duration.h"
 #include "board/model/Errors.h"
@@ -25,12 +27,17 @@ Report reportOf(const Played& played, bool isTimed) {
   return {text + "\n", {{"rows", played.rows}, {"exchanges", played.exchanges}, {"late", played.late}}};
 }
 
+PlayScript scriptOf(const std::string& file, const SignalTable& signals) {
+  if (file != "-") return readPlayScript(file, signals);
+  return parsePlayScript(std::string{std::istreambuf_iterator<char>(std::cin), {}}, "stdin", signals);
+}
+
 void play(Context& context, const PlayOptions& options) {
   const nanoseconds period = options.rate == 0 ? nanoseconds(0) : periodOf(options.rate, 0.001, 1e9);
-  const PlayScript script = readPlayScript(options.file, context.signals());
+  const PlayScript script = scriptOf(options.file, context.signals());
   if (script.hasTimes() && options.rate != 0)
     throw WrongUse("the rows have times of their own and take no --rate: " + options.file);
-  const os::Stop stop;
+  const Context::Stoppable stop(context);
   const Played played = qor::play(context.board(), script, period, [&stop] { return stop.asked(); });
   context.board().rememberOutputs();
   if (context.settings.json || !context.settings.quiet)
@@ -42,7 +49,9 @@ void play(Context& context, const PlayOptions& options) {
 void addPlay(CLI::App& app, Context& context) {
   auto options = std::make_shared<PlayOptions>();
   CLI::App* command = app.add_subcommand("play", "drives outputs from a table of values");
-  command->add_option("FILE", options->file, "CSV: names of outputs, and below them a row of values each")
+  command
+      ->add_option("FILE", options->file,
+                   "CSV: names of outputs, and below them a row of values each; - is standard input")
       ->required();
   command->add_option("--rate", options->rate, "rows per second; without it as fast as the cable allows");
   command->footer(

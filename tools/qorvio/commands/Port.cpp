@@ -57,8 +57,7 @@ void get(Context& context, const std::string& name) {
   SignalTable all;
   all.addWholePorts(info);
   if (name.empty()) ports = all.select({}, Direction::input);
-  Sample sample = emptySample(info);
-  context.core().read(sample);
+  const Sample sample = context.board().read(ports).samples().front();
   nlohmann::ordered_json json = nlohmann::ordered_json::array();
   Table table({"PORT", "WIDTH", "VALUE", "UP", "DOWN", "SYNC UP", "SYNC DOWN"});
   for (const Signal& port : ports) {

@@ -35,9 +35,8 @@ void read(Context& context, const ReadOptions& options) {
   Radix radix{};
   if (!options.radix.empty()) radix = radixNamed(options.radix);
   const std::vector<Signal> signals = context.signals().select(options.names, Direction::input);
-  Subscription inputs(context.board().poller(), signals);
-  context.board().poller().poll();
-  print(reportOf(signals, inputs.look(), options.radix.empty() ? nullptr : &radix), context.settings.json);
+  const Frame frame = context.board().read(signals);
+  print(reportOf(signals, frame.samples(), options.radix.empty() ? nullptr : &radix), context.settings.json);
 }
 
 }  // namespace
@@ -45,7 +44,7 @@ void read(Context& context, const ReadOptions& options) {
 void addRead(CLI::App& app, Context& context) {
   auto options = std::make_shared<ReadOptions>();
   CLI::App* command =
-      app.add_subcommand("read", "values of inputs, and what moved since they were read last");
+      app.add_subcommand("read", "values of inputs, and what they did since they were last asked for");
   command->add_option("INPUT", options->names,
                       "inputs; without a name all of them. NAME[7:4] is a part of one");
   command->add_option("--radix", options->radix, "instead of the radix that the signals file gives")

@@ -6,6 +6,7 @@
 
 #include "board/model/Duration.h"
 #include "board/model/Errors.h"
+#include "board/model/Spelling.h"
 #include "tools/qorvio/CommandLine.h"
 #include "tools/qorvio/commands/Commands.h"
 #include "tools/qorvio/terminal/Printable.h"
@@ -104,8 +105,12 @@ void obey(Context& context, const Step& step) {
   try {
     app.parse(std::vector<std::string>(step.words.rbegin(), step.words.rend()));
   } catch (const CLI::ParseError& error) {
-    throw WrongUse(app.get_subcommands().empty() ? "no such command in a script: " + step.words.front()
-                                                 : error.what());
+    if (!app.get_subcommands().empty()) throw WrongUse(error.what());
+    std::vector<std::string> names;
+    for (const CLI::App* each : app.get_subcommands([](const CLI::App*) { return true; }))
+      names.push_back(each->get_name());
+    throw WrongUse("no such command in a script" +
+                   didYouMean(step.words.front(), {names.begin(), names.end()}) + ": " + step.words.front());
   }
 }
 

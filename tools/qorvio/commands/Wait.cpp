@@ -33,6 +33,7 @@ void wait(Context& context, const WaitOptions& options) {
   const Context::Stoppable stop(context);
   const auto begin = std::chrono::steady_clock::now();
   board.waitFor(condition, timeout);
+  board.markSeen(condition.signals());
   const double seconds = std::chrono::duration<double>(std::chrono::steady_clock::now() - begin).count();
   if (context.settings.json) print({{}, {{"condition", condition.text()}, {"after_s", seconds}}}, true);
 }
@@ -62,8 +63,10 @@ void addExpect(CLI::App& app, Context& context) {
       ->required();
   command->footer(std::string(language) + "Example:\n  qorvio expect 'async_in_data == 0'");
   command->callback([&context, conditions] {
+    const Condition condition = allOf(context.board(), *conditions);
     try {
-      context.board().waitFor(allOf(context.board(), *conditions), std::chrono::nanoseconds(0));
+      context.board().waitFor(condition, std::chrono::nanoseconds(0));
+      context.board().markSeen(condition.signals());
     } catch (const Timeout& error) {
       throw Failure("not true: " +
                     std::string(error.what()).substr(std::string(error.what()).find(": ") + 2));

@@ -1,5 +1,6 @@
 #include <chrono>
 #include <cstdio>
+#include <utility>
 
 #include "board/model/Duration.h"
 #include "board/model/Errors.h"
@@ -8,11 +9,11 @@
 #include "os/Terminal.h"
 #include "tools/qorvio/InputJson.h"
 #include "tools/qorvio/InputWatch.h"
+#include "tools/qorvio/LiveWatch.h"
 #include "tools/qorvio/Number.h"
 #include "tools/qorvio/Report.h"
+#include "tools/qorvio/WatchLayout.h"
 #include "tools/qorvio/commands/Commands.h"
-#include "tools/qorvio/terminal/Printable.h"
-#include "tools/qorvio/terminal/Screen.h"
 #include "tools/qorvio/terminal/WatchTables.h"
 
 namespace qor::tool {
@@ -35,6 +36,7 @@ class Frames {
   /// Whether another one is wanted after so many.
   bool goesOn(std::uint64_t frames) const { return !stop_.asked() && (count_ == 0 || frames < count_); }
   void begin() { due_ = std::max(due_ + period_, Clock::now()); }
+  void wait(Clock::duration time) { due_ = std::max(due_, Clock::now() + time); }
   bool isOver() const { return stop_.asked() || Clock::now() >= due_; }
   void sleep() const { stop_.sleepUntil(due_); }
   const os::Stop& stop() const { return stop_; }
@@ -52,77 +54,6 @@ class Frames {
   Clock::time_point due_ = Clock::now();
 };
 
-// The tables on a terminal, and what the keys do to them.
-class LiveWatch {
- public:
-  LiveWatch(InputWatch& watch, OutputTable outputs)
-      : watch_(watch), inputs_(watch), outputs_(std::move(outputs)) {}
-
-  std::string update(os::TerminalSize size) {
-    std::vector<std::string> foot = {"", "frame " + std::to_string(watch_.frames()) +
-                                             "   j k choose, space toggle, p pulse, c clear, q quit"};
-    if (!status_.empty()) foot.push_back(printable(status_));
-    for (std::string& line : foot) line = shortened(line, size.columns);
-    const auto &inputs = inputs_.lines(watch_, size.columns), &outputs = outputs_.lines(size.columns);
-    return screen_.update(size.rows, {&inputs, &between_, &outputs}, std::move(foot), chosenLine());
-  }
-
-  void press(os::Key key) {
-    status_.clear();
-    try {
-      obey(key);
-    } catch (const WrongUse& error) {
-      status_ = error.what();
-    }
-  }
-
-  void redraw() { screen_.forget(); }
-
-  std::string shown() const {
-    std::string text;
-    for (const std::string& line : screen_.shown()) text += line + '\n';
-    return text.erase(text.find_last_not_of('\n') + 1) + '\n';
-  }
-
- private:
-  static constexpr std::ptrdiff_t farAway = 1'000'000;
-
-  std::size_t chosenLine() const { return watch_.inputs().size() + 2 + outputs_.chosenLine(); }
-
-  void obey(os::Key key) {
-    switch (key) {
-      case 'j':
-      case 'k':
-        key == 'j' ? outputs_.chooseNext() : outputs_.chooseBefore();
-        return screen_.reveal(chosenLine());
-      case ' ':
-        return outputs_.toggleChosen();
-      case 'p':
-        return outputs_.pulseChosen();
-      case 'c':
-        return watch_.clear();
-      case os::keyUp:
-      case os::keyDown:
-        return screen_.scroll(key == os::keyUp ? -1 : 1);
-      case os::keyHome:
-      case os::keyEnd:
-        return screen_.scroll(key == os::keyHome ? -farAway : farAway);
-      case os::keyPageUp:
-      case os::keyPageDown:
-        return screen_.scrollPages(key == os::keyPageUp ? -1 : 1);
-      default:
-        return;
-    }
-  }
-
-  InputWatch& watch_;
-  InputTable inputs_;
-  OutputTable outputs_;
-  const std::vector<std::string> between_{""};
-  std::string status_;
-  Screen screen_;
-};
-
 // On a link that is slower than the rate, keys are to be obeyed as fast as they come, and frames still to be seen.
 constexpr int keysAtOnce = 16;
 
@@ -135,24 +66,53 @@ bool showWithKeys(LiveWatch& live, os::Terminal& terminal, const Frames& frames)
     for (int i = 0; i < keysAtOnce; ++i, wait = milliseconds(0)) {
       const os::Key key = terminal.key(wait);
       if (key == os::noKey) break;
-      if (key == 'q' || key == os::endOfKeys) return false;
+      if ((key == 'q' && !live.isTyping()) || key == os::endOfKeys) return false;
       live.press(key);
     }
   } while (!frames.isOver());
   return true;
 }
 
-void runOnTerminal(InputWatch& watch, OutputTable outputs, Frames& frames) {
-  LiveWatch live(watch, std::move(outputs));
+// What the link says while it is lost, and nothing else.
+class LostLink {
+ public:
+  // False, with the words kept, when it fails; a second is enough between two tries.
+  bool poll(InputWatch& watch, LiveWatch& live, Frames& frames) {
+    try {
+      watch.poll();
+    } catch (const Busy&) {
+      throw;
+    } catch (const Failure& failure) {
+      words_ = failure.what();
+      live.say(words_ + "; trying again");
+      frames.wait(std::chrono::seconds(1));
+      return false;
+    }
+    if (!words_.empty()) live.say("");
+    words_.clear();
+    return true;
+  }
+
+  const std::string& words() const { return words_; }
+
+ private:
+  std::string words_;
+};
+
+void runOnTerminal(InputWatch& watch, LiveWatch& live, Frames& frames) {
+  LostLink lost;
+  watch.poll();  // a link that was never there is no lost one
   try {
     os::Terminal terminal(frames.stop());
-    while (frames.goesOn(watch.frames())) {
+    bool isFirst = true;
+    while (isFirst || frames.goesOn(watch.frames())) {
       frames.begin();
-      watch.poll();
-      if (!showWithKeys(live, terminal, frames)) return;
+      if (std::exchange(isFirst, false) || lost.poll(watch, live, frames)) live.keep();
+      if (!showWithKeys(live, terminal, frames)) break;
     }
+    if (!lost.words().empty()) throw Failure(lost.words());
   } catch (const std::exception&) {  // the screen is gone: leave the last frame where it can be seen
-    if (watch.frames() != 0) std::printf("%s", live.shown().c_str());
+    std::printf("%s", live.shown().c_str());
     throw;
   }
 }
@@ -197,14 +157,23 @@ void printJson(InputWatch& watch, Frames& frames) {
   });
 }
 
-void runWatch(Context& context, const WatchOptions& options) {
-  const Clock::duration period = periodOf(options.rate, 0.01, 1000);
-  InputWatch watch(context.board().poller(), context.signals().select(options.names, Direction::input));
-  Frames frames(period, options.frames);
+void show(Context& context, InputWatch& watch, Frames& frames) {
   if (context.settings.json) return printJson(watch, frames);
   if (!os::isTerminal(os::Stream::input) || !os::isTerminal(os::Stream::output))
     return printTables(watch, frames);
-  runOnTerminal(watch, OutputTable(context.board()), frames);
+  LiveWatch live(watch, OutputTable(context.board()));
+  const WatchLayout layout(context.cable());
+  layout.restore(live);
+  runOnTerminal(watch, live, frames);
+  layout.keep(live);
+}
+
+void runWatch(Context& context, const WatchOptions& options) {
+  const Clock::duration period = periodOf(options.rate, 0.001, 1e9);
+  InputWatch watch(context.board().poller(), context.signals().select(options.names, Direction::input));
+  Frames frames(period, options.frames);
+  show(context, watch, frames);
+  context.board().markSeen(watch.inputs());
 }
 
 }  // namespace
@@ -217,9 +186,14 @@ void addWatch(CLI::App& app, Context& context) {
   command->add_option("--frames", options->frames, "how many; without a number until it is stopped")
       ->check(wholeNumber(1, 1'000'000'000'000));
   command->footer(
-      "Keys: j k choose an output bit, space toggles it, p pulses it, c clears, arrows, PgUp, PgDn, "
-      "Home and End scroll,\n"
-      "q quits. Without a terminal the table is printed frame after frame, with --json a line of JSON a "
+      "Keys: j k choose an output, space toggles a bit, p pulses it, = or Enter takes a value (with commas a "
+      "pulse "
+      "train),\n"
+      "h shows the latest frames, c clears, arrows, PgUp, PgDn, Home and End scroll, q quits. A lost link is "
+      "tried "
+      "again;\n"
+      "the chosen output and h are remembered per board. Without a terminal the table is printed frame after "
+      "frame, with --json a line of JSON a "
       "frame.\n\n"
       "Example:\n  qorvio watch --rate 20\n  qorvio --json watch --frames 3 async_in_data");
   command->callback([&context, options] { runWatch(context, *options); });

@@ -14,14 +14,29 @@ class InputTable {
  public:
   explicit InputTable(const InputWatch& watch);
 
-  /// Formats the rows of the inputs that changed, which it takes.
+  /// To be called once a frame: keeps what each input was, for the last column.
+  void keep(const InputWatch& watch);
+
+  /// Whether the last column shows the latest frames, the newest at its end: a level from ▁ (all bits 0) to █ each.
+  /// @{
+  bool showsHistory() const { return showsHistory_; }
+  void showHistory(bool isShown);
+  /// @}
+
+  /// Formats the rows of the inputs that changed, which it takes; with the history, all.
   const std::vector<std::string>& lines(InputWatch& watch, std::size_t width);
 
  private:
+  void format(const InputWatch& watch, std::size_t i);
+
+  std::size_t inputs_;
   Table table_;
+  std::vector<std::string> levels_;  // a digit a frame, 0 to 7
+  bool showsHistory_ = false, isOtherwise_ = false;
 };
 
-/// Outputs bit by bit, one of them chosen, with the values that they were last given.
+/// Outputs with the values that they were last given, one row chosen: a row each, and one for each bit of those that are
+/// not too wide.
 class OutputTable {
  public:
   /// The board must outlive it.
@@ -33,17 +48,27 @@ class OutputTable {
   void chooseNext() { choose(chosen_ + 1); }
   void chooseBefore() { choose(chosen_ - 1); }
 
+  /// Chooses the one of that name, if there is one.
+  void choose(const std::string& name);
+
+  /// Its name; empty when there are no outputs.
+  std::string chosen() const { return outputs_.empty() ? "" : outputs_[chosen_].name; }
+
   /// In which of the lines the chosen one is.
   std::size_t chosenLine() const { return chosen_ + 1; }
 
-  /// Writes to the chosen one. Throws Failure, or WrongUse where it plays no pulses.
+  /// Writes to the chosen one. Throws Failure, or WrongUse where it cannot be done.
   /// @{
   void toggleChosen();
   void pulseChosen();
+  /// A value as write takes it, or several with commas between, a pulse train.
+  void giveChosen(const std::string& text);
   /// @}
 
  private:
-  void addBits(const SignalTable& signals, const Signal& output);
+  static constexpr unsigned widestWithBits = 32;
+
+  void addRows(const SignalTable& signals, const Signal& output);
   void choose(std::size_t index);
   void format(std::size_t index);
   void write(const Assignment& assignment);
