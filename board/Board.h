@@ -140,7 +140,7 @@ class QORBOARD_API Board {
   std::vector<std::unique_ptr<Core>> cores_;
   std::unique_ptr<Poller> poller_;
   std::unique_ptr<Subscription> reads_;
-  std::vector<Sample> unseen_;  // one a core: activity that was read and not asked for
+  std::vector<Sample> unseen_;  // one per core: activity that was read and not asked for
 };
 
 }  // namespace qor

@@ -3,6 +3,7 @@
 #include <pthread.h>
 
 #include <algorithm>
+#include <exception>
 
 #include "board/model/CoreAddress.h"
 
@@ -75,7 +76,10 @@ void Session::open(std::unique_ptr<QorRT::Qor_Cable> cable, const std::string& s
 }
 
 Session::~Session() {
-  close();
+  try {
+    close();
+  } catch (const std::exception&) {  // there is nobody to report it to
+  }
 }
 
 bool Session::isOfParent() const {

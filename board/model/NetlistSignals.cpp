@@ -20,7 +20,7 @@ constexpr Port ports[] = {Port::asyncOut, Port::syncOut, Port::asyncIn, Port::sy
 /// Bit `index` of a net that is `width` bits wide.
 struct NetBit {
   std::string net;
-  std::size_t index, width;
+  std::size_t index = 0, width = 0;
 };
 
 struct Instance {
@@ -37,7 +37,8 @@ std::string plainName(const std::string& net) {
 
 // The part of the net from bit `low` on.
 std::string partName(const NetBit& low, std::size_t count) {
-  const std::string name = plainName(low.net), first = std::to_string(low.index);
+  std::string name = plainName(low.net);
+  const std::string first = std::to_string(low.index);
   if (count == low.width) return name;
   return count == 1 ? name + "_" + first : name + "_" + std::to_string(low.index + count - 1) + "_" + first;
 }

@@ -14,8 +14,8 @@ namespace qor {
 
 /// What a recorder writes of one poll.
 struct Poll {
-  std::uint64_t nanoseconds;         ///< since the recording began
-  std::uint64_t missed;              ///< polls that should have been between this one and the one before
+  std::uint64_t nanoseconds = 0;     ///< since the recording began
+  std::uint64_t missed = 0;          ///< polls that should have been between this one and the one before
   const std::vector<Bytes>& values;  ///< one per signal
   const std::vector<std::size_t>& changed;  ///< the signals that differ from the poll before; at first all
   /// What each signal did since the poll before: 1 rose, 2 fell, 4 sync rose, 8 sync fell, added.

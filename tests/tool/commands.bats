@@ -147,7 +147,7 @@ JSON
 
 @test "a log has each exchange with its bits" {
   qorvio --core 1.1.0 --log log read
-  grep -qE '^[0-9.]+ s, took [0-9.]+ s; IR device 1 USER1; DR device 1, [0-9]+ bits, out F+[0-9A-F]+0401, in 0[0-9A-F]+1$' log ||
+  grep -qE '^[0-9.]+ s, took [0-9.]+ s; IR device 1 USER1; DR device 1, [0-9]+ bits, out F+[0-9A-F]+401, in 0[0-9A-F]+1$' log ||
     { cat log; false; }
   qorvio -v --core 1.1.0 read 2>said
   [ "$(wc -l <said)" -eq "$(wc -l <log)" ]

@@ -137,11 +137,11 @@ class Board(Names):
         return self._session.url
 
     def read(self) -> Frame:
-        """All inputs, in one exchange a core, with what moved since the read before. Raises LinkError."""
+        """All inputs, in one exchange per core, with what moved since the read before. Raises LinkError."""
         return self._session.frame(True)
 
     def write(self, values: Optional[Mapping[str, Any]] = None, /, **more: Any) -> None:
-        """Gives outputs their values, in one exchange a core: `write(leds=0x35, go=1)`, `write({"leds[3]": 1})`.
+        """Gives outputs their values, in one exchange per core: `write(leds=0x35, go=1)`, `write({"leds[3]": 1})`.
 
         A value is what `Signal.value` can be set to, or `pulse()` or `train()` for a synchronous output. Raises
         UsageError and UnknownSignal, with nothing sent, and LinkError.
