@@ -68,7 +68,7 @@ std::string writeWaveView(const std::string& vcdPath, const std::vector<Signal>&
     save += vcdScope(cores[each.core]) + "." + name;
     save += each.width() == 1 ? "\n" : "[" + std::to_string(each.width() - 1) + ":0]\n";
   }
-  const std::string path = std::filesystem::path(dump).replace_extension(".gtkw").string();
+  std::string path = std::filesystem::path(dump).replace_extension(".gtkw").string();
   write(path, save);
   return path;
 }
