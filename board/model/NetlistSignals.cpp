@@ -17,10 +17,12 @@ using nlohmann::json;
 
 constexpr Port ports[] = {Port::asyncOut, Port::syncOut, Port::asyncIn, Port::syncIn};
 
-/// Bit `index` of a net that is `width` bits wide.
+/// Bit `index` of a net.
 struct NetBit {
   std::string net;
-  std::size_t index = 0, width = 0;
+  bool isHidden = false;  // people did not name it
+  const json* bits = nullptr;
+  std::size_t index = 0;
 };
 
 struct Instance {
@@ -39,7 +41,7 @@ std::string plainName(const std::string& net) {
 std::string partName(const NetBit& low, std::size_t count) {
   std::string name = plainName(low.net);
   const std::string first = std::to_string(low.index);
-  if (count == low.width) return name;
+  if (count == low.bits->size()) return name;
   return count == 1 ? name + "_" + first : name + "_" + std::to_string(low.index + count - 1) + "_" + first;
 }
 
@@ -111,43 +113,44 @@ class Netlist {
     return std::move(signals_);
   }
 
-  // Which net a bit belongs to: one that people named, with the shortest name.
   void index(const json& nets) {
-    using Rank = std::tuple<bool, std::size_t, std::string>;
-    std::unordered_map<std::size_t, Rank> ranks;
     for (const auto& [name, net] : nets.items()) {
       const json& bits = net.is_object() && net.contains("bits") ? net["bits"] : net;
       const bool isHidden = net.is_object() && net.value("hide_name", 0) != 0;
-      for (std::size_t i = 0; bits.is_array() && i < bits.size(); ++i) {
-        if (!bits[i].is_number_unsigned()) continue;
-        const std::size_t bit = bits[i];
-        const Rank rank(isHidden, name.size(), name);
-        const auto [place, isNew] = ranks.emplace(bit, rank);
-        if (!isNew && place->second <= rank) continue;
-        place->second = rank;
-        nets_[bit] = {isHidden ? "" : name, i, bits.size()};
-      }
+      for (std::size_t i = 0; bits.is_array() && i < bits.size(); ++i)
+        if (bits[i].is_number_unsigned()) nets_[bits[i]].push_back({name, isHidden, &bits, i});
     }
   }
 
-  // Constants have no name, and no signal.
-  const NetBit* netOf(const json& bit) const {
-    const auto net = bit.is_number_unsigned() ? nets_.find(bit) : nets_.end();
-    return net != nets_.end() ? &net->second : nullptr;
+  // How many of the bits from `begin` on are those of the net.
+  static std::size_t run(const NetBit& net, const json& bits, std::size_t begin) {
+    std::size_t count = 0;
+    while (net.index + count < net.bits->size() && begin + count < bits.size() &&
+           (*net.bits)[net.index + count] == bits[begin + count])
+      ++count;
+    return count;
+  }
+
+  // The net that names most of the bits from `begin` on: one that people named, then the shortest name. Constants have none.
+  const NetBit* netOf(const json& bits, std::size_t begin) const {
+    const auto nets = bits[begin].is_number_unsigned() ? nets_.find(bits[begin]) : nets_.end();
+    if (nets == nets_.end()) return nullptr;
+    const auto rank = [&](const NetBit& net) {
+      return std::make_tuple(net.isHidden, bits.size() - run(net, bits, begin), net.net.size(), net.net);
+    };
+    return &*std::min_element(nets->second.begin(), nets->second.end(),
+                              [&](const NetBit& a, const NetBit& b) { return rank(a) < rank(b); });
   }
 
   void addRuns(Port port, const json& bits) {
-    for (std::size_t begin = 0, end = 0; begin < bits.size(); begin = end) {
-      end = begin + 1;
-      const NetBit* const first = netOf(bits[begin]);
-      if (first == nullptr) continue;
-      for (const NetBit* next = nullptr; end < bits.size() && (next = netOf(bits[end])) != nullptr &&
-                                         next->net == first->net &&
-                                         next->index == first->index + end - begin;)
-        ++end;
-      const std::string name = first->net.empty() ? std::string(portName(port)) + "_" + std::to_string(begin)
-                                                  : partName(*first, end - begin);
-      add(name, port, begin, end - begin);
+    for (std::size_t begin = 0, count = 1; begin < bits.size(); begin += count) {
+      count = 1;
+      const NetBit* const net = netOf(bits, begin);
+      if (net == nullptr) continue;
+      count = run(*net, bits, begin);
+      const std::string name =
+          net->isHidden ? std::string(portName(port)) + "_" + std::to_string(begin) : partName(*net, count);
+      add(name, port, begin, count);
     }
   }
 
@@ -175,7 +178,7 @@ class Netlist {
 
   std::string path_;
   json root_;
-  std::unordered_map<std::size_t, NetBit> nets_;
+  std::unordered_map<std::size_t, std::vector<NetBit>> nets_;  // those that a bit belongs to
   std::set<std::pair<bool, std::string>> taken_;
   std::vector<Signal> signals_;
 };

@@ -87,7 +87,7 @@ std::string readNetlist(const std::string& file) {
 std::string netlistOf(const std::vector<std::string>& files) {
   const os::TemporaryFolder folder;
   const std::string netlist = folder.path() + "/netlist.json";
-  std::vector<std::string> words{"yosys", "-q", "-f", "verilog", "-o", netlist};
+  std::vector<std::string> words{"yosys", "-q", "-f", "verilog", "-p", "proc", "-o", netlist};
   words.insert(words.end(), files.begin(), files.end());
   int status = 0;
   try {
