@@ -55,7 +55,8 @@ void fuzz(std::string_view input) {
   }();
   const std::string kind(input.substr(0, input.find('\n')));
   const std::string text = grown(input.substr(std::min(kind.size() + 1, input.size())));
-  if (kind.empty() || kind.find_first_not_of("abcdefghijklmnopqrstuvwxyz.") != kind.npos) return;
+  if (kind.empty() || kind[0] == '.' || kind.find_first_not_of("abcdefghijklmnopqrstuvwxyz.") != kind.npos)
+    return;
   const auto before = std::filesystem::current_path();  // inputs may be named relative to it
   std::filesystem::current_path(folder);
   std::ofstream(kind) << text;
