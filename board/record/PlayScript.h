@@ -22,7 +22,7 @@ struct PlayScript {
 };
 
 /// Reads a script from its text; `path` is for messages. Its first column may be time_s, in seconds; then what record
-/// writes beside the values, and units behind names, are skipped. A byte order mark, blanks around fields and empty lines are skipped.
+/// writes beside the values, and units after names, are skipped. A byte order mark, blanks around fields and empty lines are skipped.
 /// Throws WrongUse, "FILE:LINE: what is wrong".
 QORBOARD_API PlayScript parsePlayScript(std::string_view text, const std::string& path,
                                         const SignalTable& signals);

@@ -28,7 +28,7 @@ struct Limits {
   std::uint64_t after =
       0;  ///< samples after it, which end the recording; 0: as many as the other limits allow
 
-  /// Ends the recording with the sample that makes it true, behind that of `when`.
+  /// Ends the recording with the sample that makes it true, after that of `when`.
   std::optional<Condition> until{};
 };
 

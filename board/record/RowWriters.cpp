@@ -76,7 +76,7 @@ class Row {
   bool isWhole_ = false;
 };
 
-// What both have in common: a column for each value, and behind them one for what each signal did.
+// What both have in common: a column for each value, and after them one for what each signal did.
 class RowWriter : public SampleWriter {
  public:
   explicit RowWriter(const std::string& path) : file_(path) {}

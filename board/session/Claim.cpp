@@ -11,7 +11,7 @@
 namespace qor {
 namespace {
 
-constexpr std::chrono::milliseconds patience(500);
+constexpr std::chrono::milliseconds timeout(500);
 
 std::string holderIn(const nlohmann::json& file) {
   const auto text = [&](const char* key) {
@@ -27,7 +27,7 @@ std::string holderIn(const nlohmann::json& file) {
 }  // namespace
 
 struct Claim::Lock {
-  explicit Lock(const std::string& path) : file(path, patience) {}
+  explicit Lock(const std::string& path) : file(path, timeout) {}
 
   os::FileLock file;
 };

@@ -17,7 +17,7 @@ namespace qor {
 using LogFunction = std::function<void(const std::string& line)>;
 
 /// A line for each exchange: when it began, in seconds since the cable was opened, how long it took, and its scans with
-/// their bits as hexadecimal numbers, most significant digit first; and one for each remark of the server behind the cable.
+/// their bits as hexadecimal numbers, most significant digit first; and one for each remark of the cable's server.
 class QORBOARD_API LoggingCable : public CountingCable {
  public:
   LoggingCable(std::unique_ptr<QorRT::Qor_Cable> cable, LogFunction log);

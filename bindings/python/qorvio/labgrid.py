@@ -39,7 +39,7 @@ class QorvioBoard(Resource):  # type: ignore[misc]
 @target_factory.reg_resource
 @attr.s(eq=False)
 class NetworkQorvioBoard(NetworkResource):  # type: ignore[misc]
-    """A board behind a server on another host: a remote_bitbang server, "rbb", or an OpenOCD server, "openocd".
+    """A board at a server on another host: a remote_bitbang server, "rbb", or an OpenOCD server, "openocd".
 
     `options` are what follows the port in the cable's URL, such as "?board=board.toml".
     """

@@ -15,7 +15,7 @@ struct Driver {
   const char* vendor;   ///< empty: any
   const char* product;  ///< empty: any
   const char* text;     ///< that its own name has in it; empty: any
-  const char* lines;    ///< of its configuration, behind the driver's name
+  const char* lines;    ///< of its configuration, after the driver's name
 };
 
 constexpr const char* ftdiLines =
