@@ -116,8 +116,9 @@ std::string plainText(const TomlPlace& place) {
 }
 
 QOR_CORE_REF coreOf(const TomlPlace& place) {
+  const std::string text = place.text();
   try {
-    return parseRef(place.text());
+    return parseRef(text);
   } catch (const WrongUse& error) {
     place.fail(error.what());
   }

@@ -5,7 +5,7 @@
 
 #include "board/model/CoreAddress.h"
 #include "board/model/Errors.h"
-#include "board/model/Spelling.h"
+#include "platform/jtag/cable/Qor_Spelling.h"
 
 namespace qor {
 namespace {
@@ -107,7 +107,7 @@ void SignalTable::failUnknown(std::string_view name, Direction direction) const 
     std::vector<std::string_view> known;
     for (const Signal& each : signals_)
       if (points(each, direction)) known.push_back(each.name);
-    hint = didYouMean(name, known);
+    hint = QorRT::didYouMean(name, known);
   }
   throw UnknownSignal(std::string("no ") + wordFor(direction) + " of that name" + hint + ": " +
                       std::string(name));

@@ -5,7 +5,7 @@
 
 #include "QorJtag_Host.h"
 #include "board/model/Errors.h"
-#include "board/model/Spelling.h"
+#include "platform/jtag/cable/Qor_Spelling.h"
 
 namespace qor {
 
@@ -44,7 +44,7 @@ TomlPlace TomlPlace::at(std::string_view name) const {
 void TomlPlace::requireKeys(const std::vector<std::string_view>& known) const {
   for (const auto& [key, node] : table()) {
     if (std::find(known.begin(), known.end(), key.str()) == known.end())
-      at(key.str()).fail("is no key of this file" + didYouMean(key.str(), known));
+      at(key.str()).fail("is no key of this file" + QorRT::didYouMean(key.str(), known));
   }
 }
 

@@ -1,11 +1,14 @@
 #include "board/session/Link.h"
 
+#include <algorithm>
+#include <iterator>
 #include <stdexcept>
 #include <utility>
 
 #include "QorVIO_Core.h"
 #include "board/model/CoreAddress.h"
 #include "board/model/Errors.h"
+#include "platform/core/QorCore_Host.h"
 
 namespace qor {
 namespace {
@@ -60,6 +63,24 @@ std::string whatIsAt(unsigned session, QOR_CORE_REF ref) {
   }
 }
 
+bool isAlike(const FoundCore& one, const FoundCore& other) {
+  const auto& fields = QorRT::QorVIO_coreFields;
+  return one.isVio() && one.ref.core_index == other.ref.core_index &&
+         std::all_of(std::begin(fields), std::end(fields), [&](const QorRT::QorVIO_CoreField& field) {
+           return one.info.*field.member == other.info.*field.member;
+         });
+}
+
+bool isOneCore(Link& link, const FoundCore& one, const FoundCore& other) {
+  constexpr std::size_t asyncBits = 2, syncBits = 17;  // of a write: mask and value, mask and pulse train
+  const std::size_t bits = asyncBits * one.info.async_output_count + syncBits * one.info.sync_output_count;
+  try {
+    return QorRT::isOneCore(link.session(), one.ref, other.ref, bits);
+  } catch (const std::exception&) {  // whoever writes to it will hear why
+    return false;
+  }
+}
+
 }  // namespace
 
 std::unique_ptr<QorRT::Qor_Cable> openCable(const std::string& url, StopFunction stop) {
@@ -109,6 +130,21 @@ std::vector<FoundCore> findCores(Link& link) {
     for (unsigned chain = 1; chain <= QorRT::Qor_Cable::userChainCount; ++chain)
       findBehind(link, device, chain, cores);
   return cores;
+}
+
+std::vector<CoreFoundTwice> coresFoundTwice(Link& link, const std::vector<FoundCore>& cores) {
+  std::vector<CoreFoundTwice> found;
+  for (auto core = cores.begin(); core != cores.end(); ++core) {
+    const auto first = std::find_if(cores.begin(), core, [&](const FoundCore& other) {
+      return isAlike(*core, other) && isOneCore(link, other, *core);
+    });
+    if (first != core) found.push_back({first->ref, core->ref});
+  }
+  return found;
+}
+
+std::string foundTwiceText(const CoreFoundTwice& core) {
+  return refText(core.ref) + " and " + refText(core.again) + " are the same core";
 }
 
 QOR_CORE_REF firstVioCore(Link& link) {

@@ -55,6 +55,18 @@ struct FoundCore {
 /// Every core of every hub on the chain, in address order. User registers without a hub are no failure; any other one is.
 QORBOARD_API std::vector<FoundCore> findCores(Link& link);
 
+/// A VIO core that answers at a second address too.
+struct CoreFoundTwice {
+  QOR_CORE_REF ref, again;
+};
+
+/// Those among the cores that findCores() found. Where the same core may be at two addresses a mark is left in it, which
+/// changes no output.
+QORBOARD_API std::vector<CoreFoundTwice> coresFoundTwice(Link& link, const std::vector<FoundCore>& cores);
+
+/// "0.1.0 and 0.2.0 are the same core"
+QORBOARD_API std::string foundTwiceText(const CoreFoundTwice& core);
+
 /// The first VIO core. Throws Failure when there is none.
 QORBOARD_API QOR_CORE_REF firstVioCore(Link& link);
 

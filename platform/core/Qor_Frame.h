@@ -36,7 +36,8 @@ struct Qor_Request {
   std::size_t answerBits = 0;
   const Qor_Bytes* payload = nullptr;  // of a write; bits beyond payloadBits are 0
   std::size_t payloadBits = 0;
-  unsigned repeat = 0;  // what a repeat's code has beside it; 0: it is asked for again as it is
+  unsigned repeat = 0;        // what a repeat's code has beside it; 0: it is asked for again as it is
+  bool mayBeRefused = false;  // a refusal is an answer too
 };
 
 enum class Qor_Verdict {

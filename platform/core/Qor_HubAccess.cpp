@@ -87,11 +87,24 @@ void Qor_HubAccess::write(const Qor_Bytes& payload, std::size_t bitCount, bool p
 
 // A write that marks no output. Only a hub that has obeyed one of our tags knows whether a repeat was obeyed before.
 void Qor_HubAccess::introduce(std::size_t payloadBits) {
+  link_.knowsWriteTags = mark(link_.writeTags.current(), payloadBits);
+}
+
+bool Qor_HubAccess::mark(unsigned tag, std::size_t payloadBits) {
   const Qor_Bytes nothing(byteCount(payloadBits));
   const Qor_Answer answer =
-      ask({Qor_HubCode::write, coreRef_.core_index, link_.writeTags.current(), 0, &nothing, payloadBits},
-          link_.writeRoom);
-  link_.knowsWriteTags = !answer.isNoSuchCore();
+      ask({Qor_HubCode::write, coreRef_.core_index, tag, 0, &nothing, payloadBits}, link_.writeRoom);
+  return !answer.isNoSuchCore();
+}
+
+// A repeat is refused by a core whose last write was another host's.
+bool Qor_HubAccess::isMarked(unsigned tag, std::size_t payloadBits) {
+  const Qor_Bytes nothing(byteCount(payloadBits));
+  Qor_Request request{
+      Qor_HubCode::write | Qor_HubCode::repeat, coreRef_.core_index, tag, 0, &nothing, payloadBits};
+  request.mayBeRefused = true;
+  const Qor_Answer answer = ask(request, link_.writeRoom);
+  return !answer.isRefused() && !answer.isNoSuchCore();
 }
 
 Qor_ReadResult Qor_HubAccess::read(std::size_t recordBits, bool keepActivity) {
@@ -117,7 +130,7 @@ Qor_Answer Qor_HubAccess::ask(Qor_Request request, Qor_WaitingRoom& room) {
     Qor_Answer answer = exchange(request, room.bits(), isRepeat, seen);
     const bool isWhole = answer.verdict == Qor_Verdict::good;
     if (isWhole && answer.isOfTwoCores()) fail("two cores have this index, so the hub obeys neither");
-    if (isWhole && !answer.isRefused()) {
+    if (isWhole && (request.mayBeRefused || !answer.isRefused())) {
       room.needed(answer.waited);
       return answer;
     }

@@ -44,6 +44,12 @@ class Qor_HubAccess {
   /// the inputs, but may not have brought it home.
   Qor_ReadResult read(std::size_t recordBits, bool keepActivity);
 
+  /// Makes this the tag of the core's last write, by one that marks no output. False when there is no such core.
+  bool mark(unsigned tag, std::size_t payloadBits);
+
+  /// Whether it is. No output changes.
+  bool isMarked(unsigned tag, std::size_t payloadBits);
+
  private:
   void introduce(std::size_t payloadBits);
   Qor_Answer ask(Qor_Request request, Qor_WaitingRoom& room);

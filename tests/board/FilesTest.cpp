@@ -53,6 +53,7 @@ TEST(SignalFile, SaysWhatIsWrongAndWhere) {
       {"name = \"a\"\nbits = 1\ncolour = 1", "5: signal[0].colour: is no key of this file"},
       {"name = \"a\"\nbits = 1\ncore = \"1.1\"",
        "5: signal[0].core: not a core address DEVICE.CHAIN.INDEX: 1.1"},
+      {"name = \"a\"\nbits = 1\ncore = 1", "5: signal[0].core: must be a text"},
       {"name = \"a\"\nbits = 1\ncore = \"1.1.0\"" + another + "name = \"b\"",
        "6: signal[1]: has no core, nor has the file, but the signals above have one"},
       {"name = \"a\"\nbits = 1" + another + "name = \"b\"\ncore = \"1.1.0\"",

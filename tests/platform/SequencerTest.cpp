@@ -4,6 +4,7 @@
 #include <vector>
 
 #include "QorCore.h"
+#include "platform/core/QorCore_Host.h"
 #include "platform/core/Qor_HubAccess.h"
 #include "tests/platform/ScriptedCable.h"
 
@@ -190,6 +191,23 @@ TEST_F(Sequencer, SaysWhatItSawAtEachAttempt) {
   EXPECT_EQ(write(), "runtime: " + where + "no such core, or it cannot be written");
   script.failure = "the link is dead";
   EXPECT_EQ(read(), "runtime: " + where + "the link is dead");
+}
+
+TEST_F(Sequencer, FindsACoreAgainAtAnotherAddressByAMark) {
+  const std::string mark = "2.0 000000 /162", look = "A.0 000000 /162";
+  const auto isOne = [&] { return QorRT::isOneCore(session.handle, {0, 1, 0}, {0, 2, 0}, 21); };
+  answer({good, good});
+  EXPECT_EQ(write(), "nothing");
+  answer({good, atHeader(0xA0), good, atHeader(0xA0)});
+  EXPECT_TRUE(isOne());
+  EXPECT_EQ(script.frames, Lines({mark, look, mark, look}));
+  const std::size_t last = script.tags.size() - 1;
+  EXPECT_TRUE(script.tags[last] == script.tags[last - 1] && script.tags[last - 2] == script.tags[last - 3]);
+  answer({good, atHeader(0xA4)});
+  EXPECT_FALSE(isOne());
+  answer({good, good});
+  EXPECT_EQ(write(), "nothing");
+  EXPECT_EQ(script.frames.size(), 2U) << "the hub does not know the session's tags any more";
 }
 
 TEST_F(Sequencer, GivesUpOnADesignClockThatStandsStillAfterTwoSeconds) {

@@ -148,6 +148,8 @@ TEST(BoardFacts, AreLaidOverWhatWasFoundAndMayNotContradictIt) {
       {"[[device]]\nuser_opcodes = []\n",
        "logic: b.toml:2: device[0].user_opcodes: must be the opcodes of 1 to 4 user registers, is 0"},
       {"[[device]]\nspeed = 3\n", "logic: b.toml:2: device[0].speed: is no key of a board file"},
+      {"[[device]]\nuser_opcode = [3]\n",
+       "logic: b.toml:2: device[0].user_opcode: is no key of a board file (did you mean user_opcodes?)"},
   };
   for (const auto& [board, result] : rows)
     EXPECT_EQ(resultOf([&, &b = board] { return laidOver(b); }), result);

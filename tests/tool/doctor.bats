@@ -28,6 +28,18 @@ ok       write and read back  the design does not loop its outputs back\n*' --co
     --cable noisy: --quiet doctor
 }
 
+@test "a core that answers at two addresses is found, two cores alike are not" {
+  printf '[[device]]\nuser_opcodes = [4, %s]\n' 4 >twice.toml
+  core='[[device.core]]\nuser_chain = %s\nindex = 0\ntype = "vio"\nasync_out = 8\nasync_in = 8\nsync_out = 1\ndesign = "loopback"\n'
+  printf "$core" 1 >>twice.toml
+  gives 1 'FAILED   cores                0.1.0 and 0.2.0 are the same core*user_opcodes*' --cable sim:twice.toml --quiet doctor
+  gives 0 '*qorvio: 0.1.0 and 0.2.0 are the same core, see qorvio doctor*' --cable sim:twice.toml scan
+  { sed 's/4, 4/4, 5/' twice.toml; printf "$core" 2; cat twice.toml; } >alike.toml  # and the same hub in another device
+  gives 1 '*1.1.0 and 1.2.0 are the same core*' --cable sim:alike.toml --quiet doctor
+  printf 'write async_out_data=5\nscan\nwrite async_out_data=7\nexpect async_in_data==7\n' >script
+  gives 0 '*are the same core*' --cable sim:twice.toml run script
+}
+
 @test "play checks a whole table first, then drives it in bursts where it can" {
   { echo 'sync_out_data,sync_out_data[0]'; for i in {1..20}; do echo "$i,1"; done; } >steps.csv
   gives 0 "20 rows in 2 exchanges" play steps.csv
@@ -85,7 +97,7 @@ CASES
 @test "doctor drives no output whose value it cannot give back, unless it is forced to" {
   export QORVIO=$QORVIO_LOSSY QORVIO_CABLE=lossy:999 QORVIO_CORE=0.1.0
   "$QORVIO" toggle 'async_out_data[0]' --assume 0
-  gives 1 'FAILED   write and read back  what the outputs were last given is not known; --force drives them and leaves zeros*' \
+  gives 1 'FAILED   write and read back  what the outputs were last given is not known; --force drives them and leaves zeros*by qorvio write*' \
     --quiet doctor --write
   "$QORVIO" --quiet doctor --write --force
 }

@@ -6,7 +6,7 @@
 #include <set>
 
 #include "board/model/Errors.h"
-#include "board/model/Spelling.h"
+#include "platform/jtag/cable/Qor_Spelling.h"
 #include "tools/qorvio/terminal/Printable.h"
 
 namespace qor::tool {
@@ -111,7 +111,7 @@ class Drawing {
       if (each.name == name || each.name == dumpName(name)) return each;
       known.push_back(each.name);
     }
-    throw WrongUse("no signal of that name" + didYouMean(name, known) + ": " + name);
+    throw WrongUse("no signal of that name" + QorRT::didYouMean(name, known) + ": " + name);
   }
 
   std::vector<const VcdVariable*> chosenLanes() const {

@@ -4,8 +4,8 @@
 #include <iterator>
 
 #include "board/model/Errors.h"
-#include "board/model/Spelling.h"
 #include "os/StandardStreams.h"
+#include "platform/jtag/cable/Qor_Spelling.h"
 #include "tools/qorvio/CommandLine.h"
 #include "tools/qorvio/Completion.h"
 #include "tools/qorvio/Manual.h"
@@ -39,7 +39,7 @@ std::string unexpected(const CLI::App& app, const std::string& word) {
   if (!isOption && !app.get_subcommands().empty()) return "an argument too many: " + word;
   const std::vector<std::string> names = namesKnown(app, isOption);
   return std::string("no such ") + (isOption ? "option" : "command") +
-         qor::didYouMean(word, {names.begin(), names.end()}) + ": " + word;
+         QorRT::didYouMean(word, {names.begin(), names.end()}) + ": " + word;
 }
 
 int runCommand(CLI::App& app, const qor::tool::Context& context, int argc, char** argv) {

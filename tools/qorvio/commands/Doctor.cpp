@@ -46,6 +46,11 @@ constexpr Cure cures[] = {
      "is noisy: a slower TCK, shorter wires"},
     {"design clock stopped", "the clock of the core, clk, does not run, or is very slow"},
     {"two cores have this index", "give each core of the hub an INDEX of its own"},
+    {"are the same core",
+     "compare user_opcodes and ir_length in the board file with the data sheet of the device: its hub "
+     "answers at both "
+     "addresses"},
+    {"were last given is not known", "give them values by qorvio write first, or --force"},
 };
 
 const char* nextFor(const std::string& seen, const Check& check) {
@@ -101,7 +106,10 @@ std::string lateBy(const char* line, unsigned tcks) {
 }
 
 std::string cores(Link& link) {
-  std::string found = counted(findCores(link).size(), "core");
+  const std::vector<FoundCore> all = findCores(link);
+  if (const auto twice = coresFoundTwice(link, all); !twice.empty())
+    throw Failure(foundTwiceText(twice.front()));
+  std::string found = counted(all.size(), "core");
   std::vector<QorJtag_Hub> hubs;
   QorJtag_session_getHubs(link.session(), hubs);
   for (const QorJtag_Hub& hub : hubs) {

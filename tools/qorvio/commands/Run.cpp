@@ -6,7 +6,7 @@
 
 #include "board/model/Duration.h"
 #include "board/model/Errors.h"
-#include "board/model/Spelling.h"
+#include "platform/jtag/cable/Qor_Spelling.h"
 #include "tools/qorvio/CommandLine.h"
 #include "tools/qorvio/commands/Commands.h"
 #include "tools/qorvio/terminal/Printable.h"
@@ -110,7 +110,8 @@ void obey(Context& context, const Step& step) {
     for (const CLI::App* each : app.get_subcommands([](const CLI::App*) { return true; }))
       names.push_back(each->get_name());
     throw WrongUse("no such command in a script" +
-                   didYouMean(step.words.front(), {names.begin(), names.end()}) + ": " + step.words.front());
+                   QorRT::didYouMean(step.words.front(), {names.begin(), names.end()}) + ": " +
+                   step.words.front());
   }
 }
 

@@ -1,3 +1,5 @@
+#include <cstdio>
+
 #include <nlohmann/json.hpp>
 
 #include "board/model/CoreAddress.h"
@@ -71,6 +73,8 @@ void addScan(CLI::App& app, Context& context) {
     const std::vector<QorRT::Qor_Device> devices = context.link().devices();
     const std::vector<FoundCore> cores = findCores(context.link());
     print({tablesOf(devices, cores), jsonOf(devices, cores)}, context.settings.json);
+    for (const CoreFoundTwice& each : coresFoundTwice(context.link(), cores))
+      std::fprintf(stderr, "qorvio: %s, see qorvio doctor\n", foundTwiceText(each).c_str());
   });
 }
 

@@ -4,7 +4,9 @@
 #include <algorithm>
 #include <array>
 #include <string_view>
+#include <vector>
 
+#include "platform/jtag/cable/Qor_Spelling.h"
 #include "platform/jtag/cable/boardfile/TomlEntry.h"
 
 namespace QorRT {
@@ -24,7 +26,11 @@ void applyTomlKeys(const TomlEntry& table, const std::array<TomlKey<Thing>, coun
     const std::string_view spelled = name.str();
     const auto key = std::find_if(keys.begin(), keys.end(),
                                   [&](const TomlKey<Thing>& each) { return each.name == spelled; });
-    if (key == keys.end()) table.failAt(spelled, "is no key of a board file");
+    if (key == keys.end()) {
+      std::vector<std::string_view> known;
+      for (const TomlKey<Thing>& each : keys) known.push_back(each.name);
+      table.failAt(spelled, "is no key of a board file" + didYouMean(spelled, known));
+    }
     if (key->apply != nullptr) key->apply(table.at(spelled), thing);
   }
 }

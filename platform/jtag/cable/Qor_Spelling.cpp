@@ -1,9 +1,9 @@
-#include "board/model/Spelling.h"
+#include "platform/jtag/cable/Qor_Spelling.h"
 
 #include <algorithm>
 #include <utility>
 
-namespace qor {
+namespace QorRT {
 namespace {
 
 char folded(char letter) {
@@ -38,4 +38,4 @@ std::string didYouMean(std::string_view name, const std::vector<std::string_view
   return best.empty() ? "" : " (did you mean " + std::string(best) + "?)";
 }
 
-}  // namespace qor
+}  // namespace QorRT

@@ -5,11 +5,11 @@
 #include <string_view>
 #include <vector>
 
-#include "board/Export.h"
+#include "QorExport.h"
 
-namespace qor {
+namespace QorRT {
 
 /// " (did you mean X?)" with the nearest of the names, without regard to the case of A to Z; empty when none is near.
-QORBOARD_API std::string didYouMean(std::string_view name, const std::vector<std::string_view>& known);
+QOR_API std::string didYouMean(std::string_view name, const std::vector<std::string_view>& known);
 
-}  // namespace qor
+}  // namespace QorRT
