@@ -19,7 +19,9 @@ remembers() {  # remembers ASYNC KNOWN SYNC KNOWN: what the file contains, which
   "$QORVIO" toggle 'async_out_data[3]'
   remembers F7 FF 00 00
   kill -INT $pid
-  wait $pid
+  status=0
+  wait $pid || status=$?
+  [ "$status" -eq 130 ]
   [ "$(tr -d ' \n' <told)" = '[{"name":"async_out_data[0]","width":1,"steps":["0"]}]' ]
   remembers F6 FF 00 00
 }

@@ -4,7 +4,8 @@ load processes
 
 @test "wait ends when its conditions are true, or says what it saw last" {
   "$QORVIO" --core 1.1.0 wait 'async_in_data > 0x100' 'sync_in_data moves' --timeout 5s
-  gives 1 'qorvio: not within 20 ms: async_in_data == 5; *async_in_data*' wait 'async_in_data == 5' --timeout 20ms
+  gives 1 'qorvio: not within 20 ms: (async_in_data == 5) && (async_in_data == 0); async_in_data is 0x00' \
+    wait 'async_in_data == 5' 'async_in_data == 0' --timeout 20ms
   gives 2 '*' wait 'async_in_dat == 5'
   "$QORVIO" wait 'async_in_data == 5' --timeout 1h 3>&- &
   pid=$!
@@ -20,6 +21,8 @@ load processes
   [ "${#lines[@]}" -eq 2 ]
   [[ ${lines[1]} =~ ^[0-9]+\.[0-9]{6}\ \ async_in_data\ \ 0x[0-9A-F]{4}\ \ ↕$ ]]
   [ -z "$("$QORVIO" events --for 20ms)" ]
+  printf '[[device]]\n[[device.core]]\nuser_chain = 1\nindex = 0\ntype = "vio"\nasync_out = 1\n' >mute.toml
+  fails 2 "no inputs that could change" --cable sim:mute.toml events
   [[ $("$QORVIO" --json --core 1.1.0 events async_in_data --count 1) == '{"time_s":'*'"name":"async_in_data","width":16,'* ]]
 }
 

@@ -110,6 +110,13 @@ hides() { ! on_screen capture-pane -p | grep -qE "$1"; }  # hides REGEX: in no l
   kill -INT $pid
   wait $pid
   [[ $(tail -1 told) == '{"frame":'*']}' ]]
+  "$QORVIO" --json watch --frames 1000000 >told 3>&- &
+  pid=$!
+  catches_interrupt
+  kill -INT $pid
+  status=0
+  wait $pid || status=$?
+  [ "$status" -eq 130 ]
   mkfifo full
   exec {unread}<>full
   head -c 65536 /dev/zero >&$unread  # all that a pipe takes

@@ -4,7 +4,6 @@
 
 #include "board/model/Duration.h"
 #include "board/model/Errors.h"
-#include "os/Stop.h"
 #include "tools/qorvio/Assignments.h"
 #include "tools/qorvio/Number.h"
 #include "tools/qorvio/commands/Commands.h"
@@ -33,7 +32,7 @@ void press(Context& context, const PressOptions& options) {
   const std::chrono::nanoseconds time = parseDuration(options.time);
   const Signal signal = context.signals().find(options.name, Direction::output);
   requireBit(signal);
-  const os::Stop stop;  // whoever interrupts it finds the output released
+  const Context::Stoppable stop(context);  // whoever interrupts it finds the output released
   context.board().give({level(signal, {1})});
   context.board().rememberOutputs();
   stop.sleepUntil(std::chrono::steady_clock::now() + time);
@@ -93,7 +92,8 @@ void addPress(CLI::App& app, Context& context) {
   command->add_option("OUTPUT", options->name, "the output bit")->required();
   command->add_option("--for", options->time, "how long, such as 100ms or 2s")->capture_default_str();
   command->footer(
-      "Ctrl-C releases it before its time.\n\nExample:\n  qorvio press async_out_data[0] --for 1s");
+      "Ctrl-C releases it before its time, and ends with 130.\n\nExample:\n  qorvio press async_out_data[0] "
+      "--for 1s");
   command->callback([&context, options] { press(context, *options); });
 }
 

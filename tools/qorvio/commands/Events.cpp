@@ -64,8 +64,10 @@ void events(Context& context, const EventOptions& options) {
   Pace pace;
   if (options.rate != 0) pace.period = periodOf(options.rate, 0.001, 1e9);
   if (!options.time.empty()) pace.time = parseDuration(options.time);
+  std::vector<Signal> wanted = context.signals().select(options.names, Direction::input);
+  if (wanted.empty()) throw WrongUse("no inputs that could change");
   Poller& poller = context.board().poller();
-  Subscription inputs(poller, context.signals().select(options.names, Direction::input));
+  Subscription inputs(poller, std::move(wanted));
   poller.poll();
   inputs.look();  // what moved before is no event
   context.board().markSeen({});

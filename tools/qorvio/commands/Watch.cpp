@@ -174,6 +174,7 @@ void runWatch(Context& context, const WatchOptions& options) {
   Frames frames(period, options.frames);
   show(context, watch, frames);
   context.board().markSeen(watch.inputs());
+  if (watch.frames() < options.frames) context.endBySignal(frames.stop().signal());
 }
 
 }  // namespace
@@ -194,7 +195,8 @@ void addWatch(CLI::App& app, Context& context) {
       "again;\n"
       "the chosen output and h are remembered per board. Without a terminal the table is printed frame after "
       "frame, with --json a line of JSON a "
-      "frame.\n\n"
+      "frame.\n"
+      "Ctrl-C quits as q does, with 0; before the last one of --frames with 130.\n\n"
       "Example:\n  qorvio watch --rate 20\n  qorvio --json watch --frames 3 async_in_data");
   command->callback([&context, options] { runWatch(context, *options); });
 }
