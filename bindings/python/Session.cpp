@@ -115,6 +115,11 @@ const std::vector<Sample>& Session::peek(Board& board) {
   return reads_->pending();
 }
 
+const Sample& Session::peek(Board& board, std::size_t core) {
+  board.poller().poll(core);
+  return reads_->pending()[core];
+}
+
 const std::vector<Sample>& Session::look(Board& board) {
   board.poller().pollAll();
   return reads_->look();

@@ -39,10 +39,11 @@ class Session {
   Names& names() { return *names_; }
   const std::shared_ptr<Names>& sharedNames() const { return names_; }
 
-  /// What the inputs are now, for work(board) in run(): without a look at it, so that it takes no activity, or with one.
-  /// Valid until the next poll.
+  /// What the inputs are now, for work(board) in run(): without a look at it, so that it takes no activity, of all cores or
+  /// of one; or with a look. Valid until the next poll.
   /// @{
   const std::vector<Sample>& peek(Board& board);
+  const Sample& peek(Board& board, std::size_t core);
   const std::vector<Sample>& look(Board& board);
   /// @}
 

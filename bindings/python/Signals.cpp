@@ -10,7 +10,7 @@ Bytes bitsOf(const BoardSignal& self) {
   const Signal& signal = self.forReading().signal;
   return self.session->run([&](Board& board) {
     Bytes bits;
-    extract(signal, self.session->peek(board)[signal.core].values(signal.port), bits);
+    extract(signal, self.session->peek(board, signal.core).values(signal.port), bits);
     return bits;
   });
 }
@@ -19,7 +19,7 @@ py::object read(const BoardSignal& self) {
   if (!self.input->isNarrow()) return self.input->valueOf(bitsOf(self));
   const Signal& signal = self.input->signal;
   return self.input->valueOf(self.session->run([&](Board& board) {
-    return lowBits(signal, self.session->peek(board)[signal.core].values(signal.port));
+    return lowBits(signal, self.session->peek(board, signal.core).values(signal.port));
   }));
 }
 
@@ -60,6 +60,10 @@ void play(const BoardSignal& self, const py::iterable& values) {
 py::bytes bytesOf(const BoardSignal& self) {
   const Bytes bits = bitsOf(self);
   return {reinterpret_cast<const char*>(bits.data()), bits.size()};
+}
+
+py::object arrayOf(const BoardSignal& self) {
+  return py::module_::import("numpy").attr("frombuffer")(bytesOf(self), "uint8");
 }
 
 template <Relation relation>
@@ -121,7 +125,7 @@ void bindSignals(py::module_& module) {
 `value` reads an input and writes an output. Compared with a value, or by `rises`, `falls` and `moves`, an input makes a
 condition for `Board.wait_for`.)");
   signal
-      .def_property("value", valueOf, setValue, R"(The value, in one exchange with each core.
+      .def_property("value", valueOf, setValue, R"(The value, in one exchange with its core.
 
 An int; a member of the signal's enumeration; with a scale a float, in the signal's unit. Reading takes no activity: what
 moved is still reported by the next `Board.read()`. Of an output alone it is what it was given last.
@@ -152,6 +156,9 @@ Both within 16 clocks. Raises UsageError and LinkError.)")
           "UsageError.")
       .def("to_bytes", bytesOf,
            "The bits of an input, read now: lowest byte first, as many as its width needs.")
+      .def_property_readonly(
+          "array", arrayOf,
+          "The same as an array of numpy, uint8, which is not to be written. `value` takes one.")
       .def_property_readonly("rises", edge<Edge::rises>,
                              "True when any bit went from 0 to 1 since the last poll.")
       .def_property_readonly("falls", edge<Edge::falls>,

@@ -54,6 +54,11 @@ void Poller::pollAll() {
   ++polls_;
 }
 
+void Poller::poll(std::size_t core) {
+  read(core);
+  ++polls_;
+}
+
 void Poller::read(std::size_t core) {
   PolledCore& each = cores_[core];
   each.core->read(each.sample);

@@ -30,6 +30,9 @@ class QORBOARD_API Poller {
   /// The same of every core.
   void pollAll();
 
+  /// The same of one core, as Signal::core counts them.
+  void poll(std::size_t core);
+
   std::vector<QOR_CORE_REF> cores() const;
 
   /// How many polls there were that did not fail.

@@ -57,6 +57,8 @@ def test_wide_values_are_whole_numbers(tmp_path):
         for number in (0, 1, 2**69 + 5, 2**70 - 1):
             wide.wide.value = number
             assert wide.wide.value == number == int.from_bytes(wide.wide.to_bytes(), "little")
+            wide.outputs.below.value = wide.wide.array
+            assert (wide.below.array == wide.wide.array).all()
         for number in (-(2**69), -1, 2**69 - 1):
             wide.below.value = number
             assert wide.below.value == number == wide.read().below
@@ -65,6 +67,12 @@ def test_wide_values_are_whole_numbers(tmp_path):
         for bad in (2**70, -(2**69) - 1):
             with pytest.raises(qorvio.UsageError, match="below has 70 bits, too few"):
                 wide.below.value = bad
+
+
+def test_a_value_needs_an_exchange_with_its_own_core_only(lab):
+    one = -lab.count.value + lab.count.value  # the counter counts on in each exchange
+    each = -lab.read().count + lab.read().count
+    assert 0 < one < each
 
 
 def test_cores_have_their_own_signals(lab):

@@ -37,3 +37,7 @@ def test_a_board_that_the_doctor_refuses_is_not_used(pytester, monkeypatch):
     done = pytester.runpytest_subprocess("--qorvio-cable", "rbb:127.0.0.1:1")
     done.assert_outcomes(errors=3)
     done.stdout.fnmatch_lines(["*qorvio doctor has found something wrong:*"])
+    monkeypatch.setenv("PATH", "/nowhere")
+    done = pytester.runpytest_subprocess("--qorvio-cable", "sim:", "--qorvio-signals", LAB, "-k", "gives")
+    done.assert_outcomes(passed=1, deselected=2, warnings=1)
+    done.stdout.fnmatch_lines(["*the board is used without qorvio doctor*"])

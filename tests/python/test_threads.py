@@ -71,9 +71,14 @@ def test_two_boards_are_at_work_side_by_side(lab):
 )
 def test_ctrl_c_is_heard_while_the_engine_works(work):
     program = f"""
-import os, signal, threading
-threading.Timer(0.1, os.kill, (os.getpid(), signal.SIGINT)).start()
+import signal, time
+def interrupt():
+    main = threading.main_thread().ident
+    while not sys._current_frames()[main].f_code.co_filename.endswith("board.py"):
+        time.sleep(0.01)
+    os.kill(os.getpid(), signal.SIGINT)
 try:
+    threading.Thread(target=interrupt).start()
     {work}
 except KeyboardInterrupt:
     print("heard", board.read().leds)

@@ -1,5 +1,7 @@
 from typing import Any, Dict, Generic, Iterator, List, Optional, Sequence, Tuple, Type, TypeVar, Union
 
+import numpy
+
 from qorvio.tables import Row
 from qorvio.values import Enumeration
 
@@ -45,6 +47,8 @@ class Signal(Generic[T]):
     def pulse(self, width: int = 1, at: int = 0) -> None: ...
     def toggle(self) -> bool: ...
     def to_bytes(self) -> bytes: ...
+    @property
+    def array(self) -> "numpy.ndarray[Any, Any]": ...
     def __eq__(self, value: object) -> Condition: ...  # type: ignore[override]
     def __ne__(self, value: object) -> Condition: ...  # type: ignore[override]
     def __lt__(self, value: Any) -> Condition: ...

@@ -3,12 +3,14 @@
 import atexit
 import os
 import weakref
-from typing import Any, Dict, Iterator, List, Mapping, NamedTuple, Optional, Tuple, Union
+from typing import Any, Callable, Dict, Iterator, List, Mapping, NamedTuple, Optional, Tuple, TypeVar, Union
 
 from qorvio import _qorvio
 from qorvio._qorvio import Condition, Frame, Signal
 from qorvio.errors import Error, UsageError
 from qorvio.sampling import Sampling
+
+T = TypeVar("T")
 
 _open_sessions: "weakref.WeakSet[_qorvio._Session]" = weakref.WeakSet()
 
@@ -167,17 +169,8 @@ class Board(Names):
         From the call on, and from the last poll before it, for `timeout` seconds in all or for ever. `rate` is how often
         to poll, a second; as often as the link can without one. Raises LinkError.
         """
-        watch = _qorvio._Watch(self._session, names, timeout, _period(rate))
-
-        def found() -> Iterator[Edge]:
-            while True:
-                poll = watch.edges()
-                if poll is None:
-                    return
-                for name, rose, fell in poll[1]:
-                    yield Edge(poll[0], name, rose, fell)
-
-        return found()
+        polls = _until_none(self._watch(names, timeout, rate).edges)
+        return (Edge(time, *moved) for time, moves in polls for moved in moves)
 
     def watch(self, *names: str, timeout: Optional[float] = None, rate: Optional[float] = None) -> Iterator[Frame]:
         """A frame now, then one of each poll in which an input of those names moved; without names any input.
@@ -185,16 +178,10 @@ class Board(Names):
         For `timeout` seconds in all or for ever. `rate` is how often to poll, a second; as often as the link can without
         one. The frames have what moved since the frame before. Raises LinkError.
         """
-        watch = _qorvio._Watch(self._session, names, timeout, _period(rate))
+        return _until_none(self._watch(names, timeout, rate).frame)
 
-        def found() -> Iterator[Frame]:
-            while True:
-                frame = watch.frame()
-                if frame is None:
-                    return
-                yield frame
-
-        return found()
+    def _watch(self, names: Tuple[str, ...], timeout: Optional[float], rate: Optional[float]) -> _qorvio._Watch:
+        return _qorvio._Watch(self._session, names, timeout, _period(rate))
 
     def sample(
         self, *names: str, count: Optional[int] = None, time: Optional[float] = None, rate: Optional[float] = None
@@ -218,6 +205,11 @@ class Board(Names):
 
     def _repr_html_(self) -> Optional[str]:
         return None if self.closed else self._session.frame(False)._repr_html_()
+
+
+def _until_none(call: Callable[[], Optional[T]]) -> Iterator[T]:
+    while (found := call()) is not None:
+        yield found
 
 
 def _period(rate: Optional[float]) -> float:

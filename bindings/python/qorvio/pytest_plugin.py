@@ -6,6 +6,7 @@ import shutil
 import subprocess
 import threading
 import time
+import warnings
 from typing import Any, Dict, Iterator, List, Optional
 
 import pytest
@@ -111,6 +112,7 @@ class _Recorder:
 def _run_doctor(cable: Optional[str], signals: Optional[str]) -> None:
     command = _command_line()
     if command is None:
+        warnings.warn(pytest.PytestWarning("no qorvio command is found: the board is used without qorvio doctor"))
         return
     options: Dict[str, Optional[str]] = {"--cable": cable, "--signals": signals}
     words = [word for option, value in options.items() if value for word in (option, value)]
