@@ -16,7 +16,6 @@ void ShiftRegister::shift(Bits& stream) {
   if (bits_.empty()) std::fill(stream.begin(), stream.end(), static_cast<unsigned char>(0));
   std::swap_ranges(last, stream.end(), bits_.begin());
   std::rotate(stream.begin(), last, stream.end());
-  if (kept < bits_.size()) next_ = kept;
 }
 
 Bits ShiftRegister::take() const {

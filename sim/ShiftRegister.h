@@ -19,7 +19,8 @@ class ShiftRegister {
   /// One TCK.
   void shift(bool in);
 
-  /// As many TCKs as the stream has bits, the first since capture: replaces what goes in by what comes out.
+  /// As many TCKs as the stream has bits, the first since capture: replaces what goes in by what comes out. An update may
+  /// follow only a stream that is no shorter than the register.
   void shift(Bits& stream);
 
   /// The bits that an update takes.

@@ -50,6 +50,21 @@ TEST(SimHub, DeliversTheWorkedExampleHoweverLateItsLinesAre) {
   }
 }
 
+// Flag 3 of the head: until a record has been delivered whole, the next one may have activity that was seen before.
+TEST(SimHub, SaysThatActivityMayHaveBeenDeliveredBefore) {
+  const auto cable = chain().device(1).core(1, 0, vio().asyncIn(1)).cable();
+  cable->scanIr(0, 1);
+  const auto headOfRead = [&](unsigned tag, std::size_t bits) {
+    const Bits header = bitsOf(3, 4) + bitsOf(0, 4) + bitsOf(tag, 16);
+    const Bits out = ("10" + header + crc32Of(header)).append(200, '1').substr(0, bits);
+    const std::size_t number = cable->scanDr(0, bytesOf(out), bits, true);
+    return hexOf(bitsOfBytes(cable->captured(number), bits).substr(59, 8));
+  };
+  EXPECT_EQ(headOfRead(1, 90), "A0");  // ends before its last bit
+  EXPECT_EQ(headOfRead(2, 200), "A8");
+  EXPECT_EQ(headOfRead(3, 200), "A0");
+}
+
 TEST(SimCore, RefusesAPositionBeyondThePort) {
   const auto design = qorsim::callback([](qorsim::Ports& ports) { ports.asyncIn[8] = 1; });
   const auto cable = chain().device().core(1, 0, vio().asyncIn(8).design(design)).cable();
