@@ -17,8 +17,8 @@ module qor_hub #(
     input  wire [7*CORES-1:0] from_cores  // 7 bits per core, in any order
 );
 
-  // SEARCH: for the start of the frame. HEADER and PAYLOAD: with the CRC behind each. WAIT: until the core has done
-  // what it was told. DATA: with the CRC behind it. SENT: the last bit is on tdo. SILENT: zeros until Capture-DR.
+  // SEARCH: for the start of the frame. HEADER and PAYLOAD: with the CRC after each. WAIT: until the core has done
+  // what it was asked. DATA: with the CRC after it. SENT: the last bit is on tdo. SILENT: zeros until Capture-DR.
   localparam [2:0] SEARCH = 0, HEADER = 1, PAYLOAD = 2, SILENT = 3, HEAD = 4, WAIT = 5, DATA = 6, SENT = 7;
 
   reg [2:0] state = SILENT;

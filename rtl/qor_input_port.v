@@ -1,4 +1,4 @@
-// One input port of a VIO core: samples its pins, collects activity on them, and tells both to a take.
+// One input port of a VIO core: samples its pins, collects activity on them, and gives both to a take.
 //
 // A take at clock edge n delivers the values that the pins had after edge n - 3, and all activity up to then. This
 // holds for both kinds of port, so that a snapshot shows one moment.
@@ -74,8 +74,8 @@ module qor_input_port #(
       // Each flip-flop that a pin clocks takes the opposite of the state that clk has seen: the first edge after a
       // take steps it, and others change nothing. Crossing to clk: two flip-flops. Crossing to the pin's clock:
       // `seen` changes at a take only. An edge at that very moment may step the flip-flop or not; if not, it came
-      // before the take, whose flag tells it. So there is nothing to clear. An edge on its way to clk during a take
-      // that tells an earlier one changes nothing either; if it lasts, the sampled activity tells it next time.
+      // before the take, whose flag reports it. So there is nothing to clear. An edge on its way to clk during a take
+      // that reports an earlier one changes nothing either; if it lasts, the sampled activity reports it next time.
       wire [WIDTH-1:0] rose, fell;
       (* ASYNC_REG = "TRUE", keep *) reg [WIDTH-1:0] rose_first = 0, rose_now = 0, fell_first = 0, fell_now = 0;
       reg [WIDTH-1:0] rose_seen = 0, fell_seen = 0;

@@ -23,7 +23,7 @@ module qor_snapshot (
   localparam SETTLING = 5;
 
   // Crossing to clk and back: a step of `asked` asks, the same step of the last flip-flop says that the snapshot was
-  // taken. The record stands still from then to the next request, so TCK may read it when nothing is pending.
+  // taken. The record does not change from then to the next request, so TCK may read it when nothing is pending.
   reg                                         asked = 1'b0, undelivered = 1'b0;
   (* ASYNC_REG = "TRUE", keep *) reg [1:0]       taken_at_tck = 2'b0;
   (* ASYNC_REG = "TRUE", keep *) reg [DELAY-1:0] asked_at_clk = 0;

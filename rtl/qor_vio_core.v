@@ -1,4 +1,4 @@
-// A VIO core: virtual inputs and outputs of a design, behind a hub.
+// A VIO core: virtual inputs and outputs of a design, on a hub.
 //
 // Codes 02 and 0A (write), 03, 05, 0B and 0D (read), beside those that every core knows. All registers are 0 at
 // power-up; there is no reset, and a reset of the TAP leaves the outputs as they are.

@@ -44,7 +44,7 @@ const Sample& sampleOf(const BoardFrame& self, const Field& field) {
 }
 
 template <bool (Reading::*flag)() const>
-bool told(const BoardFrame& self, const py::object& name) {
+bool edge(const BoardFrame& self, const py::object& name) {
   return (self.frame[self.names->find(name, Direction::input).signal].*flag)();
 }
 
@@ -76,14 +76,14 @@ void bindFrames(py::module_& module) {
 `frame.state` or `frame["state"]`, a slice `frame["leds[3]"]` too, is the value, as `Signal.value` has it. What moved is
 counted since the frame before, or for one from `wait_for` since the last poll before the wait. Independent of its board.)")
       .def("__getitem__", valueIn)
-      .def("rose", told<&Reading::rose>, py::arg("name"),
+      .def("rose", edge<&Reading::rose>, py::arg("name"),
            "Whether any bit of the input went from 0 to 1, however short.")
-      .def("fell", told<&Reading::fell>, py::arg("name"),
+      .def("fell", edge<&Reading::fell>, py::arg("name"),
            "Whether any bit of the input went from 1 to 0, however short.")
-      .def("moved", told<&Reading::moved>, py::arg("name"), "Whether any bit of the input rose or fell.")
-      .def("sync_rose", told<&Reading::syncRose>, py::arg("name"),
+      .def("moved", edge<&Reading::moved>, py::arg("name"), "Whether any bit of the input rose or fell.")
+      .def("sync_rose", edge<&Reading::syncRose>, py::arg("name"),
            "Whether the design's clock saw any bit rise; False for an asynchronous input.")
-      .def("sync_fell", told<&Reading::syncFell>, py::arg("name"),
+      .def("sync_fell", edge<&Reading::syncFell>, py::arg("name"),
            "Whether the design's clock saw any bit fall; False for an asynchronous input.")
       .def(
           "text",

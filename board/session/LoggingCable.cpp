@@ -59,17 +59,17 @@ std::string LoggingCable::secondsSince(Clock::time_point begin) const {
 void LoggingCable::run(std::vector<Qor_Scan>& scans) {
   const std::string at = secondsSince(begin_);
   const Clock::time_point begin = Clock::now();
-  const auto told = [&](const std::string& how) {
+  const auto lineOf = [&](const std::string& how) {
     return at + " s, took " + secondsSince(begin) + " s" + how;
   };
   try {
     CountingCable::run(scans);
   } catch (const std::exception& error) {
-    log_(told(", FAILED: " + std::string(error.what())) + textOf(scans, false));
+    log_(lineOf(", FAILED: " + std::string(error.what())) + textOf(scans, false));
     logRemarks();
     throw;
   }
-  log_(told(textOf(scans, true)));
+  log_(lineOf(textOf(scans, true)));
   logRemarks();
 }
 

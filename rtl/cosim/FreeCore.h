@@ -55,7 +55,7 @@ class FreeCore : public qorsim::Pins {
   bool tdo() override { return model_.tdo != 0; }
   void setTrst(bool) override {}
 
-  /// Clocks per TCK, on average; 0 is a clock that stands still. The other does it after so many edges of TCK.
+  /// Clocks per TCK, on average; 0 is a stopped clock. The other does it after so many edges of TCK.
   /// @{
   void setRate(double rate) {
     rate_ = rate / 2;

@@ -9,8 +9,8 @@
 namespace qorrtl {
 
 /// Whatever a core in C++ does in its design clock n, that in Verilog does in clock n + 2, and its synchronisers take
-/// two TCKs to say so. So the clocks come where that makes no difference: behind a frame there are more of them than
-/// TCKs, so that both have done what they were told when the head of the answer has left; others come after the scan.
+/// two TCKs to say so. So the clocks come where that makes no difference: after a frame there are more of them than
+/// TCKs, so that both have done what they were asked when the head of the answer has left; others come after the scan.
 template <class Model>
 class LockStep {
  public:

@@ -1,4 +1,4 @@
-// Scans of the chain behind some wires, with rests in Pause as no cable makes them.
+// Scans of a chain by its wires, with rests in Pause as no cable makes them.
 #pragma once
 
 #include <functional>

@@ -110,7 +110,7 @@ class Attack {
   // Moves inputs during some reads, then reads until nothing can be under way.
   void readRound() {
     drawDamage();
-    for (unsigned port = 0; port < 2; ++port) told_[port] = happened_[port] = {};
+    for (unsigned port = 0; port < 2; ++port) reported_[port] = happened_[port] = {};
     core_.setMoving(4u << 2 * random_.below(4));
     rivalActed_ = 0;
     reads_ = true;
@@ -127,7 +127,7 @@ class Attack {
     if (rivalActed_ > 0) readAtLast(rival_);
     readAtLast(first_);
     for (unsigned port = 0; port < 2 && !mayLose; ++port)
-      if (!happened_[port].within(told_[port])) wrong("activity is lost");
+      if (!happened_[port].within(reported_[port])) wrong("activity is lost");
   }
 
   void readAtLast(Reader& reader) {
@@ -172,19 +172,19 @@ class Attack {
   void judge(const Reader& reader, const Answer& answer, unsigned port, std::size_t& end) {
     const unsigned pins = port == 0 ? core_.model().async_in : core_.model().sync_in;
     unsigned values = 0;
-    Activity told;
+    Activity reported;
     for (unsigned i = 0; i < width; ++i, end -= port == 0 ? 4 : 6) {
       values |= unsigned{answer.data[end - 1]} << i;
-      told.up |= unsigned{answer.data[end - 2]} << i;
-      told.down |= unsigned{answer.data[end - 3]} << i;
+      reported.up |= unsigned{answer.data[end - 2]} << i;
+      reported.down |= unsigned{answer.data[end - 3]} << i;
     }
     Activity allowed = reader.window[port];
     allowed.add(reader.during[port]);
-    if ((answer.flags & Answer::overlap) != 0) allowed.add(lastTold_[port]);
-    lastTold_[port] = told;
-    told_[port].add(told);
+    if ((answer.flags & Answer::overlap) != 0) allowed.add(lastReported_[port]);
+    lastReported_[port] = reported;
+    reported_[port].add(reported);
     if (((values ^ pins) & ~(reader.moved[port] | reader.movedBefore[port])) != 0) wrong("a value is wrong");
-    if (!told.within(allowed)) wrong("activity is invented");
+    if (!reported.within(allowed)) wrong("activity is invented");
   }
 
   bool stoppedStatusAnswers() {
@@ -310,8 +310,8 @@ class Attack {
   const char* wrong_ = nullptr;
 
   bool reads_ = false, damages_ = false;
-  unsigned rivalCalls_ = 0, rivalActed_ = 0;      // that may come yet, and that have come
-  Activity told_[2], happened_[2], lastTold_[2];  // asynchronous, synchronous
+  unsigned rivalCalls_ = 0, rivalActed_ = 0;              // that may come yet, and that have come
+  Activity reported_[2], happened_[2], lastReported_[2];  // asynchronous, synchronous
 
   unsigned events_ = 0;
   unsigned long start_ = 0;

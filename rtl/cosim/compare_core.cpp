@@ -19,7 +19,7 @@ using namespace qorsim;
 
 constexpr unsigned lateness = 2;
 
-// A pulse in the clocks while a snapshot is being taken may be told with an earlier one of the same input, so there are
+// A pulse in the clocks while a snapshot is being taken may be reported with an earlier one of the same input, so there are
 // none: the last snapshot is taken in the first clock after a scan.
 constexpr unsigned clocksOfTake = 4, clocksAfterScan = 24;
 
@@ -152,7 +152,7 @@ int main(int argc, char** argv) {
   Bench bench;
   for (unsigned long i = 0; i < scans; ++i)
     if (!bench.step(i % 32 == 0)) {
-      std::printf("scan %lu, or an output behind it, differs\n", i);
+      std::printf("scan %lu, or an output after it, differs\n", i);
       return 1;
     }
   std::printf("core %d/%d/%d/%d, version %d.%d%s: %lu scans, all the same\n", ASYNC_IN, SYNC_IN, ASYNC_OUT,

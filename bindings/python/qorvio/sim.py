@@ -51,7 +51,7 @@ class Board:
         return self
 
     def tcks_per_clock(self, tcks: int) -> "Board":
-        """The design clock ticks once in so many of the TCKs of Run-Test/Idle and of answers; with 0 it stands still."""
+        """The design clock ticks once in so many of the TCKs of Run-Test/Idle and of answers; with 0 it is stopped."""
         self._chain.tcks_per_clock(tcks)
         return self
 

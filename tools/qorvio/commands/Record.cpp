@@ -102,10 +102,10 @@ void record(Context& context, const RecordOptions& options) {
   context.board().markSeen(signals);
   if (options.out[0] == '-') return;  // which has the output
   const std::string never = recorded.isTriggered ? "" : "; never true: " + options.when;
-  const std::string told = settings.quiet ? "" : printable(summary(recorded, options.out) + never) + "\n";
+  const std::string text = settings.quiet ? "" : printable(summary(recorded, options.out) + never) + "\n";
   nlohmann::ordered_json json{{"samples", recorded.samples}, {"missed", recorded.missed}};
   if (limits.when) json["triggered"] = recorded.isTriggered;
-  print({told, json}, settings.json);
+  print({text, json}, settings.json);
 }
 
 }  // namespace
