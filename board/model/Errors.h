@@ -38,6 +38,12 @@ class QORBOARD_API Busy : public Failure {
   using Failure::Failure;
 };
 
+/// Another client of the server drives the output. Nothing was sent.
+class QORBOARD_API Driven : public Failure {
+ public:
+  using Failure::Failure;
+};
+
 /// A file could not be written: nothing more of it is worth keeping.
 class QORBOARD_API FileFailure : public Failure {
  public:

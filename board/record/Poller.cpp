@@ -84,6 +84,15 @@ Subscription::Subscription(Poller& poller) : poller_(poller), cores_(poller.core
   subscribe();
 }
 
+Subscription::Subscription(const Subscription& other)
+    : poller_(other.poller_), inputs_(other.inputs_), cores_(other.cores_), isMarked_(inputs_.size()) {
+  subscribe();
+  pending_ = other.pending_;
+  taken_ = other.taken_;
+  isFresh_ = other.isFresh_;
+  index();
+}
+
 Subscription::~Subscription() {
   for (std::size_t core : cores_) {
     Poller::PolledCore& polled = poller_.cores_[core];

@@ -63,7 +63,9 @@ class QORBOARD_API Subscription {
   /// Looks at all cores, at no input in particular: poll() reads none for it, but what others have read counts.
   explicit Subscription(Poller& poller);
 
-  Subscription(const Subscription&) = delete;
+  /// Goes on from where another one is: what that one has not looked at, this one has not either.
+  Subscription(const Subscription& other);
+
   Subscription& operator=(const Subscription&) = delete;
   ~Subscription();
 
